@@ -1,0 +1,1 @@
+#include "qelutils/xlate.h"

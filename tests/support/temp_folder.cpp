@@ -1,0 +1,105 @@
+#include "tests/support/temp_folder.h"
+
+#include <gtest/gtest.h>
+
+#include <algorithm>
+#include <atomic>
+#include <filesystem>
+#include <fstream>
+#include <iterator>
+
+namespace orvane::testing {
+
+namespace fs = std::filesystem;
+
+TempFolder::TempFolder() {
+    static std::atomic<int> count{0};
+    const fs::path folder =
+        fs::temp_directory_path() /
+        (L"orvane_test_" + std::to_wstring(GetCurrentProcessId()) + L"_" + std::to_wstring(++count));
+    fs::remove_all(folder);
+    fs::create_directories(folder);
+    path_ = folder.wstring();
+}
+
+TempFolder::~TempFolder() {
+    std::error_code ignored;
+    fs::remove_all(path_, ignored);
+}
+
+std::wstring TempFolder::operator/(std::wstring_view relative) const {
+    return path_ + L"\\" + std::wstring(relative);
+}
+
+void MakeFolder(const std::wstring& path) {
+    fs::create_directories(path);
+}
+
+void WriteTextFile(const std::wstring& path, std::string_view content, std::optional<FILETIME> last_write) {
+    fs::create_directories(fs::path(path).parent_path());
+    HANDLE file =
+        CreateFileW(path.c_str(), GENERIC_WRITE, 0, nullptr, CREATE_ALWAYS, FILE_ATTRIBUTE_NORMAL, nullptr);
+    ASSERT_NE(file, INVALID_HANDLE_VALUE) << GetLastError();
+    DWORD written = 0;
+    EXPECT_TRUE(WriteFile(file, content.data(), static_cast<DWORD>(content.size()), &written, nullptr));
+    if (last_write) {
+        EXPECT_TRUE(SetFileTime(file, nullptr, nullptr, &*last_write));
+    }
+    CloseHandle(file);
+}
+
+std::optional<std::string> ReadTextFile(const std::wstring& path) {
+    std::ifstream file(fs::path(path), std::ios::binary);
+    if (!file) {
+        return std::nullopt;
+    }
+    return std::string(std::istreambuf_iterator<char>(file), {});
+}
+
+bool Exists(const std::wstring& path) {
+    return GetFileAttributesW(path.c_str()) != INVALID_FILE_ATTRIBUTES;
+}
+
+FILETIME LastWriteTime(const std::wstring& path) {
+    WIN32_FILE_ATTRIBUTE_DATA data{};
+    GetFileAttributesExW(path.c_str(), GetFileExInfoStandard, &data);
+    return data.ftLastWriteTime;
+}
+
+std::vector<std::wstring> ListTree(const std::wstring& folder) {
+    std::vector<std::wstring> names;
+    std::error_code missing;
+    for (const auto& entry : fs::recursive_directory_iterator(folder, missing)) {
+        std::wstring name = entry.path().wstring().substr(folder.size() + 1);
+        names.push_back(entry.is_directory() ? name + L"\\" : name);
+    }
+    std::sort(names.begin(), names.end());
+    return names;
+}
+
+FILETIME FileTimeOf(ULONGLONG ticks) {
+    return {static_cast<DWORD>(ticks & 0xFFFFFFFFU), static_cast<DWORD>(ticks >> 32U)};
+}
+
+ULONGLONG TicksOf(const FILETIME& time) {
+    return (static_cast<ULONGLONG>(time.dwHighDateTime) << 32U) | time.dwLowDateTime;
+}
+
+FILETIME UtcTime(int year, int month, int day, int hour, int minute, int second) {
+    SYSTEMTIME fields{};
+    fields.wYear = static_cast<WORD>(year);
+    fields.wMonth = static_cast<WORD>(month);
+    fields.wDay = static_cast<WORD>(day);
+    fields.wHour = static_cast<WORD>(hour);
+    fields.wMinute = static_cast<WORD>(minute);
+    fields.wSecond = static_cast<WORD>(second);
+    FILETIME time{};
+    EXPECT_TRUE(SystemTimeToFileTime(&fields, &time));
+    return time;
+}
+
+FILETIME AddSeconds(const FILETIME& time, int seconds) {
+    return FileTimeOf(TicksOf(time) + static_cast<ULONGLONG>(static_cast<LONGLONG>(seconds) * 10'000'000));
+}
+
+}  // namespace orvane::testing

@@ -1,0 +1,31 @@
+#!/usr/bin/env bash
+# Runs a Windows program in Wine: wine.sh PROGRAM [ARGUMENT...]
+#
+# The prefix is WINEPREFIX, by default build/wine_prefix of this checkout; it is created on first use.
+# DLL_FOLDER, a path of this system, is put in front of the program's PATH. A display must exist
+# (see with_display.sh).
+set -eu
+root=$(cd "$(dirname "${BASH_SOURCE[0]}")/.." && pwd)
+export WINEPREFIX=${WINEPREFIX:-$root/build/wine_prefix}
+export WINEDEBUG=${WINEDEBUG:--all}
+# Without the last override a program that crashes would wait for a debugger for ever.
+export WINEDLLOVERRIDES="mscoree,mshtml,winedbg.exe="
+wine=/usr/lib/wine/wine64
+
+mkdir -p "$WINEPREFIX"
+(
+  flock 9
+  if [ ! -e "$WINEPREFIX/.ready" ]; then
+    "$wine" wineboot -i
+    # Without a window manager a managed window that closes can wait for two seconds.
+    "$wine" reg add 'HKCU\Software\Wine\X11 Driver' /v Managed /d N /f
+    /usr/lib/wine/wineserver -w
+    touch "$WINEPREFIX/.ready"
+  fi
+) 9>"$WINEPREFIX/.lock" >"$WINEPREFIX/setup.log" 2>&1 </dev/null
+
+if [ -n "${DLL_FOLDER:-}" ]; then
+  WINEPATH=Z:${DLL_FOLDER//\//\\}
+  export WINEPATH
+fi
+exec "$wine" "$@"
