@@ -1,3 +1,155 @@
-// Identifiers of the resources, in ranges per dialog. Included by the resource compiler too: only
+// Identifiers of the resources, in ranges per dialog. The resource compiler includes this too: nothing but
 // #define lines.
 #pragma once
+
+// Manifest and application
+#define IDR_MANIFEST 1
+#define IDI_APPLICATION_ICON 128
+#define IDS_APPLICATION_NAME 57344
+
+// Settings store: registry key, value names and folders
+#define IDS_SETTINGS_KEY 102
+#define IDS_SYNC_PATH_DT 103
+#define IDS_SYNC_PATH_CE 104
+#define IDS_DEFAULT_PC_FOLDER 105
+#define IDS_DEVICE_FOLDER_2 106
+#define IDS_SYNC_QVJ_FILES 107
+#define IDS_OVERWRITE_BKP 108
+#define IDS_SYNC_TN3_FILES 109
+#define IDS_SYNC_RD3_FILES 110
+#define IDS_SYNC_PT3_FILES 111
+#define IDS_SYNC_LN3_FILES 112
+#define IDS_SYNC_JPG_FILES 113
+#define IDS_SYNC_BMP_FILES 114
+#define IDS_SYNC_ALL_FILES 115
+#define IDS_OVERWRITE_OLD_FILES 116
+#define IDS_OVERWRITE_WARN 117
+#define IDS_START_FILE_VIEW 118
+#define IDS_SYNC_XML_FILES 119
+#define IDS_SYNC_IMG_FILES 120
+#define IDS_SYNC_TP3_FILES 121
+#define IDS_SYNC_WKF_FILES 122
+#define IDS_SYNC_TXT_FILES 123
+#define IDS_DEVICE_FOLDER_1 157
+#define IDS_DEVICE_FOLDER_3 158
+
+// About box
+#define IDD_ABOUT 100
+
+// Synchronization dialog
+#define IDD_SYNC 102
+#define IDC_SYNC_PROGRESS 1005
+#define IDC_SYNC_START 1007
+#define IDC_SYNC_STATUS 1008
+#define IDC_SYNC_CANCEL_EXIT 1009
+#define IDC_SYNC_SETTINGS 1010
+#define IDC_SYNC_FILE_VIEW 1011
+#define IDC_SYNC_LOG 1020
+// The system-menu item; the low four bits of a system command belong to the system.
+#define IDM_ABOUT 0x10
+
+// Options dialog
+#define IDD_OPTIONS 130
+#define IDC_OPTIONS_DEVICE_BROWSE 3
+#define IDC_OPTIONS_PC_BROWSE 4
+#define IDC_OPTIONS_SELECT_ALL 5
+#define IDC_OPTIONS_PC_FOLDER 1006
+#define IDC_OPTIONS_DEVICE_FOLDER 1007
+#define IDC_OPTIONS_QVJ 1021
+#define IDC_OPTIONS_TN3 1022
+#define IDC_OPTIONS_RD3 1023
+#define IDC_OPTIONS_PT3 1024
+#define IDC_OPTIONS_LN3 1025
+#define IDC_OPTIONS_ALL_FILES 1026
+#define IDC_OPTIONS_JPG 1027
+#define IDC_OPTIONS_IMG 1028
+#define IDC_OPTIONS_BMP 1029
+#define IDC_OPTIONS_XML 1030
+#define IDC_OPTIONS_TP3 1031
+#define IDC_OPTIONS_WKF 1032
+#define IDC_OPTIONS_TXT 1033
+#define IDC_OPTIONS_OVERWRITE 1038
+#define IDC_OPTIONS_BACKUP 1039
+#define IDC_OPTIONS_WARN 1040
+#define IDC_OPTIONS_START_FILE_VIEW 1041
+#define IDC_OPTIONS_AUTO_START 1042
+
+// Device folder browser, its tree's pictures and context menu, and the wait dialog
+#define IDD_BROWSE 133
+#define IDD_LOAD_PROGRESS 134
+#define IDI_LOAD_FRAME_5 135
+#define IDI_TREE_UNUSED 138
+#define IDI_TREE_FOLDER_OPEN 139
+#define IDI_TREE_FOLDER_CLOSED 140
+#define IDI_TREE_FILE 141
+#define IDR_TREE_MENU 142
+#define IDI_LOAD_FRAME_1 143
+#define IDI_LOAD_FRAME_4 144
+#define IDI_LOAD_FRAME_3 146
+#define IDI_LOAD_FRAME_2 147
+#define IDC_BROWSE_TREE 1023
+#define IDC_BROWSE_FOLDER 1024
+#define IDC_BROWSE_FILE_NAME 1025
+#define IDC_LOAD_TEXT 1025
+#define IDC_LOAD_ICON 1026
+#define IDM_TREE_PROPERTY 32773
+#define IDM_TREE_REFRESH 32774
+
+// Device file properties
+#define IDD_FILE_PROPERTY 136
+#define IDI_PROPERTY_FILE 137
+#define IDI_PROPERTY_FOLDER 148
+#define IDC_PROPERTY_ICON 1027
+#define IDC_PROPERTY_PATH 1028
+#define IDC_PROPERTY_TYPE_LABEL 1029
+#define IDC_PROPERTY_DATE_LABEL 1030
+#define IDC_PROPERTY_SIZE_LABEL 1031
+#define IDC_PROPERTY_TYPE 1032
+#define IDC_PROPERTY_DATE 1033
+#define IDC_PROPERTY_SIZE 1034
+#define IDC_PROPERTY_READ_ONLY 1035
+#define IDC_PROPERTY_HIDDEN 1036
+#define IDC_PROPERTY_ARCHIVE 1037
+#define IDS_INVALID_DATE 55296
+
+// PC folder chooser: the ids are those that the system's old-style file dialog expects
+#define IDD_FOLDER 149
+#define IDC_FOLDER_READ_ONLY 1040
+#define IDC_FOLDER_HELP 1038
+#define IDC_FOLDER_DIRECTORY 1088
+#define IDC_FOLDER_TYPE_LABEL 1089
+#define IDC_FOLDER_NAME_LABEL 1090
+#define IDC_FOLDER_DRIVES_LABEL 1091
+#define IDC_FOLDER_FILE_LIST 1120
+#define IDC_FOLDER_DIRECTORY_LIST 1121
+#define IDC_FOLDER_TYPE_LIST 1136
+#define IDC_FOLDER_DRIVE_LIST 1137
+#define IDC_FOLDER_FILE_NAME 1152
+#define IDC_FOLDER_UNUSED 10881
+
+// Manual transfer dialog
+#define IDD_TRANSFER 151
+#define IDB_TICK_OFF 153
+#define IDB_TICK_ON 155
+#define IDC_TRANSFER_CLOSE 3
+#define IDC_TRANSFER_REFRESH 5
+#define IDC_TRANSFER_COPY 6
+#define IDC_TRANSFER_DEVICE_LIST 1039
+#define IDC_TRANSFER_PC_ALL 1040
+#define IDC_TRANSFER_DEVICE_FOLDER 1041
+#define IDC_TRANSFER_PC_FOLDER 1042
+#define IDC_TRANSFER_SETTINGS 1043
+#define IDC_TRANSFER_COPY_ALL 1044
+#define IDC_TRANSFER_SYNCHRONIZE 1045
+#define IDC_TRANSFER_TABS 1046
+#define IDC_TRANSFER_DEVICE_FROM 1047
+#define IDC_TRANSFER_PC_LIST 1048
+#define IDC_TRANSFER_DEVICE_ALL 1049
+#define IDC_TRANSFER_PC_FROM 1050
+
+// Copy progress dialog
+#define IDD_COPY_PROGRESS 156
+#define IDC_COPY_FILE 1052
+#define IDC_COPY_TO 1053
+#define IDC_COPY_FROM 1054
+#define IDC_COPY_CANCEL 1055
