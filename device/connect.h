@@ -3,6 +3,8 @@
 
 #include <windows.h>
 
+#include "device/remote_api.h"
+
 namespace orvane {
 
 // Opens a session for the calling thread and waits until the device confirms it, at most 1000 ms and no
@@ -11,7 +13,27 @@ namespace orvane {
 //
 // Returns a value >= 0 when the session stands: the caller closes it with CeRapiUninit on the same thread.
 // A negative value leaves no session open: what CeRapiInitEx or the device answered, 0x800704C7 (the
-// HRESULT of ERROR_CANCELLED) after the cancel event, E_FAIL when the device did not confirm in time.
+// HRESULT of ERROR_CANCELLED) after the cancel event, E_FAIL when the device did not confirm in time or
+// `cancel_event` is no event.
 HRESULT ConnectDevice(HANDLE cancel_event);
+
+// A session for the length of a scope: opened by ConnectDevice, closed at the end on the same thread if it
+// stands. Code that cannot go on without a device tests it first.
+class DeviceSession {
+  public:
+    explicit DeviceSession(HANDLE cancel_event) : stands_(SUCCEEDED(ConnectDevice(cancel_event))) {}
+    DeviceSession(const DeviceSession&) = delete;
+    DeviceSession& operator=(const DeviceSession&) = delete;
+    ~DeviceSession() {
+        if (stands_) {
+            CeRapiUninit();
+        }
+    }
+
+    explicit operator bool() const { return stands_; }
+
+  private:
+    bool stands_;
+};
 
 }  // namespace orvane
