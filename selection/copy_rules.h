@@ -1,0 +1,68 @@
+// What would be copied: the rules that the synchronization passes and the manual view share.
+#pragma once
+
+#include <windows.h>
+
+#include <cstdint>
+#include <functional>
+#include <string>
+#include <string_view>
+
+#include "selection/file_table.h"
+
+namespace orvane {
+
+// Two files of the same local date whose times of day differ by fewer seconds than this are the same
+// version when it is decided what to copy. The manual view's replace check has a bound of its own, 11; that
+// the two differ is meant.
+inline constexpr int kSameVersionSeconds = 10;
+inline constexpr int kSameVersionSecondsReplaceCheck = 11;
+
+// Whether two write times count as the same version: equal local dates, and times of day that differ by less
+// than `bound_seconds`. Two seconds across midnight are two versions.
+bool IsSameVersion(const FILETIME& a, const FILETIME& b, int bound_seconds);
+
+// The other side's listing as the target of copies. Table and index belong to the caller.
+struct CopyTarget {
+    const FileTable& table;
+    std::int32_t rows;
+    const FileIndex& index;
+};
+
+// Whether the source file is left alone: a file of its name is on the target side and may not be overwritten
+// (`overwrite` off), has an equal time, is the same version, is newer, or is one that the user keeps.
+// `ask_replace`, empty when the user wants no warning, is called with the name only for a target that would
+// be replaced, and answers whether to replace it.
+bool ShouldSkipCopy(bool overwrite, const FILETIME& source_write_time, std::wstring_view name,
+                    const CopyTarget& target, const std::function<bool(std::wstring_view)>& ask_replace);
+
+// The question whether the target may be replaced, in the user's language. The display texts are paths with
+// the side behind them.
+std::wstring ReplaceQuestion(std::wstring_view target_display, std::wstring_view source_display);
+
+// The file types that take part, one flag each.
+struct FileTypes {
+    bool qvj = false;
+    bool tn3 = false;
+    bool rd3 = false;
+    bool pt3 = false;
+    bool ln3 = false;
+    bool jpg = false;
+    bool bmp = false;
+    bool img = false;
+    bool xml = false;
+    bool tp3 = false;
+    bool wkf = false;
+    bool txt = false;
+};
+
+// Whether the last four characters of the name (the whole name if it has no more) are the extension, in any
+// case, of a type that takes part.
+bool PassesExtensionFilter(std::wstring_view name, const FileTypes& types);
+
+// Whether the name is that of a ".wkf" job file. The name without its four-character extension is then that
+// of the companion folder.
+bool HasCompanionFolder(std::wstring_view name);
+std::wstring_view CompanionFolder(std::wstring_view name);
+
+}  // namespace orvane

@@ -1,0 +1,90 @@
+#include "selection/pc_listing.h"
+
+#include <algorithm>
+#include <cwchar>
+#include <string_view>
+
+#include "platform/handles.h"
+
+namespace orvane {
+
+namespace {
+
+constexpr std::wstring_view kEverything = L"*.*";
+
+// One pass over all that a pattern finds, "." and ".." left out.
+class PcSearch {
+  public:
+    explicit PcSearch(const std::wstring& pattern) : find_(FindFirstFileW(pattern.c_str(), &data_)) {}
+
+    bool FoundAnything() const { return static_cast<bool>(find_); }
+
+    // Steps to the next entry, the first one at the first call. Null after the last.
+    const WIN32_FIND_DATAW* Next() {
+        do {
+            if (!find_ || (started_ && !FindNextFileW(find_.Get(), &data_))) {
+                return nullptr;
+            }
+            started_ = true;
+        } while (std::wcscmp(data_.cFileName, L".") == 0 || std::wcscmp(data_.cFileName, L"..") == 0);
+        return &data_;
+    }
+
+  private:
+    WIN32_FIND_DATAW data_{};
+    UniqueFind find_;
+    bool started_ = false;
+};
+
+void FillNode(const WIN32_FIND_DATAW& data, FileNode& node) {
+    std::copy(std::begin(data.cFileName), std::end(data.cFileName), node.name);
+    node.is_folder = (data.dwFileAttributes & FILE_ATTRIBUTE_DIRECTORY) != 0 ? 1 : 0;
+    node.creation_time = data.ftCreationTime;
+    node.last_access_time = data.ftLastAccessTime;
+    node.last_write_time = data.ftLastWriteTime;
+    node.size_low = data.nFileSizeLow;
+}
+
+}  // namespace
+
+DeviceResult ListPcFolder(const std::wstring& pattern, bool recurse, FileNode& node) {
+    PcSearch counting(pattern);
+    if (!counting.FoundAnything()) {
+        return DeviceResult::kFailed;
+    }
+    std::int32_t capacity = 0;
+    while (counting.Next() != nullptr) {
+        ++capacity;
+    }
+    if (capacity == 0) {
+        return DeviceResult::kDone;
+    }
+    node.children = std::make_unique<FileNode[]>(static_cast<std::size_t>(capacity));
+
+    // The folder may change between the two passes: entries that are new are left out, and the count is that
+    // of the entries that were really filled.
+    const std::wstring folder(pattern, 0, pattern.size() - kEverything.size());
+    PcSearch filling(pattern);
+    while (node.child_count < capacity) {
+        const WIN32_FIND_DATAW* data = filling.Next();
+        if (data == nullptr) {
+            break;
+        }
+        FileNode& child = node.children[static_cast<std::size_t>(node.child_count++)];
+        FillNode(*data, child);
+        if (child.is_folder == 0 || !recurse) {
+            continue;
+        }
+        const std::wstring sub_pattern = folder + child.name + L"\\" + std::wstring(kEverything);
+        if (!FitsPathBuffer(sub_pattern.size())) {
+            continue;
+        }
+        if (const DeviceResult result = ListPcFolder(sub_pattern, recurse, child);
+            result != DeviceResult::kDone) {
+            return result;
+        }
+    }
+    return DeviceResult::kDone;
+}
+
+}  // namespace orvane
