@@ -1,11 +1,11 @@
 #!/usr/bin/env bash
 # Runs a command on a display of its own: with_display.sh COMMAND [ARGUMENT...]
 #
-# The wine server of WINEPREFIX (by default build/wine_prefix of this checkout) is ended afterwards, so
+# The wine server of WINEPREFIX (by default build/wine_prefix_UID of this checkout) is ended afterwards, so
 # that no process stays behind.
 set -u
 root=$(cd "$(dirname "${BASH_SOURCE[0]}")/.." && pwd)
-export WINEPREFIX=${WINEPREFIX:-$root/build/wine_prefix}
+export WINEPREFIX=${WINEPREFIX:-$root/build/wine_prefix_$(id -u)}
 
 xvfb-run -a -s "-screen 0 1280x1024x24" "$@"
 status=$?
