@@ -18,21 +18,30 @@ namespace orvane {
 HRESULT ConnectDevice(HANDLE cancel_event);
 
 // A session for the length of a scope: opened by ConnectDevice, closed at the end on the same thread if it
-// stands. Code that cannot go on without a device tests it first.
+// stands. Code that cannot go on without a device tests it first. A nested operation works in the session
+// that its caller holds on this thread: then nothing is opened and nothing closed here.
 class DeviceSession {
   public:
-    explicit DeviceSession(HANDLE cancel_event) : stands_(SUCCEEDED(ConnectDevice(cancel_event))) {}
+    explicit DeviceSession(HANDLE cancel_event, bool nested = false)
+        : owned_(!nested && SUCCEEDED(ConnectDevice(cancel_event))), stands_(nested || owned_) {}
     DeviceSession(const DeviceSession&) = delete;
     DeviceSession& operator=(const DeviceSession&) = delete;
-    ~DeviceSession() {
-        if (stands_) {
-            CeRapiUninit();
-        }
-    }
+    ~DeviceSession() { Close(); }
 
     explicit operator bool() const { return stands_; }
 
+    // Ends the session ahead of the scope.
+    void Close() {
+        if (owned_) {
+            CeRapiUninit();
+        }
+        Release();
+    }
+    // Gives the session up as it is: somebody else closes it, or has closed it.
+    void Release() { owned_ = stands_ = false; }
+
   private:
+    bool owned_;
     bool stands_;
 };
 
