@@ -8,6 +8,9 @@ namespace {
 
 // One subclass per window: the procedure and this number identify it.
 constexpr UINT_PTR kSubclassId = 1;
+// The window property that holds the address of the object attached to a window. (The system could tell it
+// from the subclass itself, but not every import library has that call.)
+constexpr wchar_t kObjectProperty[] = L"orvane.control";
 
 // The control that a notification is about, null for messages that are none.
 HWND NotifyingControl(HWND parent, UINT message, LPARAM lparam) {
@@ -45,11 +48,16 @@ bool Control::Attach(HWND window) {
         return false;
     }
     window_ = window;
+    if (!SetPropW(window, kObjectProperty, this)) {
+        Detach();
+        return false;
+    }
     return true;
 }
 
 void Control::Detach() {
     if (window_ != nullptr) {
+        RemovePropW(window_, kObjectProperty);
         RemoveWindowSubclass(window_, Thunk, kSubclassId);
         window_ = nullptr;
     }
@@ -69,11 +77,8 @@ LRESULT Control::Default(UINT message, WPARAM wparam, LPARAM lparam) {
 
 std::optional<LRESULT> Control::Reflect(HWND parent, UINT message, WPARAM wparam, LPARAM lparam) {
     HWND source = NotifyingControl(parent, message, lparam);
-    DWORD_PTR object = 0;
-    if (source == nullptr || !GetWindowSubclass(source, Thunk, kSubclassId, &object)) {
-        return std::nullopt;
-    }
-    return reinterpret_cast<Control*>(object)->OnReflected(message, wparam, lparam);
+    auto* control = source != nullptr ? static_cast<Control*>(GetPropW(source, kObjectProperty)) : nullptr;
+    return control != nullptr ? control->OnReflected(message, wparam, lparam) : std::nullopt;
 }
 
 std::optional<LRESULT> Control::Dispatch(UINT message, WPARAM wparam, LPARAM lparam) noexcept {
