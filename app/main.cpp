@@ -1,3 +1,9 @@
 #include <windows.h>
 
-int WINAPI wWinMain(HINSTANCE, HINSTANCE, PWSTR, int) { return 0; }
+#include "app/application.h"
+
+int WINAPI wWinMain(HINSTANCE /*instance*/, HINSTANCE /*previous*/, PWSTR /*command_line*/,
+                    int /*show_command*/) {
+    orvane::CWendlowApp application;
+    return application.InitInstance() ? 1 : 0;
+}

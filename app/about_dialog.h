@@ -1,0 +1,16 @@
+// The about box.
+#pragma once
+
+#include "ui/dialog.h"
+
+namespace orvane {
+
+class CAboutDlg : public ui::Dialog {
+  public:
+    explicit CAboutDlg(HWND parent);
+
+  protected:
+    bool OnInitDialog() override;
+};
+
+}  // namespace orvane

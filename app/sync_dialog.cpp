@@ -1,0 +1,387 @@
+#include "app/sync_dialog.h"
+
+#include <commctrl.h>
+
+#include "app/about_dialog.h"
+#include "app/sync_pass.h"
+#include "device/clock_check.h"
+#include "platform/paths.h"
+#include "platform/resources.h"
+#include "qelutils/xlate.h"
+#include "res/ids.h"
+#include "selection/pc_listing.h"
+#include "ui/message_box.h"
+#include "ui/wait_cursor.h"
+
+namespace orvane {
+
+namespace {
+
+constexpr COLORREF kBackground = RGB(0xEC, 0xE9, 0xD8);
+constexpr COLORREF kFieldText = RGB(0x00, 0xFF, 0x00);
+constexpr COLORREF kBlack = RGB(0x00, 0x00, 0x00);
+
+// How long a cancelled worker is waited for. It ends at its next 8192-byte chunk or row, unless a question
+// to the user holds it up.
+constexpr DWORD kCancelledWorkerWaitMs = 2000;
+
+// Reports are handled for so long at a time, then the user's clicks and the painting have their turn: the
+// timer that resumes is served after both.
+constexpr DWORD kReportBudgetMs = 30;
+constexpr UINT_PTR kReportTimer = 1;
+
+}  // namespace
+
+CWendlowDlg::CWendlowDlg()
+    : Dialog(IDD_SYNC),
+      background_(CreateSolidBrush(kBackground)),
+      icon_(LoadIconW(ResourceModule(), MAKEINTRESOURCEW(IDI_APPLICATION_ICON))),
+      settings_(LoadSettings()) {
+    RefreshSettingsBlock(settings_, settings_block_);
+}
+
+bool CWendlowDlg::HasRunningWorker() const {
+    const auto runs = [](const UniqueThread& worker) {
+        return worker && WaitForSingleObject(worker.Get(), 0) == WAIT_TIMEOUT;
+    };
+    return runs(first_worker_) || runs(second_worker_);
+}
+
+bool CWendlowDlg::OnInitDialog() {
+    Dialog::OnInitDialog();
+    XlateWnd(Handle());
+    SendMessageW(Handle(), WM_SETICON, ICON_BIG, reinterpret_cast<LPARAM>(icon_));
+    SendMessageW(Handle(), WM_SETICON, ICON_SMALL, reinterpret_cast<LPARAM>(icon_));
+    SetWindowTextW(Handle(), Xlate(L"Desktop-Mobile Device Synchronization").c_str());
+    SetDlgItemTextW(Handle(), IDC_SYNC_CANCEL_EXIT, Xlate(L"Exit").c_str());
+
+    HMENU system_menu = GetSystemMenu(Handle(), FALSE);
+    AppendMenuW(system_menu, MF_SEPARATOR, 0, nullptr);
+    AppendMenuW(system_menu, MF_STRING, IDM_ABOUT, Xlate(L"About Orvanelink...").c_str());
+
+    task_.reports.SetTarget(Handle(), WM_SYNC_NOTIFY);
+
+    UpdateWindow(Handle());
+    ShowWindow(Handle(), SW_SHOW);
+    const ui::WaitCursor wait;
+    bool accepted = false;
+    if (CheckDeviceDateTime(Handle(), device_tree_.StopEvent(), accepted) == 0) {
+        End(0);
+        return false;
+    }
+    return true;
+}
+
+// Escape and the close box. The user wants to leave: a worker is cancelled first and given the time to
+// remove a file that it has copied in part.
+void CWendlowDlg::OnCancel() {
+    if (HasRunningWorker()) {
+        CancelWorker();
+        for (const UniqueThread* worker : {&first_worker_, &second_worker_}) {
+            if (*worker) {
+                WaitForSingleObject(worker->Get(), kCancelledWorkerWaitMs);
+            }
+        }
+    }
+    Dialog::OnCancel();
+}
+
+bool CWendlowDlg::OnCommand(int id, UINT code) {
+    if (code != BN_CLICKED) {
+        return false;
+    }
+    switch (id) {
+        case IDC_SYNC_START:
+            OnSynchronize();
+            return true;
+        case IDC_SYNC_CANCEL_EXIT:
+            OnCancelExit();
+            return true;
+        default:
+            return false;
+    }
+}
+
+std::optional<LRESULT> CWendlowDlg::OnMessage(UINT message, WPARAM wparam, LPARAM lparam) {
+    switch (message) {
+        case WM_SYNC_NOTIFY:
+            OnSyncNotify();
+            return 0;
+        case WM_TIMER:
+            if (wparam != kReportTimer) {
+                return std::nullopt;
+            }
+            KillTimer(Handle(), kReportTimer);
+            OnSyncNotify();
+            return 0;
+        case WM_SYSCOMMAND:
+            return OnSysCommand(static_cast<UINT>(wparam)) ? std::optional<LRESULT>(0) : std::nullopt;
+        case WM_PAINT:
+            return OnPaint() ? std::optional<LRESULT>(0) : std::nullopt;
+        case WM_QUERYDRAGICON:
+            return reinterpret_cast<LRESULT>(icon_);
+        case WM_CTLCOLORMSGBOX:
+        case WM_CTLCOLOREDIT:
+        case WM_CTLCOLORLISTBOX:
+            return OnCtlColor(message, reinterpret_cast<HDC>(wparam));
+        default:
+            return Dialog::OnMessage(message, wparam, lparam);
+    }
+}
+
+bool CWendlowDlg::OnSysCommand(UINT command) {
+    // The system uses the low four bits of a command itself.
+    if ((command & 0xFFF0U) != IDM_ABOUT) {
+        return false;
+    }
+    CAboutDlg(Handle()).DoModal();
+    return true;
+}
+
+bool CWendlowDlg::OnPaint() {
+    if (!IsIconic(Handle())) {
+        return false;
+    }
+    PAINTSTRUCT paint{};
+    HDC dc = BeginPaint(Handle(), &paint);
+    SendMessageW(Handle(), WM_ICONERASEBKGND, reinterpret_cast<WPARAM>(dc), 0);
+    RECT client{};
+    GetClientRect(Handle(), &client);
+    DrawIcon(dc, (client.right - GetSystemMetrics(SM_CXICON) + 1) / 2,
+             (client.bottom - GetSystemMetrics(SM_CYICON) + 1) / 2, icon_);
+    EndPaint(Handle(), &paint);
+    return true;
+}
+
+std::optional<LRESULT> CWendlowDlg::OnCtlColor(UINT message, HDC dc) {
+    if (message == WM_CTLCOLORLISTBOX) {
+        SetTextColor(dc, kBlack);
+        SetBkColor(dc, kBackground);
+        UpdateColors(dc);
+    } else {
+        SetTextColor(dc, kFieldText);
+        SetBkColor(dc, kBlack);
+    }
+    return reinterpret_cast<LRESULT>(background_.Get());
+}
+
+void CWendlowDlg::OnSynchronize() {
+    if (!SettleEarlierRun()) {
+        return;
+    }
+    const ui::WaitCursor wait;
+    SetDlgItemTextW(Handle(), IDC_SYNC_STATUS, Xlate(L"Synchronization in progress...").c_str());
+    JobListing& device = NewListing();
+    if (!device_tree_.ReadOnThread(settings_.sync_path_ce, {}, device.root, Handle())) {
+        ui::ShowMessageBox(Handle(), Xlate(L"failed to read from remote device."));
+        SetDlgItemTextW(Handle(), IDC_SYNC_STATUS, L"");
+        return;
+    }
+    JobListing& pc = NewListing();
+    // A folder that is missing gives an empty listing: then there is nothing to copy from the PC.
+    ListPcFolder(settings_.sync_path_dt + L"\\*.*", true, pc.root);
+    Flatten(device);
+    Flatten(pc);
+    FillTask(pc, device);
+    ShowStart();
+    StartWorker(first_worker_, SyncThreadDT2CE);
+}
+
+// True when no worker runs any more and everything that the last ones reported has been handled. A worker
+// that was not cancelled is not waited for.
+bool CWendlowDlg::SettleEarlierRun() {
+    for (;;) {
+        UniqueThread& worker = second_worker_ ? second_worker_ : first_worker_;
+        const HANDLE thread = worker.Get();
+        if (worker &&
+            WaitForSingleObject(thread, task_.cancelled ? kCancelledWorkerWaitMs : 0) != WAIT_OBJECT_0) {
+            return false;
+        }
+        // Its last report may be its completion, which forgets the worker and starts the next one.
+        task_.reports.Drain(INFINITE, [this](SyncReport report) { HandleReport(std::move(report)); });
+        if (worker.Get() == thread) {
+            worker.Reset();
+        }
+        if (!first_worker_ && !second_worker_) {
+            return true;
+        }
+    }
+}
+
+CWendlowDlg::JobListing& CWendlowDlg::NewListing() {
+    return *listings_.emplace_back(std::make_unique<JobListing>());
+}
+
+void CWendlowDlg::Flatten(JobListing& listing) {
+    const std::int32_t capacity = CountEntries(0, listing.root);
+    FlattenTree(listing.table, listing.rows, listing.root, {}, capacity);
+}
+
+void CWendlowDlg::FillTask(const JobListing& pc, const JobListing& device) {
+    const auto side = [](const JobListing& listing, const std::wstring& folder) {
+        return SyncSide{&listing.table, listing.rows, std::wstring(WithoutTrailingBackslashes(folder))};
+    };
+    task_.cancelled = false;
+    task_.info_text.clear();
+    task_.pc = side(pc, settings_.sync_path_dt);
+    task_.device = side(device, settings_.sync_path_ce);
+    // Sync_img_files and Sync_all_files play no part in a synchronization: images go with the bitmaps.
+    task_.types = {.qvj = settings_.sync_qvj_files != 0,
+                   .tn3 = settings_.sync_tn3_files != 0,
+                   .rd3 = settings_.sync_rd3_files != 0,
+                   .pt3 = settings_.sync_pt3_files != 0,
+                   .ln3 = settings_.sync_ln3_files != 0,
+                   .jpg = settings_.sync_jpg_files != 0,
+                   .bmp = settings_.sync_bmp_files != 0,
+                   .img = settings_.sync_bmp_files != 0,
+                   .xml = settings_.sync_xml_files != 0,
+                   .tp3 = settings_.sync_tp3_files != 0,
+                   .wkf = settings_.sync_wkf_files != 0,
+                   .txt = settings_.sync_txt_files != 0};
+    task_.overwrite_old_files = settings_.overwrite_old_files != 0;
+    task_.overwrite_bkp = settings_.overwrite_bkp != 0;
+    task_.overwrite_warn = settings_.overwrite_warn != 0;
+}
+
+void CWendlowDlg::ShowStart() {
+    SetDlgItemTextW(Handle(), IDC_SYNC_CANCEL_EXIT, Xlate(L"Cancel").c_str());
+    HWND progress = Item(IDC_SYNC_PROGRESS);
+    // The maximum is a 16-bit value; more rows than that wrap.
+    SendMessageW(progress, PBM_SETRANGE, 0, MAKELPARAM(0, LOWORD(task_.device.rows + task_.pc.rows)));
+    SendMessageW(progress, PBM_SETPOS, 0, 0);
+    ShowWindow(progress, SW_SHOW);
+    AddLogLine(Xlate(L"Checking files..."));
+    HWND log = Item(IDC_SYNC_LOG);
+    const LRESULT lines = SendMessageW(log, LB_GETCOUNT, 0, 0);
+    SendMessageW(log, LB_SETCARETINDEX, static_cast<WPARAM>(lines), FALSE);
+}
+
+void CWendlowDlg::StartWorker(UniqueThread& worker, LPTHREAD_START_ROUTINE procedure) {
+    worker.Reset(CreateThread(nullptr, kSyncThreadStack, procedure, &task_, 0, nullptr));
+    if (!worker) {
+        // The system has no thread left: the dialog is as after a cancellation.
+        CancelWorker();
+    }
+}
+
+void CWendlowDlg::OnCancelExit() {
+    const std::wstring text = ui::WindowText(Item(IDC_SYNC_CANCEL_EXIT));
+    if (text == Xlate(L"Exit")) {
+        // A cancelled worker may still be copying; it is not waited for.
+        OnOK();
+    } else if (text == Xlate(L"Cancel")) {
+        CancelWorker();
+    }
+}
+
+void CWendlowDlg::CancelWorker() {
+    task_.cancelled = true;
+    if (const HANDLE event = task_.copy_cancel_event) {
+        SetEvent(event);
+    }
+    SetDlgItemTextW(Handle(), IDC_SYNC_STATUS, Xlate(L"Sychronization cancelled").c_str());
+    SetDlgItemTextW(Handle(), IDC_SYNC_CANCEL_EXIT, Xlate(L"Exit").c_str());
+}
+
+void CWendlowDlg::OnSyncNotify() {
+    const bool all_handled =
+        task_.reports.Drain(kReportBudgetMs, [this](SyncReport report) { HandleReport(std::move(report)); });
+    if (!all_handled) {
+        SetTimer(Handle(), kReportTimer, USER_TIMER_MINIMUM, nullptr);
+    }
+}
+
+void CWendlowDlg::HandleReport(SyncReport report) {
+    task_.command = report.command;
+    if (report.info_text) {
+        task_.info_text = std::move(*report.info_text);
+    }
+    if (task_.command == kIncrementProgress) {
+        AdvanceProgress();
+    } else if (task_.command == kAddInfoDisplay) {
+        OnAddInfo();
+    } else if (task_.command == kErrorInfoDisplay) {
+        OnErrorInfo();
+    } else if (task_.command == kTaskCompleteDt2Ce) {
+        OnFirstPassComplete();
+    } else if (task_.command == kTaskCompleteCe2Dt) {
+        OnSecondPassComplete();
+    }
+}
+
+void CWendlowDlg::OnAddInfo() {
+    if (!task_.info_text.empty()) {
+        AdvanceProgress();
+        AddLogLine(task_.info_text);
+        task_.info_text.clear();
+    }
+    SelectLastLogLine();
+}
+
+// Marks the line of the failed file in the log, if the log's lines were windows. They are not, and so an
+// error only discards its text: the file's line stays as it was. That is meant.
+void CWendlowDlg::OnErrorInfo() {
+    if (!task_.info_text.empty()) {
+        HWND progress = Item(IDC_SYNC_PROGRESS);
+        const LRESULT position = SendMessageW(progress, PBM_GETPOS, 0, 0);
+        SendMessageW(progress, PBM_SETPOS, static_cast<WPARAM>(position), 0);
+        if (HWND line = GetDlgItem(Item(IDC_SYNC_LOG), static_cast<int>(position))) {
+            SetWindowTextW(line, (ui::WindowText(line) + L"- FAILED").c_str());
+        }
+        task_.info_text.clear();
+    }
+    SelectLastLogLine();
+}
+
+void CWendlowDlg::OnFirstPassComplete() {
+    if (first_worker_) {
+        AwaitAndForget(first_worker_);
+        StartWorker(second_worker_, SyncThreadCE2DT);
+    }
+}
+
+void CWendlowDlg::OnSecondPassComplete() {
+    if (!second_worker_) {
+        return;
+    }
+    AwaitAndForget(second_worker_);
+    HWND progress = Item(IDC_SYNC_PROGRESS);
+    const LRESULT upper_end = SendMessageW(progress, PBM_GETRANGE, FALSE, 0);
+    SendMessageW(progress, PBM_SETPOS, static_cast<WPARAM>(upper_end), 0);
+    if (!task_.info_text.empty()) {
+        AddLogLine(task_.info_text);
+    }
+    const std::wstring complete = Xlate(L"Synchronization complete.");
+    AddLogLine(complete);
+    SelectLastLogLine();
+    SetDlgItemTextW(Handle(), IDC_SYNC_STATUS, complete.c_str());
+    SetDlgItemTextW(Handle(), IDC_SYNC_CANCEL_EXIT, Xlate(L"Exit").c_str());
+    UpdateWindow(Handle());
+    Sleep(100);  // The full bar is seen for a moment.
+    ShowWindow(progress, SW_HIDE);
+}
+
+// A worker's completion is the last thing that it does, so the wait is short.
+void CWendlowDlg::AwaitAndForget(UniqueThread& worker) {
+    SetThreadPriority(worker.Get(), THREAD_PRIORITY_ABOVE_NORMAL);
+    WaitForSingleObject(worker.Get(), INFINITE);
+    worker.Reset();
+}
+
+void CWendlowDlg::AddLogLine(const std::wstring& text) {
+    SendMessageW(Item(IDC_SYNC_LOG), LB_ADDSTRING, 0, reinterpret_cast<LPARAM>(text.c_str()));
+}
+
+void CWendlowDlg::SelectLastLogLine() {
+    HWND log = Item(IDC_SYNC_LOG);
+    const LRESULT lines = SendMessageW(log, LB_GETCOUNT, 0, 0);
+    SendMessageW(log, LB_SETCURSEL, static_cast<WPARAM>(lines - 1), 0);
+}
+
+void CWendlowDlg::AdvanceProgress() {
+    HWND progress = Item(IDC_SYNC_PROGRESS);
+    const LRESULT position = SendMessageW(progress, PBM_GETPOS, 0, 0);
+    SendMessageW(progress, PBM_SETPOS, static_cast<WPARAM>(position + 1), 0);
+}
+
+}  // namespace orvane

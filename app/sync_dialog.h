@@ -1,0 +1,83 @@
+// The synchronization dialog, the program's main window.
+#pragma once
+
+#include <cstdint>
+#include <memory>
+#include <string>
+#include <vector>
+
+#include "app/sync_task.h"
+#include "device/device_tree_reader.h"
+#include "device/file_node.h"
+#include "platform/handles.h"
+#include "settings/settings_store.h"
+#include "ui/dialog.h"
+
+namespace orvane {
+
+// Holds the settings in memory, starts and cancels synchronizations, and shows what their workers report.
+// All of it runs on the user-interface thread. The object must outlive its workers (HasRunningWorker).
+class CWendlowDlg : public ui::Dialog {
+  public:
+    // Loads the settings, which opens a device session and may take as long as ConnectDevice waits.
+    CWendlowDlg();
+
+    // Whether a worker's thread has not ended yet. Any thread may ask once the dialog has closed.
+    bool HasRunningWorker() const;
+
+  protected:
+    bool OnInitDialog() override;
+    void OnCancel() override;
+    bool OnCommand(int id, UINT code) override;
+    std::optional<LRESULT> OnMessage(UINT message, WPARAM wparam, LPARAM lparam) override;
+
+  private:
+    // The listing of one side: tree and table.
+    struct JobListing {
+        FileNode root;
+        FileTable table;
+        std::int32_t rows = 0;
+    };
+
+    void OnSynchronize();
+    void OnCancelExit();
+    void OnSyncNotify();
+    bool OnSysCommand(UINT command);
+    bool OnPaint();
+    std::optional<LRESULT> OnCtlColor(UINT message, HDC dc);
+
+    // Starting a synchronization.
+    bool SettleEarlierRun();
+    JobListing& NewListing();
+    static void Flatten(JobListing& listing);
+    void FillTask(const JobListing& pc, const JobListing& device);
+    void ShowStart();
+    void StartWorker(UniqueThread& worker, LPTHREAD_START_ROUTINE procedure);
+
+    // Handling a report.
+    void HandleReport(SyncReport report);
+    void OnAddInfo();
+    void OnErrorInfo();
+    void OnFirstPassComplete();
+    void OnSecondPassComplete();
+
+    void CancelWorker();
+    void AwaitAndForget(UniqueThread& worker);
+    void AddLogLine(const std::wstring& text);
+    void SelectLastLogLine();
+    void AdvanceProgress();
+
+    UniqueBrush background_;
+    HICON icon_;
+    SyncSettings settings_;
+    SyncSettingsBlock settings_block_;
+    DeviceTreeReader device_tree_;
+    // Every synchronization's listings live until the dialog does: a worker that is late may still read
+    // them.
+    std::vector<std::unique_ptr<JobListing>> listings_;
+    SyncTask task_;
+    UniqueThread first_worker_;   // Desktop to device.
+    UniqueThread second_worker_;  // Device to desktop.
+};
+
+}  // namespace orvane

@@ -1,0 +1,208 @@
+#include "app/sync_pass.h"
+
+#include <functional>
+#include <string>
+#include <utility>
+
+#include "app/sync_task.h"
+#include "device/device_path.h"
+#include "device/ensure_folder.h"
+#include "device/file_copy.h"
+#include "device/folder_copy.h"
+#include "platform/handles.h"
+#include "platform/paths.h"
+#include "qelutils/xlate.h"
+#include "ui/message_box.h"
+
+namespace orvane {
+
+namespace {
+
+// What tells one pass from the other.
+struct PassKind {
+    SyncSide SyncTask::*source;
+    SyncSide SyncTask::*target;
+    bool to_device;
+    const wchar_t* source_label;
+    const wchar_t* target_label;
+    const wchar_t* copy_line;  // The log line of a copy, up to the name; ends with the opening quote.
+    bool translate_copy_line;
+    const wchar_t* disk_full;
+    const wchar_t* failure;
+    std::wstring_view completion;
+};
+
+// That only one of the copy lines is translated and that the failure texts differ by a full stop is how the
+// program's texts are.
+constexpr PassKind kToDevice = {&SyncTask::pc,
+                                &SyncTask::device,
+                                true,
+                                L" [PC]",
+                                L" [Device]",
+                                L"[Desktop to Mobile Device] File copy: \"",
+                                false,
+                                L"[Desktop to Mobile Device] Error: DEVICE DISK FULL.",
+                                L"Communication Error.",
+                                kTaskCompleteDt2Ce};
+constexpr PassKind kToPc = {&SyncTask::device,
+                            &SyncTask::pc,
+                            false,
+                            L" [Device]",
+                            L" [PC]",
+                            L"[Mobile Device to Desktop] File copy: \"",
+                            true,
+                            L"[Mobile Device to Desktop] Error: PC DISK FULL.",
+                            L"Communication Error",
+                            kTaskCompleteCe2Dt};
+
+// One run of a pass, on the worker's thread.
+class SyncPass {
+  public:
+    SyncPass(SyncTask& task, const PassKind& kind)
+        : task_(task),
+          kind_(kind),
+          source_(task.*kind.source),
+          target_(task.*kind.target),
+          index_(*target_.table, target_.rows) {
+        if (task_.overwrite_warn) {
+            ask_replace_ = [this](std::wstring_view name) { return AskReplace(name); };
+        }
+    }
+
+    void Run() {
+        for (std::int32_t row = 0; row < source_.rows; ++row) {
+            if (task_.cancelled || !HandleRow(static_cast<std::size_t>(row))) {
+                return;
+            }
+        }
+        Report(kind_.completion);
+    }
+
+  private:
+    // False when the pass is over because the target disk is full.
+    bool HandleRow(std::size_t row) {
+        const std::wstring& name = source_.table->names[row];
+        const FILETIME& write_time = source_.table->write_times[row];
+        if (ShouldSkipCopy(task_.overwrite_old_files, write_time, name,
+                           {*target_.table, target_.rows, index_}, ask_replace_)) {
+            Report(kIncrementProgress);
+            return true;
+        }
+        if (source_.table->kinds[row] != kKindFile || !PassesExtensionFilter(name, task_.types)) {
+            return true;
+        }
+        return CopyRow(name, write_time);
+    }
+
+    bool CopyRow(const std::wstring& name, const FILETIME& write_time) {
+        const bool can_copy = CanCopy(name);
+        if (can_copy) {
+            EnsureTargetFolder(name);
+        }
+        Report(kAddInfoDisplay, CopyLine(name));
+        const DeviceResult result = can_copy ? CopyFile(name, write_time) : DeviceResult::kFailed;
+        if (result == DeviceResult::kDiskFull) {
+            Report(kAddInfoDisplay, Xlate(kind_.disk_full));
+            return false;
+        }
+        if (result != DeviceResult::kDone) {
+            Report(kErrorInfoDisplay, Xlate(kind_.failure));
+        }
+        if (HasCompanionFolder(name)) {
+            CopyCompanion(CompanionFolder(name));
+        }
+        return true;
+    }
+
+    // Whether both sides can hold the paths of a copy, that of its backup included, and the PC the names.
+    // (The device judges names of its own accord.) Nothing that fails here reaches an operation.
+    bool CanCopy(std::wstring_view name) const {
+        return DevicePathFits(task_.device.folder.size() + name.size(), task_.overwrite_bkp) &&
+               PcPathFits(task_.pc.folder.size() + name.size()) &&
+               (kind_.to_device || IsSafePcRelativePath(name));
+    }
+
+    void EnsureTargetFolder(const std::wstring& name) const {
+        const std::wstring parent(ParentPath(target_.folder + name));
+        if (kind_.to_device) {
+            EnsureDeviceFolder(parent, task_.copy_cancel_event);
+        } else {
+            EnsurePcFolder(parent);
+        }
+    }
+
+    DeviceResult CopyFile(const std::wstring& name, const FILETIME& write_time) const {
+        const HANDLE cancel = task_.copy_cancel_event;
+        const std::wstring pc_path = task_.pc.folder + name;
+        const std::wstring device_path = task_.device.folder + name;
+        return kind_.to_device ? CopyPcFileToDeviceWithBackup(write_time, pc_path, device_path, cancel,
+                                                              task_.overwrite_bkp)
+                               : CopyDeviceFileToPcWithBackup(write_time, device_path, pc_path, cancel, false,
+                                                              task_.overwrite_bkp);
+    }
+
+    // The folder of a job file's name goes with it; what becomes of it is not reported. A job file called
+    // "..wkf" or "...wkf" has no companion: its name without extension is not that of a folder.
+    void CopyCompanion(std::wstring_view name) const {
+        const std::wstring pc_folder = task_.pc.folder + std::wstring(name);
+        const std::wstring device_folder = task_.device.folder + std::wstring(name);
+        if (!IsSafePcRelativePath(name) || !PcPathFits(pc_folder.size()) ||
+            !DevicePathFits(device_folder.size())) {
+            return;
+        }
+        const HANDLE cancel = task_.copy_cancel_event;
+        if (!kind_.to_device) {
+            CopyDeviceFolderToPc(device_folder, pc_folder, cancel, false);
+        } else if (PcEntryExists(pc_folder)) {
+            CopyPcFolderToDevice(pc_folder, device_folder, cancel);
+        }
+    }
+
+    // The question has no owner window: it stands above all windows, whatever the dialog does meanwhile.
+    bool AskReplace(std::wstring_view name) const {
+        const std::wstring text = ReplaceQuestion(target_.folder + std::wstring(name) + kind_.target_label,
+                                                  source_.folder + std::wstring(name) + kind_.source_label);
+        return ui::ShowMessageBox(nullptr, text,
+                                  MB_OKCANCEL | MB_ICONQUESTION | MB_DEFBUTTON2 | MB_SYSTEMMODAL,
+                                  Xlate(L"Synchronization - Warning")) != IDCANCEL;
+    }
+
+    std::wstring CopyLine(const std::wstring& name) const {
+        return (kind_.translate_copy_line ? Xlate(kind_.copy_line) : kind_.copy_line) + name + L'"';
+    }
+
+    void Report(std::wstring_view command, std::optional<std::wstring> info_text = std::nullopt) {
+        task_.reports.Push({command, std::move(info_text)});
+    }
+
+    SyncTask& task_;
+    const PassKind& kind_;
+    const SyncSide& source_;
+    const SyncSide& target_;
+    FileIndex index_;
+    std::function<bool(std::wstring_view)> ask_replace_;  // Empty when the user wants no warning.
+};
+
+void RunPass(void* task, const PassKind& kind) noexcept {
+    auto& sync_task = *static_cast<SyncTask*>(task);
+    try {
+        sync_task.copy_cancel_event = NewManualResetEvent().Release();
+        SyncPass(sync_task, kind).Run();
+    } catch (...) {
+        // Out of memory: the pass ends as a cancelled one does, and what was copied stays.
+    }
+}
+
+}  // namespace
+
+DWORD WINAPI SyncThreadDT2CE(void* task) noexcept {
+    RunPass(task, kToDevice);
+    return 0;
+}
+
+DWORD WINAPI SyncThreadCE2DT(void* task) noexcept {
+    RunPass(task, kToPc);
+    return 0;
+}
+
+}  // namespace orvane

@@ -1,0 +1,63 @@
+// What the synchronization dialog and its workers share.
+#pragma once
+
+#include <windows.h>
+
+#include <atomic>
+#include <cstdint>
+#include <optional>
+#include <string>
+#include <string_view>
+
+#include "selection/copy_rules.h"
+#include "selection/file_table.h"
+#include "ui/report_queue.h"
+
+namespace orvane {
+
+// Posted to the dialog when reports wait in the queue; both parameters 0.
+inline constexpr UINT WM_SYNC_NOTIFY = 100;
+
+// The commands of a report.
+inline constexpr std::wstring_view kIncrementProgress = L"Increment Progress";
+inline constexpr std::wstring_view kAddInfoDisplay = L"Add Info Display";
+inline constexpr std::wstring_view kErrorInfoDisplay = L"Error Info Display";
+inline constexpr std::wstring_view kTaskCompleteDt2Ce = L"Task Complete DT2CE";
+inline constexpr std::wstring_view kTaskCompleteCe2Dt = L"Task Complete CE2DT";
+
+// One report of a worker. A report without an info text leaves the dialog's as it is.
+struct SyncReport {
+    std::wstring_view command;  // One of the constants above.
+    std::optional<std::wstring> info_text;
+};
+
+// One side of a synchronization: its listing and its job folder, without a trailing "\". The table is
+// owned by the dialog and is not changed any more.
+struct SyncSide {
+    const FileTable* table = nullptr;
+    std::int32_t rows = 0;
+    std::wstring folder;
+};
+
+// One per dialog, reused by every synchronization. Everything but the atomics and the queue is filled by the
+// dialog before a worker starts and only read by the worker, except command and info text, which are the
+// dialog's own: the report that it handles.
+struct SyncTask {
+    std::wstring_view command;
+    std::wstring info_text;
+    SyncSide pc;
+    SyncSide device;
+    // Made anew by each worker when it starts, handed to all its device and file operations, signalled by
+    // "Cancel". Never closed: an operation of a cancelled worker may still look at an earlier one.
+    std::atomic<HANDLE> copy_cancel_event = nullptr;
+    // Read by the worker before each row.
+    std::atomic<bool> cancelled = false;
+    // The types that take part; ".img" files follow the bitmap setting in both passes.
+    FileTypes types;
+    bool overwrite_old_files = false;
+    bool overwrite_bkp = false;
+    bool overwrite_warn = false;
+    ui::ReportQueue<SyncReport> reports;
+};
+
+}  // namespace orvane
