@@ -1,0 +1,120 @@
+// Drives the windows of another program from a script. A window is named by its caption, a control by its
+// id. Every command waits up to two minutes for what it needs and ends with exit code 1 if that does not
+// come.
+//
+//   window_driver wait CAPTION               until the window is shown and takes input
+//   window_driver gone CAPTION               until there is no such window
+//   window_driver click CAPTION ID           presses a button, without waiting for what it does
+//   window_driver wait-text CAPTION ID TEXT  until the control's text is TEXT
+//   window_driver list CAPTION ID            prints the lines of a list box, in UTF-8
+
+#include <windows.h>
+
+#include <cstdio>
+#include <cstdlib>
+#include <functional>
+#include <string>
+
+namespace {
+
+constexpr ULONGLONG kPatienceMs = 120'000;
+constexpr DWORD kPollMs = 50;
+
+bool WaitUntil(const std::function<bool()>& condition) {
+    const ULONGLONG end = GetTickCount64() + kPatienceMs;
+    while (!condition()) {
+        if (GetTickCount64() >= end) {
+            return false;
+        }
+        Sleep(kPollMs);
+    }
+    return true;
+}
+
+std::wstring TextOf(HWND window) {
+    std::wstring text(1024, L'\0');
+    const LRESULT length =
+        SendMessageW(window, WM_GETTEXT, text.size(), reinterpret_cast<LPARAM>(text.data()));
+    text.resize(static_cast<std::size_t>(length));
+    return text;
+}
+
+// The shown window of that caption that takes input, null if there is none.
+HWND FindDialog(const std::wstring& caption) {
+    struct Search {
+        const std::wstring& caption;
+        HWND found;
+    } search{caption, nullptr};
+    EnumWindows(
+        [](HWND window, LPARAM parameter) -> BOOL {
+            auto& wanted = *reinterpret_cast<Search*>(parameter);
+            if (IsWindowVisible(window) && IsWindowEnabled(window) && TextOf(window) == wanted.caption) {
+                wanted.found = window;
+                return FALSE;
+            }
+            return TRUE;
+        },
+        reinterpret_cast<LPARAM>(&search));
+    return search.found;
+}
+
+void PrintLine(const std::wstring& line) {
+    std::string utf8(line.size() * 3, '\0');
+    const int length = WideCharToMultiByte(CP_UTF8, 0, line.data(), static_cast<int>(line.size()),
+                                           utf8.data(), static_cast<int>(utf8.size()), nullptr, nullptr);
+    utf8.resize(static_cast<std::size_t>(length));
+    std::puts(utf8.c_str());
+}
+
+void PrintList(HWND list) {
+    const LRESULT count = SendMessageW(list, LB_GETCOUNT, 0, 0);
+    for (LRESULT line = 0; line < count; ++line) {
+        const LRESULT length = SendMessageW(list, LB_GETTEXTLEN, static_cast<WPARAM>(line), 0);
+        std::wstring text(static_cast<std::size_t>(length) + 1, L'\0');
+        SendMessageW(list, LB_GETTEXT, static_cast<WPARAM>(line), reinterpret_cast<LPARAM>(text.data()));
+        text.resize(static_cast<std::size_t>(length));
+        PrintLine(text);
+    }
+}
+
+bool RunOnControl(const std::wstring& verb, HWND dialog, int id, const std::wstring& text) {
+    HWND control = GetDlgItem(dialog, id);
+    if (control == nullptr) {
+        return false;
+    }
+    if (verb == L"click") {
+        return PostMessageW(dialog, WM_COMMAND, MAKEWPARAM(id, BN_CLICKED),
+                            reinterpret_cast<LPARAM>(control)) != FALSE;
+    }
+    if (verb == L"wait-text") {
+        return WaitUntil([&] { return TextOf(control) == text; });
+    }
+    if (verb == L"list") {
+        PrintList(control);
+        return true;
+    }
+    return false;
+}
+
+bool Run(const std::wstring& verb, const std::wstring& caption, int id, const std::wstring& text) {
+    if (verb == L"gone") {
+        return WaitUntil([&] { return FindDialog(caption) == nullptr; });
+    }
+    HWND dialog = nullptr;
+    if (!WaitUntil([&] { return (dialog = FindDialog(caption)) != nullptr; })) {
+        return false;
+    }
+    return verb == L"wait" || RunOnControl(verb, dialog, id, text);
+}
+
+}  // namespace
+
+int wmain(int argc, wchar_t** argv) {
+    if (argc < 3) {
+        std::fputs("window_driver VERB CAPTION [ID [TEXT]]\n", stderr);
+        return 2;
+    }
+    const int id = argc > 3 ? static_cast<int>(std::wcstol(argv[3], nullptr, 10)) : 0;
+    const std::wstring text = argc > 4 ? argv[4] : L"";
+    return Run(argv[1], argv[2], id, text) ? 0 : 1;
+}
