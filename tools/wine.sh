@@ -13,17 +13,19 @@ export WINEDEBUG=${WINEDEBUG:--all}
 export WINEDLLOVERRIDES="mscoree,mshtml,winedbg.exe="
 wine=/usr/lib/wine/wine64
 
-mkdir -p "$WINEPREFIX"
+mkdir -p "$(dirname "$WINEPREFIX")"
 (
   flock 9
   if [ ! -e "$WINEPREFIX/.ready" ]; then
+    # What an interrupted attempt has left is no prefix.
+    rm -rf "$WINEPREFIX"
     "$wine" wineboot -i
     # Without a window manager a managed window that closes can wait for two seconds.
     "$wine" reg add 'HKCU\Software\Wine\X11 Driver' /v Managed /d N /f
     /usr/lib/wine/wineserver -w
     touch "$WINEPREFIX/.ready"
   fi
-) 9>"$WINEPREFIX/.lock" >"$WINEPREFIX/setup.log" 2>&1 </dev/null
+) 9>"$WINEPREFIX.lock" >"$WINEPREFIX.log" 2>&1 </dev/null
 
 if [ -n "${DLL_FOLDER:-}" ]; then
   WINEPATH=Z:${DLL_FOLDER//\//\\}
