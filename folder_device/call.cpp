@@ -1,0 +1,83 @@
+#include "folder_device/call.h"
+
+#include <algorithm>
+
+#include "folder_device/text.h"
+
+namespace folder_device {
+
+Call::~Call() {
+    if (configuration_->trace.IsOpen()) {
+        configuration_->trace.Write(
+            {function_, thread_.sessions.size(), std::move(argument_text_), result_, error_});
+    }
+}
+
+DWORD Call::EnterDevice() {
+    if (!thread_.IsConnected()) {
+        thread_.rapi_error = HRESULT_FROM_WIN32(ERROR_NOT_CONNECTED);
+        return ERROR_NOT_CONNECTED;
+    }
+    if (TheSettings().call_delay != 0) {
+        Sleep(TheSettings().call_delay);
+    }
+    if (configuration_->faults.CountCall()) {
+        thread_.rapi_error = HRESULT_FROM_WIN32(ERROR_DEVICE_NOT_CONNECTED);
+        return ERROR_DEVICE_NOT_CONNECTED;
+    }
+    thread_.rapi_error = S_OK;
+    return Refusal(true);
+}
+
+HRESULT Call::EnterLocal() {
+    const DWORD refusal = Refusal(false);
+    return refusal == ERROR_SUCCESS ? S_OK : ToHresult(refusal);
+}
+
+void Call::LeaveLocal(HRESULT result) {
+    thread_.rapi_error = SUCCEEDED(result) ? S_OK : result;
+    if (FAILED(result)) {
+        error_ = static_cast<DWORD>(result);
+        thread_.last_error =
+            HRESULT_FACILITY(result) == FACILITY_WIN32 ? static_cast<DWORD>(HRESULT_CODE(result)) : error_;
+    }
+    Return(result);
+}
+
+DWORD Call::Refusal(bool reaches_device) {
+    return configuration_->faults.Refusal(function_, reaches_device,
+                                          [this](const std::wstring& path) { return IsOnPath(path); });
+}
+
+bool Call::IsOnPath(const std::wstring& path) const {
+    return std::any_of(
+        arguments_.begin(), arguments_.begin() + argument_count_, [&](const Argument& argument) {
+            if (argument.kind == Argument::Kind::kText) {
+                return argument.text != nullptr && EqualNoCase(argument.text, path);
+            }
+            const auto object = argument.kind == Argument::Kind::kHandle
+                                    ? device_.handles.Find(reinterpret_cast<HANDLE>(argument.number))
+                                    : nullptr;
+            return object != nullptr && EqualNoCase(object->path, path);
+        });
+}
+
+std::wstring Call::ArgumentText() const {
+    std::wstring text;
+    for (std::size_t i = 0; i < argument_count_; ++i) {
+        const Argument& argument = arguments_[i];
+        text += i == 0 ? L"" : L" | ";
+        if (argument.kind == Argument::Kind::kText) {
+            text += argument.text != nullptr ? argument.text : L"(null)";
+            continue;
+        }
+        text += HexText(argument.number);
+        if (argument.kind == Argument::Kind::kHandle) {
+            const auto object = device_.handles.Find(reinterpret_cast<HANDLE>(argument.number));
+            text += object != nullptr ? L" " + object->path : L"";
+        }
+    }
+    return text;
+}
+
+}  // namespace folder_device

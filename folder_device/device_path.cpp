@@ -1,0 +1,104 @@
+#include "folder_device/device_path.h"
+
+#include <algorithm>
+#include <cwchar>
+
+#include "folder_device/text.h"
+
+namespace folder_device {
+
+namespace {
+
+constexpr std::size_t kMaxNameLength = 255;
+
+bool HasUnpairedSurrogate(std::wstring_view name) {
+    for (std::size_t i = 0; i < name.size(); ++i) {
+        if (IS_HIGH_SURROGATE(name[i]) && i + 1 < name.size() && IS_LOW_SURROGATE(name[i + 1])) {
+            ++i;
+        } else if (IS_HIGH_SURROGATE(name[i]) || IS_LOW_SURROGATE(name[i])) {
+            return true;
+        }
+    }
+    return false;
+}
+
+// The names that open a device of the PC from every folder; their digits may be superscript.
+bool IsReserved(std::wstring_view name) {
+    const std::wstring_view base = Trim(name.substr(0, name.find(L'.')));
+    if (base.size() == 4 &&
+        (EqualNoCase(base.substr(0, 3), L"COM") || EqualNoCase(base.substr(0, 3), L"LPT"))) {
+        return std::wstring_view(L"0123456789\u00B9\u00B2\u00B3").find(base[3]) != std::wstring_view::npos;
+    }
+    constexpr std::wstring_view kNames[] = {L"CON", L"PRN", L"AUX", L"NUL", L"CONIN$", L"CONOUT$", L"CLOCK$"};
+    return std::any_of(std::begin(kNames), std::end(kNames),
+                       [base](std::wstring_view reserved) { return EqualNoCase(base, reserved); });
+}
+
+DWORD CheckSyntax(std::wstring_view path) {
+    if (path.size() >= MAX_PATH) {
+        return ERROR_FILENAME_EXCED_RANGE;
+    }
+    if (!path.starts_with(L'\\')) {
+        return ERROR_INVALID_NAME;
+    }
+    if (path.size() == 1) {
+        return ERROR_SUCCESS;
+    }
+    for (const std::wstring_view name : Split(path.substr(1), L'\\')) {
+        if (name.size() > kMaxNameLength) {
+            return ERROR_FILENAME_EXCED_RANGE;
+        }
+        if (!IsDeviceName(name)) {
+            return ERROR_INVALID_NAME;
+        }
+    }
+    return ERROR_SUCCESS;
+}
+
+}  // namespace
+
+bool IsDeviceName(std::wstring_view name) {
+    if (name.empty() || name.size() > kMaxNameLength || name.back() == L'.' || name.back() == L' ') {
+        return false;
+    }
+    const bool forbidden = std::any_of(name.begin(), name.end(), [](wchar_t c) {
+        return c < L' ' || std::wstring_view(L"/\\:*?\"<>|").find(c) != std::wstring_view::npos;
+    });
+    return !forbidden && !HasUnpairedSurrogate(name) && !IsReserved(name);
+}
+
+DWORD Locate(const std::wstring& root, const wchar_t* path, Location& location) {
+    if (path == nullptr) {
+        return ERROR_INVALID_PARAMETER;
+    }
+    const std::wstring_view text(path, wcsnlen(path, MAX_PATH));
+    if (const DWORD error = CheckSyntax(text); error != ERROR_SUCCESS) {
+        return error;
+    }
+    location.device_path = text;
+    location.pc_path = root + location.device_path;
+    if (location.IsRoot()) {
+        location.attributes = GetFileAttributesW(location.pc_path.c_str());
+        return location.IsFolder() ? ERROR_SUCCESS : ERROR_PATH_NOT_FOUND;
+    }
+    for (std::size_t end = location.device_path.find(L'\\', 1); end != std::wstring::npos;
+         end = location.device_path.find(L'\\', end + 1)) {
+        const std::wstring folder = root + location.device_path.substr(0, end);
+        const DWORD attributes = GetFileAttributesW(folder.c_str());
+        if (attributes == INVALID_FILE_ATTRIBUTES || (attributes & FILE_ATTRIBUTE_DIRECTORY) == 0) {
+            return ERROR_PATH_NOT_FOUND;
+        }
+        if ((attributes & FILE_ATTRIBUTE_REPARSE_POINT) != 0) {
+            return ERROR_ACCESS_DENIED;
+        }
+    }
+    location.attributes = GetFileAttributesW(location.pc_path.c_str());
+    if (location.Exists()) {
+        return (location.attributes & FILE_ATTRIBUTE_REPARSE_POINT) != 0 ? ERROR_ACCESS_DENIED
+                                                                         : ERROR_SUCCESS;
+    }
+    const DWORD error = GetLastError();
+    return error == ERROR_FILE_NOT_FOUND ? ERROR_SUCCESS : error;
+}
+
+}  // namespace folder_device

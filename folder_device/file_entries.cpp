@@ -1,0 +1,246 @@
+// Files by handle: open, read, write, move, measure, time, close.
+#include "folder_device/call.h"
+#include "folder_device/device_clock.h"
+#include "folder_device/device_path.h"
+#include "folder_device/entry_points.h"
+
+using namespace folder_device;
+
+namespace {
+
+struct OpenRequest {
+    const wchar_t* path;
+    DWORD access;
+    DWORD share_mode;
+    DWORD creation;
+    DWORD attributes;
+};
+
+// Attributes that a device keeps; the PC's flags (overlapped, delete on close, whole folders) are not its.
+constexpr DWORD kKnownAttributes = FILE_ATTRIBUTE_READONLY | FILE_ATTRIBUTE_HIDDEN | FILE_ATTRIBUTE_SYSTEM |
+                                   FILE_ATTRIBUTE_ARCHIVE | FILE_ATTRIBUTE_NORMAL | FILE_ATTRIBUTE_TEMPORARY;
+constexpr DWORD kKnownAccess = GENERIC_READ | GENERIC_WRITE;
+constexpr DWORD kKnownShare = FILE_SHARE_READ | FILE_SHARE_WRITE;
+
+bool Truncates(DWORD creation) {
+    return creation == CREATE_ALWAYS || creation == TRUNCATE_EXISTING;
+}
+
+// What the PC would refuse too, said here because not every file system under it does.
+DWORD CheckOpen(const OpenRequest& request, const Location& file) {
+    if ((request.access & ~kKnownAccess) != 0 || request.creation < CREATE_NEW ||
+        request.creation > TRUNCATE_EXISTING) {
+        return ERROR_INVALID_PARAMETER;
+    }
+    if (file.Exists() && request.creation == CREATE_NEW) {
+        return ERROR_FILE_EXISTS;
+    }
+    const bool changes = Truncates(request.creation) || (request.access & GENERIC_WRITE) != 0;
+    return file.IsFolder() || (file.IsReadOnly() && changes) ? ERROR_ACCESS_DENIED : ERROR_SUCCESS;
+}
+
+DWORD OpenDeviceFile(Call& call, const OpenRequest& request, HANDLE& result) {
+    const Settings& settings = call.TheSettings();
+    Location file;
+    DWORD error = Locate(settings.root, request.path, file);
+    if (error == ERROR_SUCCESS) {
+        error = CheckOpen(request, file);
+    }
+    if (error != ERROR_SUCCESS) {
+        return error;
+    }
+    StorageChange change(call.TheDevice().storage);
+    const std::uint64_t old_size =
+        change.Limited() && Truncates(request.creation) ? FileSizeAt(file.pc_path) : 0;
+    auto opened = Own<OwnedHandle>(CreateFileW(file.pc_path.c_str(), request.access,
+                                               request.share_mode & kKnownShare, nullptr, request.creation,
+                                               request.attributes & kKnownAttributes, nullptr));
+    const DWORD note = GetLastError();
+    if (!opened) {
+        return note;
+    }
+    change.Book(old_size, 0);
+    const bool existed = request.creation == OPEN_EXISTING || request.creation == TRUNCATE_EXISTING ||
+                         note == ERROR_ALREADY_EXISTS;
+    if (!existed || Truncates(request.creation)) {
+        StampNew(file.pc_path, settings.clock_offset, true);
+    }
+    call.Note(existed && request.creation != OPEN_EXISTING && request.creation != TRUNCATE_EXISTING
+                  ? ERROR_ALREADY_EXISTS
+                  : ERROR_SUCCESS);
+    result = call.TheDevice().handles.Add(
+        std::make_shared<FileObject>(file.device_path, std::move(opened), request.access));
+    return ERROR_SUCCESS;
+}
+
+// Where a write of `wanted` bytes at the file's position would bring its size.
+DWORD SizesOfWrite(HANDLE file, DWORD wanted, std::uint64_t& old_size, std::uint64_t& new_size) {
+    LARGE_INTEGER size;
+    LARGE_INTEGER position;
+    if (!GetFileSizeEx(file, &size) || !SetFilePointerEx(file, {}, &position, FILE_CURRENT)) {
+        return GetLastError();
+    }
+    old_size = static_cast<std::uint64_t>(size.QuadPart);
+    new_size = static_cast<std::uint64_t>(position.QuadPart) + wanted;
+    new_size = wanted == 0 || new_size < old_size ? old_size : new_size;
+    return ERROR_SUCCESS;
+}
+
+// A write gives the file the device's time, unless a time was set through this handle before.
+void StampWritten(FileObject& file, std::int64_t offset) {
+    if (file.explicit_last_write || offset != 0) {
+        const FILETIME time = file.explicit_last_write.value_or(DeviceNow(offset));
+        SetFileTime(file.file.get(), nullptr, nullptr, &time);
+    }
+}
+
+DWORD WriteDeviceFile(Call& call, FileObject& file, LPCVOID buffer, DWORD wanted, DWORD& written) {
+    const std::scoped_lock one_write(file.mutex);
+    StorageChange change(call.TheDevice().storage);
+    std::uint64_t old_size = 0;
+    std::uint64_t new_size = 0;
+    if (change.Limited()) {
+        if (const DWORD error = SizesOfWrite(file.file.get(), wanted, old_size, new_size);
+            error != ERROR_SUCCESS) {
+            return error;
+        }
+        if ((file.access & GENERIC_WRITE) != 0 && !change.HasRoom(old_size, new_size)) {
+            return ERROR_DISK_FULL;
+        }
+    }
+    if (!WriteFile(file.file.get(), buffer, wanted, &written, nullptr)) {
+        return GetLastError();
+    }
+    change.Book(old_size, new_size);
+    if (written != 0) {
+        StampWritten(file, call.TheSettings().clock_offset);
+    }
+    return ERROR_SUCCESS;
+}
+
+// Neither "leave as it is" (zero) nor "never change" (all bits set).
+bool IsTime(const FILETIME* time) {
+    return time != nullptr && (time->dwLowDateTime != 0 || time->dwHighDateTime != 0) &&
+           (time->dwLowDateTime != MAXDWORD || time->dwHighDateTime != MAXDWORD);
+}
+
+// Finds the open file and lets `work` do something with it; ERROR_INVALID_HANDLE when there is none.
+template <class Work>
+DWORD OnFile(Call& call, HANDLE handle, Work work) {
+    const auto file = call.TheDevice().handles.FindKind<FileObject>(handle);
+    return file != nullptr ? work(*file) : static_cast<DWORD>(ERROR_INVALID_HANDLE);
+}
+
+}  // namespace
+
+// Dispositions, share modes and errors are CreateFileW's. Folders cannot be opened, access is GENERIC_READ,
+// GENERIC_WRITE, both or none, deletion cannot be shared. Security and template are not looked at.
+HANDLE WINAPI CeCreateFile(LPCWSTR path, DWORD access, DWORD share_mode, LPSECURITY_ATTRIBUTES /*security*/,
+                           DWORD creation, DWORD attributes, HANDLE /*template_file*/) {
+    Call call(Function::kCreateFile, path, access, share_mode, creation, attributes);
+    HANDLE result = INVALID_HANDLE_VALUE;
+    call.Run([&] { return OpenDeviceFile(call, {path, access, share_mode, creation, attributes}, result); });
+    return call.Return(result);
+}
+
+// Closes a file's handle; those of searches and registry keys have closers of their own.
+BOOL WINAPI CeCloseHandle(HANDLE object) {
+    Call call(Function::kCloseHandle, object);
+    return call.RunBool([&] { return call.TheDevice().handles.Close<FileObject>(object); });
+}
+
+BOOL WINAPI CeReadFile(HANDLE file, LPVOID buffer, DWORD wanted, LPDWORD read, LPOVERLAPPED overlapped) {
+    Call call(Function::kReadFile, file, wanted);
+    if (read != nullptr) {
+        *read = 0;
+    }
+    return call.RunBool([&]() -> DWORD {
+        if (read == nullptr || overlapped != nullptr) {
+            return ERROR_INVALID_PARAMETER;
+        }
+        return OnFile(call, file, [&](FileObject& open) -> DWORD {
+            const std::scoped_lock one_read(open.mutex);
+            return ReadFile(open.file.get(), buffer, wanted, read, nullptr) ? ERROR_SUCCESS : GetLastError();
+        });
+    });
+}
+
+// All of the bytes are written or, when the storage is full (ERROR_DISK_FULL), none.
+BOOL WINAPI CeWriteFile(HANDLE file, LPCVOID buffer, DWORD wanted, LPDWORD written, LPOVERLAPPED overlapped) {
+    Call call(Function::kWriteFile, file, wanted);
+    if (written != nullptr) {
+        *written = 0;
+    }
+    return call.RunBool([&]() -> DWORD {
+        if (written == nullptr || overlapped != nullptr) {
+            return ERROR_INVALID_PARAMETER;
+        }
+        return OnFile(call, file, [&](FileObject& open) {
+            return WriteDeviceFile(call, open, buffer, wanted, *written);
+        });
+    });
+}
+
+// The new position's low half, or 0xFFFFFFFF with the device error not 0.
+DWORD WINAPI CeSetFilePointer(HANDLE file, LONG distance, PLONG distance_high, DWORD method) {
+    Call call(Function::kSetFilePointer, file, distance, method);
+    DWORD low = INVALID_SET_FILE_POINTER;
+    call.Run([&] {
+        return OnFile(call, file, [&](FileObject& open) -> DWORD {
+            const std::scoped_lock one_move(open.mutex);
+            SetLastError(ERROR_SUCCESS);
+            low = SetFilePointer(open.file.get(), distance, distance_high, method);
+            const DWORD error = low == INVALID_SET_FILE_POINTER ? GetLastError() : ERROR_SUCCESS;
+            call.Note(error);
+            return error;
+        });
+    });
+    return call.Return(low);
+}
+
+// The size's low half, or 0xFFFFFFFF with the device error not 0.
+DWORD WINAPI CeGetFileSize(HANDLE file, LPDWORD size_high) {
+    Call call(Function::kGetFileSize, file);
+    DWORD low = INVALID_FILE_SIZE;
+    call.Run([&] {
+        return OnFile(call, file, [&](FileObject& open) -> DWORD {
+            SetLastError(ERROR_SUCCESS);
+            low = GetFileSize(open.file.get(), size_high);
+            const DWORD error = low == INVALID_FILE_SIZE ? GetLastError() : ERROR_SUCCESS;
+            call.Note(error);
+            return error;
+        });
+    });
+    return call.Return(low);
+}
+
+BOOL WINAPI CeGetFileTime(HANDLE file, LPFILETIME creation, LPFILETIME last_access, LPFILETIME last_write) {
+    Call call(Function::kGetFileTime, file);
+    return call.RunBool([&] {
+        return OnFile(call, file, [&](FileObject& open) -> DWORD {
+            return GetFileTime(open.file.get(), creation, last_access, last_write) ? ERROR_SUCCESS
+                                                                                   : GetLastError();
+        });
+    });
+}
+
+// Needs a handle with GENERIC_WRITE. A last-write time set so outlives later writes through the handle.
+BOOL WINAPI CeSetFileTime(HANDLE file, const FILETIME* creation, const FILETIME* last_access,
+                          const FILETIME* last_write) {
+    Call call(Function::kSetFileTime, file);
+    return call.RunBool([&] {
+        return OnFile(call, file, [&](FileObject& open) -> DWORD {
+            const std::scoped_lock one_change(open.mutex);
+            if ((open.access & GENERIC_WRITE) == 0) {
+                return ERROR_ACCESS_DENIED;
+            }
+            if (!SetFileTime(open.file.get(), creation, last_access, last_write)) {
+                return GetLastError();
+            }
+            if (IsTime(last_write)) {
+                open.explicit_last_write = *last_write;
+            }
+            return ERROR_SUCCESS;
+        });
+    });
+}
