@@ -20,6 +20,7 @@ void FlattenTree(FileTable& table, std::int32_t& row, const FileNode& node, cons
                  std::int32_t capacity) {
     if (row == 0) {
         const auto rows = static_cast<std::size_t>(capacity);
+        table = {};  // A folder's times are the zeros that the arrays are made with.
         table.names.resize(rows);
         table.kinds.resize(rows);
         table.creation_times.resize(rows);
