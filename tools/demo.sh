@@ -34,7 +34,9 @@ start_program() {
   program=$!
 }
 
-drive() { "$root/tools/wine.sh" "$release/tools/window_driver.exe" "$@" 2>/dev/null </dev/null | tr -d '\r'; }
+drive() {
+  WINDOW_DESKTOP=orvane "$root/tools/wine.sh" "$release/tools/window_driver.exe" "$@" 2>/dev/null </dev/null | tr -d '\r'
+}
 screenshot() { import -window root "$demo/$1.png"; }
 
 # Every file and folder of both sides with its time and size, as the user sees them.

@@ -7,12 +7,16 @@
 //   window_driver click CAPTION ID           presses a button, without waiting for what it does
 //   window_driver wait-text CAPTION ID TEXT  until the control's text is TEXT
 //   window_driver list CAPTION ID            prints the lines of a list box, in UTF-8
+//
+// The windows are looked for on the desktop that the environment variable WINDOW_DESKTOP names, by default
+// on that of the driver itself.
 
 #include <windows.h>
 
 #include <cstdio>
 #include <cstdlib>
 #include <functional>
+#include <iterator>
 #include <string>
 
 namespace {
@@ -107,6 +111,19 @@ bool Run(const std::wstring& verb, const std::wstring& caption, int id, const st
     return verb == L"wait" || RunOnControl(verb, dialog, id, text);
 }
 
+// Windows of another desktop are out of reach. Wine's virtual desktops are desktops of their own.
+bool MoveToDesktop() {
+    wchar_t name[64] = {};
+    if (GetEnvironmentVariableW(L"WINDOW_DESKTOP", name, static_cast<DWORD>(std::size(name))) == 0) {
+        return true;
+    }
+    // It may not have been made yet. The handle is needed as long as the driver runs.
+    return WaitUntil([&] {
+        HDESK desktop = OpenDesktopW(name, 0, FALSE, GENERIC_ALL);
+        return desktop != nullptr && SetThreadDesktop(desktop);
+    });
+}
+
 }  // namespace
 
 int wmain(int argc, wchar_t** argv) {
@@ -116,5 +133,5 @@ int wmain(int argc, wchar_t** argv) {
     }
     const int id = argc > 3 ? static_cast<int>(std::wcstol(argv[3], nullptr, 10)) : 0;
     const std::wstring text = argc > 4 ? argv[4] : L"";
-    return Run(argv[1], argv[2], id, text) ? 0 : 1;
+    return MoveToDesktop() && Run(argv[1], argv[2], id, text) ? 0 : 1;
 }
