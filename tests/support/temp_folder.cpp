@@ -12,19 +12,46 @@ namespace orvane::testing {
 
 namespace fs = std::filesystem;
 
+namespace {
+
+// Removes the folder, given in the "\\?\" form: only so do paths beyond 260 characters and names such as
+// "a." go, on which the standard library's removal fails or never ends.
+void RemoveTree(const std::wstring& folder) {
+    WIN32_FIND_DATAW entry;
+    const HANDLE search = FindFirstFileW((folder + L"\\*").c_str(), &entry);
+    if (search != INVALID_HANDLE_VALUE) {
+        do {
+            const std::wstring_view name = entry.cFileName;
+            const std::wstring path = folder + L"\\" + entry.cFileName;
+            const bool is_link = (entry.dwFileAttributes & FILE_ATTRIBUTE_REPARSE_POINT) != 0;
+            if ((entry.dwFileAttributes & FILE_ATTRIBUTE_DIRECTORY) == 0) {
+                SetFileAttributesW(path.c_str(), FILE_ATTRIBUTE_NORMAL);
+                DeleteFileW(path.c_str());
+            } else if (is_link) {
+                RemoveDirectoryW(path.c_str());
+            } else if (name != L"." && name != L"..") {
+                RemoveTree(path);
+            }
+        } while (FindNextFileW(search, &entry));
+        FindClose(search);
+    }
+    RemoveDirectoryW(folder.c_str());
+}
+
+}  // namespace
+
 TempFolder::TempFolder() {
     static std::atomic<int> count{0};
     const fs::path folder =
         fs::temp_directory_path() /
         (L"orvane_test_" + std::to_wstring(GetCurrentProcessId()) + L"_" + std::to_wstring(++count));
-    fs::remove_all(folder);
+    RemoveTree(L"\\\\?\\" + folder.wstring());
     fs::create_directories(folder);
     path_ = folder.wstring();
 }
 
 TempFolder::~TempFolder() {
-    std::error_code ignored;
-    fs::remove_all(path_, ignored);
+    RemoveTree(L"\\\\?\\" + path_);
 }
 
 std::wstring TempFolder::operator/(std::wstring_view relative) const {

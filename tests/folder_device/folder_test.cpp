@@ -1,0 +1,1 @@
+#include "tests/folder_device/remote_api_table.h"

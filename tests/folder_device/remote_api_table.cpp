@@ -1,0 +1,102 @@
+#include "tests/folder_device/remote_api_table.h"
+
+#include <algorithm>
+
+namespace orvane::testing {
+
+namespace {
+
+template <class Function>
+void Bind(HMODULE library, const char* name, Function*& function) {
+    function = reinterpret_cast<Function*>(reinterpret_cast<void*>(GetProcAddress(library, name)));
+    EXPECT_NE(function, nullptr) << name;
+}
+
+}  // namespace
+
+#define BIND(name) Bind(library, #name, name)
+
+RemoteApiTable::RemoteApiTable() : library(LoadLibraryW(L"RAPI.DLL")) {
+    BIND(CeCloseHandle);
+    BIND(CeCopyFile);
+    BIND(CeCreateDirectory);
+    BIND(CeCreateFile);
+    BIND(CeDeleteFile);
+    BIND(CeFindAllFiles);
+    BIND(CeFindClose);
+    BIND(CeFindFirstFile);
+    BIND(CeFindNextFile);
+    BIND(CeRapiFreeBuffer);
+    BIND(CeGetDiskFreeSpaceEx);
+    BIND(CeRapiGetError);
+    BIND(CeGetFileSize);
+    BIND(CeGetFileTime);
+    BIND(CeGetLastError);
+    BIND(CeGetVersionEx);
+    BIND(CeRapiInitEx);
+    BIND(CeRapiInvoke);
+    BIND(CeMoveFile);
+    BIND(CeReadFile);
+    BIND(CeRegCloseKey);
+    BIND(CeRegOpenKeyEx);
+    BIND(CeRegQueryValueEx);
+    BIND(CeRemoveDirectory);
+    BIND(CeSetFilePointer);
+    BIND(CeSetFileTime);
+    BIND(CeRapiUninit);
+    BIND(CeWriteFile);
+}
+
+#undef BIND
+
+RemoteApiTable::~RemoteApiTable() {
+    FreeLibrary(library);
+}
+
+HRESULT FolderDeviceTest::Connect() {
+    rapi::InitRecord record{sizeof(rapi::InitRecord), nullptr, E_FAIL};
+    const HRESULT result = api_.CeRapiInitEx(&record);
+    if (FAILED(result)) {
+        return result;
+    }
+    // The test's longest delay is far shorter.
+    EXPECT_EQ(WaitForSingleObject(record.init_event, 5000), WAIT_OBJECT_0);
+    return record.init_result;
+}
+
+void FolderDeviceTest::Reconnect() {
+    device_.CloseSessions();
+    EXPECT_EQ(Connect(), S_OK);
+}
+
+HANDLE FolderDeviceTest::Open(const wchar_t* path, DWORD access, DWORD creation, DWORD share) {
+    return api_.CeCreateFile(path, access, share, nullptr, creation, FILE_ATTRIBUTE_NORMAL, nullptr);
+}
+
+bool FolderDeviceTest::WriteNew(const wchar_t* path, std::string_view content) {
+    const HANDLE file = Open(path, GENERIC_WRITE, CREATE_NEW);
+    return file != INVALID_HANDLE_VALUE && Write(file, content) && api_.CeCloseHandle(file);
+}
+
+bool FolderDeviceTest::Write(HANDLE file, std::string_view bytes) {
+    DWORD written = 0;
+    return api_.CeWriteFile(file, bytes.data(), static_cast<DWORD>(bytes.size()), &written, nullptr) &&
+           written == bytes.size();
+}
+
+std::optional<std::vector<std::wstring>> FolderDeviceTest::Names(const wchar_t* pattern) {
+    DWORD count = 0;
+    rapi::FindData* found = nullptr;
+    if (!api_.CeFindAllFiles(pattern, rapi::kFindName, &count, &found)) {
+        return std::nullopt;
+    }
+    std::vector<std::wstring> names;
+    for (DWORD i = 0; i < count; ++i) {
+        names.emplace_back(found[i].name);
+    }
+    std::sort(names.begin(), names.end());
+    EXPECT_EQ(api_.CeRapiFreeBuffer(found), S_OK);
+    return names;
+}
+
+}  // namespace orvane::testing

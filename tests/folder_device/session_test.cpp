@@ -1,0 +1,181 @@
+#include <thread>
+
+#include "tests/folder_device/remote_api_table.h"
+
+namespace orvane::testing {
+namespace {
+
+class Session : public FolderDeviceTest {};
+
+TEST_F(Session, AreCountedPerThread) {
+    EXPECT_EQ(Connect(), S_OK);
+    EXPECT_EQ(api_.CeRapiUninit(), S_OK);
+    EXPECT_TRUE(Names(L"\\*"));
+    std::thread([this] {
+        EXPECT_FALSE(Names(L"\\*"));
+        EXPECT_EQ(api_.CeGetLastError(), DWORD{ERROR_NOT_CONNECTED});
+        EXPECT_EQ(api_.CeRapiUninit(), E_FAIL);
+        EXPECT_EQ(Connect(), S_OK);
+        EXPECT_TRUE(Names(L"\\*"));  // The thread ends with its session open.
+    }).join();
+    EXPECT_EQ(api_.CeRapiUninit(), S_OK);
+    EXPECT_EQ(api_.CeRapiUninit(), E_FAIL);
+    // No session is left in the process, so a new setting is read.
+    device_.Set(L"INIT_RESULT", L"0x80070005");
+    EXPECT_EQ(Connect(), E_ACCESSDENIED);
+}
+
+TEST_F(Session, OutsideOfOneEveryCallToTheDeviceFails) {
+    ASSERT_TRUE(WriteNew(L"\\a.txt", "a"));
+    const HANDLE file = Open(L"\\a.txt", GENERIC_READ, OPEN_EXISTING);
+    DWORD count = 0;
+    rapi::FindData* found = nullptr;
+    ASSERT_TRUE(api_.CeFindAllFiles(L"\\*", rapi::kFindName, &count, &found));
+    device_.CloseSessions();
+
+    rapi::FindData data;
+    rapi::OsVersionInfo version{};
+    version.size = sizeof(version);
+    char byte = 0;
+    DWORD size = 1;
+    HKEY key = nullptr;
+    ULARGE_INTEGER space;
+    const struct {
+        const char* name;
+        bool failed;
+    } calls[] = {
+        {"CeCloseHandle", !api_.CeCloseHandle(file)},
+        {"CeCopyFile", !api_.CeCopyFile(L"\\a.txt", L"\\b.txt", FALSE)},
+        {"CeCreateDirectory", !api_.CeCreateDirectory(L"\\f", nullptr)},
+        {"CeCreateFile", Open(L"\\a.txt", GENERIC_READ, OPEN_EXISTING) == INVALID_HANDLE_VALUE},
+        {"CeDeleteFile", !api_.CeDeleteFile(L"\\a.txt")},
+        {"CeFindAllFiles", !api_.CeFindAllFiles(L"\\*", 0, &size, &found)},
+        {"CeFindClose", !api_.CeFindClose(file)},
+        {"CeFindFirstFile", api_.CeFindFirstFile(L"\\*", &data) == INVALID_HANDLE_VALUE},
+        {"CeFindNextFile", !api_.CeFindNextFile(file, &data)},
+        {"CeGetDiskFreeSpaceEx", !api_.CeGetDiskFreeSpaceEx(L"\\", &space, nullptr, nullptr)},
+        {"CeGetFileSize", api_.CeGetFileSize(file, nullptr) == INVALID_FILE_SIZE},
+        {"CeGetFileTime", !api_.CeGetFileTime(file, nullptr, nullptr, nullptr)},
+        {"CeGetVersionEx", !api_.CeGetVersionEx(&version)},
+        {"CeRapiInvoke", FAILED(api_.CeRapiInvoke(L"x.dll", L"f", 0, nullptr, nullptr, nullptr, nullptr, 0))},
+        {"CeMoveFile", !api_.CeMoveFile(L"\\a.txt", L"\\b.txt")},
+        {"CeReadFile", !api_.CeReadFile(file, &byte, 1, &size, nullptr)},
+        {"CeRegCloseKey", api_.CeRegCloseKey(HKEY_CURRENT_USER) != 0},
+        {"CeRegOpenKeyEx", api_.CeRegOpenKeyEx(HKEY_CURRENT_USER, nullptr, 0, 0, &key) != 0},
+        {"CeRegQueryValueEx",
+         api_.CeRegQueryValueEx(HKEY_CURRENT_USER, L"x", nullptr, nullptr, nullptr, nullptr) != 0},
+        {"CeRemoveDirectory", !api_.CeRemoveDirectory(L"\\f")},
+        {"CeSetFilePointer", api_.CeSetFilePointer(file, 0, nullptr, FILE_BEGIN) == INVALID_SET_FILE_POINTER},
+        {"CeSetFileTime", !api_.CeSetFileTime(file, nullptr, nullptr, nullptr)},
+        {"CeRapiUninit", FAILED(api_.CeRapiUninit())},
+        {"CeWriteFile", !api_.CeWriteFile(file, &byte, 1, &size, nullptr)},
+    };
+    for (const auto& call : calls) {
+        EXPECT_TRUE(call.failed) << call.name;
+    }
+    EXPECT_EQ(api_.CeGetLastError(), DWORD{ERROR_NOT_CONNECTED});
+    EXPECT_EQ(api_.CeRapiGetError(), HRESULT_FROM_WIN32(ERROR_NOT_CONNECTED));
+    // Listings stay the caller's, and are freed once only.
+    EXPECT_EQ(std::wstring(found != nullptr ? found->name : L""), L"a.txt");
+    EXPECT_EQ(api_.CeRapiFreeBuffer(found), S_OK);
+    EXPECT_EQ(api_.CeRapiFreeBuffer(found), E_INVALIDARG);
+    EXPECT_EQ(api_.CeRapiFreeBuffer(&data), E_INVALIDARG);
+}
+
+TEST_F(Session, TheLastOneClosesEveryHandle) {
+    const HANDLE file = Open(L"\\a.txt", GENERIC_WRITE, CREATE_NEW);
+    ASSERT_NE(file, INVALID_HANDLE_VALUE);
+    EXPECT_FALSE(DeleteFileW(device_.PcPath(L"\\a.txt").c_str()));
+    Reconnect();
+    EXPECT_EQ(ErrorOf(api_.CeCloseHandle(file)), DWORD{ERROR_INVALID_HANDLE});
+    EXPECT_TRUE(DeleteFileW(device_.PcPath(L"\\a.txt").c_str()));
+}
+
+TEST_F(Session, TheRecordMustHaveItsSize) {
+    rapi::InitRecord record{sizeof(rapi::InitRecord) - 4, nullptr, S_OK};
+    EXPECT_EQ(api_.CeRapiInitEx(&record), E_INVALIDARG);
+    EXPECT_EQ(api_.CeRapiInitEx(nullptr), E_INVALIDARG);
+    EXPECT_EQ(device_.CloseSessions(), 1);
+}
+
+TEST_F(Session, AConnectionCanBeLateFailOrStayAway) {
+    device_.CloseSessions();
+    device_.Set(L"CONNECT_DELAY", L"150");
+    rapi::InitRecord late{sizeof(rapi::InitRecord), nullptr, S_OK};
+    ASSERT_EQ(api_.CeRapiInitEx(&late), S_OK);
+    EXPECT_EQ(WaitForSingleObject(late.init_event, 0), DWORD{WAIT_TIMEOUT});
+    EXPECT_FALSE(Names(L"\\*"));
+    EXPECT_EQ(WaitForSingleObject(late.init_event, 5000), WAIT_OBJECT_0);
+    EXPECT_EQ(late.init_result, S_OK);
+    EXPECT_TRUE(Names(L"\\*"));
+    device_.CloseSessions();
+
+    // A record whose session is closed early is not written any more.
+    auto given_up =
+        std::make_unique<rapi::InitRecord>(rapi::InitRecord{sizeof(rapi::InitRecord), nullptr, 77});
+    ASSERT_EQ(api_.CeRapiInitEx(given_up.get()), S_OK);
+    ASSERT_EQ(api_.CeRapiUninit(), S_OK);
+    given_up->init_result = 77;
+    Sleep(250);
+    EXPECT_EQ(given_up->init_result, 77);
+
+    device_.Set(L"CONNECT_RESULT", L"0x80004005");
+    EXPECT_EQ(Connect(), E_FAIL);
+    EXPECT_FALSE(Names(L"\\*"));
+    EXPECT_EQ(device_.CloseSessions(), 1);
+
+    device_.Set(L"CONNECT_DELAY", L"never");
+    rapi::InitRecord away{sizeof(rapi::InitRecord), nullptr, S_OK};
+    ASSERT_EQ(api_.CeRapiInitEx(&away), S_OK);
+    EXPECT_EQ(WaitForSingleObject(away.init_event, 200), DWORD{WAIT_TIMEOUT});
+    EXPECT_EQ(api_.CeRapiUninit(), S_OK);
+}
+
+TEST_F(Session, WithoutTheRootFolderThereIsNoDevice) {
+    device_.CloseSessions();
+    device_.Set(L"ROOT", device_.PcPath(L"\\pulled out"));
+    EXPECT_EQ(Connect(), HRESULT_FROM_WIN32(ERROR_DEVICE_NOT_CONNECTED));
+}
+
+TEST_F(Session, ManyThreadsWorkAtOnce) {
+    device_.CloseSessions();
+    device_.Set(L"CAPACITY", L"1000000");
+    std::vector<std::thread> threads;
+    for (int i = 0; i < 4; ++i) {
+        threads.emplace_back([this, i] {
+            const std::wstring path = L"\\" + std::to_wstring(i) + L".txt";
+            for (int round = 0; round < 50; ++round) {
+                EXPECT_EQ(Connect(), S_OK);
+                EXPECT_TRUE(WriteNew(path.c_str(), "content"));
+                EXPECT_TRUE(Names(L"\\*.txt"));
+                EXPECT_TRUE(api_.CeDeleteFile(path.c_str()));
+                EXPECT_EQ(api_.CeRapiUninit(), S_OK);
+            }
+        });
+    }
+    for (std::thread& thread : threads) {
+        thread.join();
+    }
+    EXPECT_EQ(Connect(), S_OK);
+    EXPECT_EQ(Names(L"\\*"), std::vector<std::wstring>{});
+}
+
+TEST_F(Session, ForeignCodeIsNeverRun) {
+    WriteTextFile(device_.PcPath(L"\\Windows\\there.dll"), "MZ");
+    DWORD size = 9;
+    BYTE* output = reinterpret_cast<BYTE*>(&size);
+    const auto invoke = [&](const wchar_t* dll, const wchar_t* function) {
+        return api_.CeRapiInvoke(dll, function, 0, nullptr, &size, &output, nullptr, 0);
+    };
+    EXPECT_EQ(invoke(L"there.dll", L"Run"), HRESULT_FROM_WIN32(ERROR_BAD_EXE_FORMAT));
+    EXPECT_EQ(size, 0U);
+    EXPECT_EQ(output, nullptr);
+    EXPECT_EQ(invoke(L"\\Windows\\there.dll", L"Run"), HRESULT_FROM_WIN32(ERROR_BAD_EXE_FORMAT));
+    EXPECT_EQ(invoke(L"kernel32.dll", L"Run"), HRESULT_FROM_WIN32(ERROR_FILE_NOT_FOUND));
+    EXPECT_EQ(invoke(L"\\Windows", L"Run"), HRESULT_FROM_WIN32(ERROR_FILE_NOT_FOUND));
+    EXPECT_EQ(invoke(L"..\\there.dll", L"Run"), HRESULT_FROM_WIN32(ERROR_INVALID_NAME));
+    EXPECT_EQ(invoke(L"there.dll", nullptr), E_INVALIDARG);
+}
+
+}  // namespace
+}  // namespace orvane::testing
