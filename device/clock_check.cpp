@@ -72,15 +72,14 @@ bool AcceptsDeviceClock(HWND owner, const FILETIME& device_time) {
 }  // namespace
 
 int CheckDeviceDateTime(HWND owner, HANDLE cancel_event, bool& accepted) {
-    // The result is not looked at: without a session the file cannot be made, which passes the check.
-    ConnectDevice(cancel_event);
+    // Not tested: without a session the file cannot be made, which passes the check.
+    DeviceSession session(cancel_event);
     const std::optional<FILETIME> device_time = ReadDeviceClock(ClockSource::kCreationTime);
     if (!device_time) {
-        return kGoOn;  // The session stays as ConnectDevice left it: this is meant.
+        session.Release();  // It stays open: this is meant.
+        return kGoOn;
     }
-    const bool goes_on = AcceptsDeviceClock(owner, *device_time);
-    CeRapiUninit();
-    if (!goes_on) {
+    if (!AcceptsDeviceClock(owner, *device_time)) {
         return kDeclined;
     }
     accepted = true;
