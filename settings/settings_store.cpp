@@ -119,12 +119,8 @@ std::wstring FindDeviceFolder() {
 
 std::wstring LoadDeviceFolder() {
     const UniqueEvent cancel = NewManualResetEvent();
-    if (FAILED(ConnectDevice(cancel.Get()))) {
-        return {};
-    }
-    std::wstring folder = FindDeviceFolder();
-    CeRapiUninit();
-    return folder;
+    const DeviceSession session(cancel.Get());
+    return session ? FindDeviceFolder() : std::wstring();
 }
 
 }  // namespace
