@@ -129,8 +129,9 @@
 
 // Manual transfer dialog
 #define IDD_TRANSFER 151
-#define IDB_TICK_OFF 153
-#define IDB_TICK_ON 155
+// The tick column's pictures: of an entry that the user ticked, and of one that is not ticked
+#define IDB_TICKED 153
+#define IDB_UNTICKED 155
 #define IDC_TRANSFER_CLOSE 3
 #define IDC_TRANSFER_REFRESH 5
 #define IDC_TRANSFER_COPY 6
