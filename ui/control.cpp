@@ -2,15 +2,18 @@
 
 #include <commctrl.h>
 
+#include <unordered_map>
+
 namespace orvane::ui {
 
 namespace {
 
 // One subclass per window: the procedure and this number identify it.
 constexpr UINT_PTR kSubclassId = 1;
-// The window property that holds the address of the object attached to a window. (The system could tell it
-// from the subclass itself, but not every import library has that call.)
-constexpr wchar_t kObjectProperty[] = L"orvane.control";
+
+// The objects that are attached to windows of this thread. (The system could tell them from the subclass,
+// but not every import library has that call, and lists notify too often for a question to the system.)
+thread_local std::unordered_map<HWND, Control*> attached;
 
 // The control that a notification is about, null for messages that are none.
 HWND NotifyingControl(HWND parent, UINT message, LPARAM lparam) {
@@ -48,16 +51,14 @@ bool Control::Attach(HWND window) {
         return false;
     }
     window_ = window;
-    if (!SetPropW(window, kObjectProperty, this)) {
-        Detach();
-        return false;
-    }
+    class_procedure_ = reinterpret_cast<WNDPROC>(GetClassLongPtrW(window, GCLP_WNDPROC));
+    attached[window] = this;
     return true;
 }
 
 void Control::Detach() {
     if (window_ != nullptr) {
-        RemovePropW(window_, kObjectProperty);
+        attached.erase(window_);
         RemoveWindowSubclass(window_, Thunk, kSubclassId);
         window_ = nullptr;
     }
@@ -77,8 +78,8 @@ LRESULT Control::Default(UINT message, WPARAM wparam, LPARAM lparam) {
 
 std::optional<LRESULT> Control::Reflect(HWND parent, UINT message, WPARAM wparam, LPARAM lparam) {
     HWND source = NotifyingControl(parent, message, lparam);
-    auto* control = source != nullptr ? static_cast<Control*>(GetPropW(source, kObjectProperty)) : nullptr;
-    return control != nullptr ? control->OnReflected(message, wparam, lparam) : std::nullopt;
+    const auto control = attached.find(source);
+    return control != attached.end() ? control->second->OnReflected(message, wparam, lparam) : std::nullopt;
 }
 
 std::optional<LRESULT> Control::Dispatch(UINT message, WPARAM wparam, LPARAM lparam) noexcept {

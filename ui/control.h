@@ -34,6 +34,11 @@ class Control {
     virtual std::optional<LRESULT> OnReflected(UINT message, WPARAM wparam, LPARAM lparam);
     // What the control would do without this layer.
     LRESULT Default(UINT message, WPARAM wparam, LPARAM lparam);
+    // Asks the control itself, past every subclass. For loops over thousands of items and for drawing: the
+    // way through a subclass costs many times what the control needs for its answer. 0 without a window.
+    LRESULT Direct(UINT message, WPARAM wparam, LPARAM lparam) const {
+        return window_ != nullptr ? CallWindowProcW(class_procedure_, window_, message, wparam, lparam) : 0;
+    }
 
   private:
     static LRESULT CALLBACK Thunk(HWND window, UINT message, WPARAM wparam, LPARAM lparam, UINT_PTR id,
@@ -41,6 +46,7 @@ class Control {
     std::optional<LRESULT> Dispatch(UINT message, WPARAM wparam, LPARAM lparam) noexcept;
 
     HWND window_ = nullptr;
+    WNDPROC class_procedure_ = nullptr;
 };
 
 }  // namespace orvane::ui
