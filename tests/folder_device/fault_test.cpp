@@ -1,1 +1,199 @@
+#include <cwchar>
+#include <thread>
+
 #include "tests/folder_device/remote_api_table.h"
+
+namespace orvane::testing {
+namespace {
+
+class Fault : public FolderDeviceTest {};
+
+TEST_F(Fault, SettingsThatCannotBeUnderstoodOpenNoSession) {
+    const struct {
+        const wchar_t* name;
+        const wchar_t* text;
+    } cases[] = {
+        {L"CAPACITY", L"12k"},
+        {L"CAPACITY", L"-1"},
+        {L"CLOCK_OFFSET", L"1.5"},
+        {L"CLOCK_OFFSET", L"99999999999999"},
+        {L"CALL_DELAY", L"4294967296"},
+        {L"CONNECT_DELAY", L"Never"},
+        {L"INIT_RESULT", L"0x1FFFFFFFF"},
+        {L"REFUSE", L"CeWritFile=5"},
+        {L"REFUSE", L"CeWriteFile#0=5"},
+        {L"REFUSE", L"CeWriteFile#3"},
+        {L"REFUSE", L"CeWriteFile=0"},
+        {L"REFUSE", L"CeWriteFile=5;nonsense"},
+        {L"VANISH", L"soon"},
+        {L"EXTRA_ENTRIES", L"\\Jobs"},
+        {L"EXTRA_ENTRIES", L"Jobs|a"},
+        {L"EXTRA_ENTRIES", L"\\Jobs|a|hidden"},
+        {L"FOUND_COUNT", L"0x100000000"},
+        {L"TRACE", L"Z:\\no\\such\\folder\\trace.txt"},
+    };
+    device_.CloseSessions();
+    for (const auto& [name, text] : cases) {
+        device_.Set(name, text);
+        EXPECT_EQ(Connect(), HRESULT_FROM_WIN32(ERROR_BAD_CONFIGURATION)) << ::testing::PrintToString(text);
+        device_.Clear(name);
+    }
+    EXPECT_EQ(Connect(), S_OK);
+}
+
+TEST_F(Fault, TheNamedCallIsRefusedAndNoOther) {
+    device_.Set(L"REFUSE",
+                L"CeCreateDirectory#2=5; CeDeleteFile@\\Jobs\\A.qvj=32 ;CeWriteFile@\\w=x.txt=1117;"
+                L"CeMoveFile=183;CeReadFile#2@\\r.txt=23;CeRapiInvoke=0x80070490;*@\\cursed=1392");
+    Reconnect();
+    EXPECT_TRUE(api_.CeCreateDirectory(L"\\Jobs", nullptr));
+    EXPECT_EQ(ErrorOf(api_.CeCreateDirectory(L"\\2", nullptr)), DWORD{ERROR_ACCESS_DENIED});
+    EXPECT_EQ(api_.CeRapiGetError(), S_OK) << "the device was reached";
+    EXPECT_TRUE(api_.CeCreateDirectory(L"\\2", nullptr));
+    for (const wchar_t* path : {L"\\Jobs\\a.qvj", L"\\Jobs\\b.qvj", L"\\r.txt"}) {
+        ASSERT_TRUE(WriteNew(path, "content"));
+    }
+    EXPECT_EQ(ErrorOf(api_.CeDeleteFile(L"\\jobs\\a.QVJ")), DWORD{ERROR_SHARING_VIOLATION});
+    EXPECT_EQ(ErrorOf(api_.CeDeleteFile(L"\\Jobs\\a.qvj")), DWORD{ERROR_SHARING_VIOLATION});
+    EXPECT_TRUE(api_.CeDeleteFile(L"\\Jobs\\b.qvj"));
+    EXPECT_FALSE(WriteNew(L"\\w=x.txt", "content"));
+    EXPECT_EQ(api_.CeGetLastError(), DWORD{ERROR_IO_DEVICE});
+    for (int i = 0; i < 2; ++i) {
+        EXPECT_EQ(ErrorOf(api_.CeMoveFile(L"\\r.txt", L"\\s.txt")), DWORD{ERROR_ALREADY_EXISTS});
+    }
+    const HANDLE file = Open(L"\\r.txt", GENERIC_READ, OPEN_EXISTING);
+    const HANDLE other = Open(L"\\Jobs\\a.qvj", GENERIC_READ, OPEN_EXISTING);
+    char byte = 0;
+    DWORD read = 0;
+    EXPECT_TRUE(api_.CeReadFile(file, &byte, 1, &read, nullptr));
+    EXPECT_TRUE(api_.CeReadFile(other, &byte, 1, &read, nullptr));
+    EXPECT_EQ(ErrorOf(api_.CeReadFile(file, &byte, 1, &read, nullptr)), DWORD{ERROR_CRC});
+    EXPECT_TRUE(api_.CeReadFile(file, &byte, 1, &read, nullptr));
+    EXPECT_EQ(byte, 'o');
+    EXPECT_EQ(api_.CeRapiInvoke(L"a.dll", L"f", 0, nullptr, nullptr, nullptr, nullptr, 0),
+              static_cast<HRESULT>(0x80070490));
+    EXPECT_EQ(ErrorOf(api_.CeCreateDirectory(L"\\cursed", nullptr)), DWORD{ERROR_FILE_CORRUPT});
+    EXPECT_EQ(ErrorOf(Open(L"\\cursed", GENERIC_READ, CREATE_NEW)), DWORD{ERROR_FILE_CORRUPT});
+}
+
+TEST_F(Fault, CountersRunUntilASettingChanges) {
+    device_.Set(L"REFUSE", L"CeCreateDirectory#2=5;CeRapiInitEx#3=5");
+    Reconnect();
+    EXPECT_TRUE(api_.CeCreateDirectory(L"\\1", nullptr));
+    Reconnect();  // The same texts: the second call is the second still.
+    EXPECT_FALSE(api_.CeCreateDirectory(L"\\2", nullptr));
+    EXPECT_EQ(Connect(), E_ACCESSDENIED);
+    device_.Set(L"CALL_DELAY", L"1");
+    EXPECT_EQ(Connect(), S_OK);  // A session is open, so nothing is read.
+    EXPECT_TRUE(api_.CeCreateDirectory(L"\\2", nullptr));
+    Reconnect();
+    EXPECT_TRUE(api_.CeCreateDirectory(L"\\3", nullptr));
+    EXPECT_FALSE(api_.CeCreateDirectory(L"\\4", nullptr));
+}
+
+TEST_F(Fault, AVanishedDeviceStaysAway) {
+    ASSERT_TRUE(WriteNew(L"\\a.txt", "content"));
+    device_.Set(L"VANISH", L"3");
+    Reconnect();
+    const HANDLE file = Open(L"\\a.txt", GENERIC_READ, OPEN_EXISTING);
+    char byte = 0;
+    DWORD read = 0;
+    EXPECT_TRUE(api_.CeReadFile(file, &byte, 1, &read, nullptr));
+    EXPECT_EQ(ErrorOf(api_.CeReadFile(file, &byte, 1, &read, nullptr)), DWORD{ERROR_DEVICE_NOT_CONNECTED});
+    EXPECT_EQ(api_.CeRapiGetError(), HRESULT_FROM_WIN32(ERROR_DEVICE_NOT_CONNECTED));
+    EXPECT_FALSE(api_.CeCloseHandle(file));
+    EXPECT_EQ(Names(L"\\*"), std::nullopt);
+    device_.CloseSessions();
+    EXPECT_EQ(Connect(), HRESULT_FROM_WIN32(ERROR_DEVICE_NOT_CONNECTED));
+    EXPECT_EQ(device_.CloseSessions(), 1);
+    device_.Clear(L"VANISH");
+    EXPECT_EQ(Connect(), S_OK);
+    EXPECT_TRUE(api_.CeDeleteFile(L"\\a.txt"));
+}
+
+TEST_F(Fault, CallsCanTakeTheirTime) {
+    device_.Set(L"CALL_DELAY", L"60");
+    Reconnect();
+    const ULONGLONG start = GetTickCount64();
+    EXPECT_TRUE(api_.CeCreateDirectory(L"\\a", nullptr));
+    EXPECT_TRUE(api_.CeRemoveDirectory(L"\\a"));
+    EXPECT_GE(GetTickCount64() - start, 110U);
+}
+
+TEST_F(Fault, TheIniFileCountsWhereTheEnvironmentIsSilent) {
+    wchar_t dll[MAX_PATH];
+    GetModuleFileNameW(api_.library, dll, MAX_PATH);
+    const std::wstring path(dll);
+    const std::wstring ini = path.substr(0, path.rfind(L'\\') + 1) + L"folder_device.ini";
+    ASSERT_FALSE(Exists(ini)) << "this test writes and removes it";
+    WriteTextFile(ini, "[other]\nCAPACITY=1\n[Folder_Device]\ncapacity = 4096\nROOT=nowhere\n");
+    const auto total = [this] {
+        ULARGE_INTEGER bytes{};
+        EXPECT_TRUE(api_.CeGetDiskFreeSpaceEx(nullptr, nullptr, &bytes, nullptr));
+        return bytes.QuadPart;
+    };
+    Reconnect();  // ROOT is in the environment.
+    EXPECT_EQ(total(), 4096U);
+    device_.Set(L"CAPACITY", L"0x20");
+    Reconnect();
+    EXPECT_EQ(total(), 32U);
+    device_.Set(L"CAPACITY", L"");
+    Reconnect();
+    EXPECT_GT(total(), 4096U) << "an empty text is the default, no gap for the file to fill";
+    DeleteFileW(ini.c_str());
+}
+
+TEST_F(Fault, TheTraceTellsEveryCall) {
+    device_.StartTrace();
+    Reconnect();
+    const HANDLE file = Open(L"\\J\u00F6b\t.txt", GENERIC_READ, OPEN_EXISTING, FILE_SHARE_READ);
+    ASSERT_EQ(file, INVALID_HANDLE_VALUE);
+    const HANDLE made = Open(L"\\J\u00F6b.txt", GENERIC_WRITE, CREATE_NEW);
+    EXPECT_TRUE(Write(made, "12345"));
+    EXPECT_TRUE(api_.CeCloseHandle(made));
+    std::thread([this] { api_.CeMoveFile(L"\\a", nullptr); }).join();
+    device_.CloseSessions();
+
+    const std::vector<TraceLine> lines = device_.Trace();
+    wchar_t open_file[64];  // A handle, followed by the path that it is open on.
+    std::swprintf(open_file, std::size(open_file), L"0x%llx \\J\u00F6b.txt",
+                  static_cast<unsigned long long>(reinterpret_cast<std::uintptr_t>(made)));
+    const struct {
+        const wchar_t* function;
+        std::size_t sessions;
+        std::vector<std::wstring> arguments;
+        std::uint64_t result;
+        DWORD error;
+    } expected[] = {
+        {L"CeRapiInitEx", 1, {}, 0, 0},
+        {L"CeCreateFile",
+         1,
+         {L"\\J\u00F6b?.txt", L"0x80000000", L"0x1", L"0x3", L"0x80"},
+         reinterpret_cast<std::uintptr_t>(INVALID_HANDLE_VALUE),
+         ERROR_INVALID_NAME},
+        {L"CeCreateFile",
+         1,
+         {L"\\J\u00F6b.txt", L"0x40000000", L"0x0", L"0x1", L"0x80"},
+         reinterpret_cast<std::uintptr_t>(made),
+         0},
+        {L"CeWriteFile", 1, {open_file, L"0x5"}, 1, 0},
+        {L"CeCloseHandle", 1, {open_file}, 1, 0},
+        {L"CeMoveFile", 0, {L"\\a", L"(null)"}, 0, ERROR_NOT_CONNECTED},
+        {L"CeRapiUninit", 0, {}, 0, 0},
+        {L"CeRapiUninit", 0, {}, 0x80004005, 0x80004005},
+    };
+    ASSERT_EQ(lines.size(), std::size(expected));
+    for (std::size_t i = 0; i < lines.size(); ++i) {
+        SCOPED_TRACE(i);
+        EXPECT_EQ(lines[i].number, lines[0].number + i);
+        EXPECT_EQ(lines[i].thread == GetCurrentThreadId(), lines[i].function != L"CeMoveFile");
+        EXPECT_EQ(lines[i].sessions, expected[i].sessions);
+        EXPECT_EQ(lines[i].function, expected[i].function);
+        EXPECT_EQ(lines[i].arguments, expected[i].arguments);
+        EXPECT_EQ(lines[i].result, expected[i].result);
+        EXPECT_EQ(lines[i].error, expected[i].error);
+    }
+}
+
+}  // namespace
+}  // namespace orvane::testing

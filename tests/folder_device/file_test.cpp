@@ -1,1 +1,207 @@
 #include "tests/folder_device/remote_api_table.h"
+
+namespace orvane::testing {
+namespace {
+
+class DeviceFile : public FolderDeviceTest {
+  protected:
+    void TearDown() override {
+        SetFileAttributesW(device_.PcPath(L"\\locked.txt").c_str(), FILE_ATTRIBUTE_NORMAL);
+    }
+};
+
+TEST_F(DeviceFile, OpensAsThePcDoes) {
+    ASSERT_TRUE(WriteNew(L"\\old.txt", "old"));
+    ASSERT_TRUE(WriteNew(L"\\locked.txt", "locked"));
+    ASSERT_TRUE(SetFileAttributesW(device_.PcPath(L"\\locked.txt").c_str(), FILE_ATTRIBUTE_READONLY));
+    ASSERT_TRUE(api_.CeCreateDirectory(L"\\folder", nullptr));
+    const struct {
+        const wchar_t* path;
+        DWORD access;
+        DWORD creation;
+        DWORD error;
+    } cases[] = {
+        {L"\\old.txt", GENERIC_READ, OPEN_EXISTING, 0},
+        {L"\\old.txt", GENERIC_WRITE, CREATE_NEW, ERROR_FILE_EXISTS},
+        {L"\\old.txt", GENERIC_READ | FILE_APPEND_DATA, OPEN_EXISTING, ERROR_INVALID_PARAMETER},
+        {L"\\old.txt", GENERIC_READ, 0, ERROR_INVALID_PARAMETER},
+        {L"\\old.txt", GENERIC_READ, 6, ERROR_INVALID_PARAMETER},
+        {L"\\none.txt", GENERIC_READ, OPEN_EXISTING, ERROR_FILE_NOT_FOUND},
+        {L"\\none.txt", GENERIC_WRITE, TRUNCATE_EXISTING, ERROR_FILE_NOT_FOUND},
+        {L"\\locked.txt", GENERIC_READ, OPEN_EXISTING, 0},
+        {L"\\locked.txt", GENERIC_WRITE, OPEN_EXISTING, ERROR_ACCESS_DENIED},
+        {L"\\locked.txt", GENERIC_READ, CREATE_ALWAYS, ERROR_ACCESS_DENIED},
+        {L"\\folder", GENERIC_READ, OPEN_EXISTING, ERROR_ACCESS_DENIED},
+        {L"\\folder", GENERIC_WRITE, CREATE_ALWAYS, ERROR_ACCESS_DENIED},
+        {L"\\folder", GENERIC_WRITE, CREATE_NEW, ERROR_FILE_EXISTS},
+        {L"\\", GENERIC_READ, OPEN_EXISTING, ERROR_ACCESS_DENIED},
+    };
+    for (const auto& [path, access, creation, error] : cases) {
+        SCOPED_TRACE(::testing::PrintToString(path) + " " + std::to_string(creation));
+        const HANDLE file = Open(path, access, creation);
+        EXPECT_EQ(ErrorOf(file), error);
+        if (file != INVALID_HANDLE_VALUE) {
+            EXPECT_TRUE(api_.CeCloseHandle(file));
+        }
+    }
+    EXPECT_EQ(ReadTextFile(device_.PcPath(L"\\locked.txt")), "locked");
+    // The successes that say more than that.
+    EXPECT_NE(Open(L"\\old.txt", GENERIC_WRITE, CREATE_ALWAYS), INVALID_HANDLE_VALUE);
+    EXPECT_EQ(api_.CeGetLastError(), DWORD{ERROR_ALREADY_EXISTS});
+    EXPECT_EQ(ReadTextFile(device_.PcPath(L"\\old.txt")), std::nullopt) << "share mode 0 must hold";
+}
+
+TEST_F(DeviceFile, SharesAsItWasOpened) {
+    ASSERT_TRUE(WriteNew(L"\\a.txt", "a"));
+    const struct {
+        DWORD first_access, first_share, access, share, error;
+    } cases[] = {
+        {GENERIC_READ, 0, GENERIC_READ, FILE_SHARE_READ, ERROR_SHARING_VIOLATION},
+        {GENERIC_READ, FILE_SHARE_READ, GENERIC_READ, FILE_SHARE_READ, 0},
+        {GENERIC_READ, FILE_SHARE_READ, GENERIC_WRITE, FILE_SHARE_READ, ERROR_SHARING_VIOLATION},
+        {GENERIC_WRITE, FILE_SHARE_READ, GENERIC_READ, FILE_SHARE_READ, ERROR_SHARING_VIOLATION},
+        {GENERIC_WRITE, FILE_SHARE_READ, GENERIC_READ, FILE_SHARE_READ | FILE_SHARE_WRITE, 0},
+    };
+    for (const auto& one : cases) {
+        SCOPED_TRACE(&one - cases);
+        const HANDLE first = Open(L"\\a.txt", one.first_access, OPEN_EXISTING, one.first_share);
+        ASSERT_NE(first, INVALID_HANDLE_VALUE);
+        const HANDLE second = Open(L"\\a.txt", one.access, OPEN_EXISTING, one.share);
+        EXPECT_EQ(ErrorOf(second), one.error);
+        EXPECT_EQ(second != INVALID_HANDLE_VALUE, api_.CeCloseHandle(second) != FALSE);
+        EXPECT_TRUE(api_.CeCloseHandle(first));
+    }
+    const HANDLE open =
+        Open(L"\\a.txt", GENERIC_READ, OPEN_EXISTING, FILE_SHARE_READ | FILE_SHARE_WRITE | FILE_SHARE_DELETE);
+    EXPECT_EQ(ErrorOf(api_.CeDeleteFile(L"\\a.txt")), DWORD{ERROR_SHARING_VIOLATION});
+    EXPECT_EQ(ErrorOf(api_.CeMoveFile(L"\\a.txt", L"\\b.txt")), DWORD{ERROR_SHARING_VIOLATION});
+    EXPECT_TRUE(api_.CeCloseHandle(open));
+    EXPECT_TRUE(api_.CeMoveFile(L"\\a.txt", L"\\b.txt"));
+}
+
+TEST_F(DeviceFile, ReadsWritesAndMovesItsPosition) {
+    const HANDLE file = Open(L"\\a.bin", GENERIC_READ | GENERIC_WRITE, CREATE_NEW);
+    ASSERT_TRUE(Write(file, "0123456789"));
+    LONG high = -1;
+    EXPECT_EQ(api_.CeSetFilePointer(file, -4, &high, FILE_CURRENT), 6U);
+    char bytes[8] = {};
+    DWORD read = 99;
+    EXPECT_TRUE(api_.CeReadFile(file, bytes, sizeof(bytes), &read, nullptr));
+    EXPECT_EQ(std::string(bytes, read), "6789");
+    EXPECT_TRUE(api_.CeReadFile(file, bytes, sizeof(bytes), &read, nullptr));
+    EXPECT_EQ(read, 0U);
+    DWORD size_high = 99;
+    EXPECT_EQ(api_.CeGetFileSize(file, &size_high), 10U);
+    EXPECT_EQ(size_high, 0U);
+    EXPECT_EQ(api_.CeSetFilePointer(file, -11, nullptr, FILE_END), INVALID_SET_FILE_POINTER);
+    EXPECT_EQ(api_.CeGetLastError(), DWORD{ERROR_NEGATIVE_SEEK});
+    // A position can look like the failure value: the error tells.
+    high = 0;
+    EXPECT_EQ(api_.CeSetFilePointer(file, -1, &high, FILE_BEGIN), INVALID_SET_FILE_POINTER);
+    high = 1;
+    EXPECT_EQ(api_.CeSetFilePointer(file, -1, &high, FILE_BEGIN), INVALID_SET_FILE_POINTER);
+    EXPECT_EQ(api_.CeGetLastError(), 0U);
+
+    OVERLAPPED overlapped{};
+    EXPECT_EQ(ErrorOf(api_.CeReadFile(file, bytes, 1, &read, &overlapped)), DWORD{ERROR_INVALID_PARAMETER});
+    EXPECT_EQ(ErrorOf(api_.CeReadFile(file, bytes, 1, nullptr, nullptr)), DWORD{ERROR_INVALID_PARAMETER});
+    EXPECT_EQ(ErrorOf(api_.CeWriteFile(file, bytes, 1, nullptr, nullptr)), DWORD{ERROR_INVALID_PARAMETER});
+    EXPECT_TRUE(api_.CeCloseHandle(file));
+    const HANDLE read_only = Open(L"\\a.bin", GENERIC_READ, OPEN_EXISTING);
+    EXPECT_FALSE(Write(read_only, "x"));
+    EXPECT_EQ(api_.CeGetLastError(), DWORD{ERROR_ACCESS_DENIED});
+}
+
+TEST_F(DeviceFile, HandlesAreClosedOnceAndByTheirOwnCloser) {
+    ASSERT_TRUE(WriteNew(L"\\a.txt", "a"));
+    rapi::FindData data;
+    HKEY key = nullptr;
+    device_.SetRegistry("[HKCU\\Key]");
+    Reconnect();
+    const HANDLE file = Open(L"\\a.txt", GENERIC_READ, OPEN_EXISTING);
+    const HANDLE search = api_.CeFindFirstFile(L"\\*", &data);
+    ASSERT_EQ(api_.CeRegOpenKeyEx(HKEY_CURRENT_USER, L"Key", 0, 0, &key), 0);
+    const HANDLE event = CreateEventW(nullptr, TRUE, FALSE, nullptr);
+    char byte = 0;
+    DWORD read = 0;
+    for (const HANDLE wrong :
+         {search, static_cast<HANDLE>(key), event, HANDLE{nullptr}, INVALID_HANDLE_VALUE}) {
+        EXPECT_EQ(ErrorOf(api_.CeCloseHandle(wrong)), DWORD{ERROR_INVALID_HANDLE});
+        EXPECT_EQ(ErrorOf(api_.CeReadFile(wrong, &byte, 1, &read, nullptr)), DWORD{ERROR_INVALID_HANDLE});
+    }
+    for (const HANDLE wrong : {file, static_cast<HANDLE>(key)}) {
+        EXPECT_EQ(ErrorOf(api_.CeFindNextFile(wrong, &data)), DWORD{ERROR_INVALID_HANDLE});
+        EXPECT_EQ(ErrorOf(api_.CeFindClose(wrong)), DWORD{ERROR_INVALID_HANDLE});
+    }
+    EXPECT_EQ(api_.CeRegCloseKey(static_cast<HKEY>(file)), ERROR_INVALID_HANDLE);
+    CloseHandle(event);
+
+    EXPECT_TRUE(api_.CeCloseHandle(file));
+    EXPECT_TRUE(api_.CeFindClose(search));
+    EXPECT_EQ(api_.CeRegCloseKey(key), 0);
+    // A new file does not bring an old handle back to life.
+    EXPECT_NE(Open(L"\\b.txt", GENERIC_WRITE, CREATE_NEW), file);
+    EXPECT_EQ(ErrorOf(api_.CeCloseHandle(file)), DWORD{ERROR_INVALID_HANDLE});
+    EXPECT_EQ(ErrorOf(api_.CeFindClose(search)), DWORD{ERROR_INVALID_HANDLE});
+    EXPECT_EQ(api_.CeRegCloseKey(key), ERROR_INVALID_HANDLE);
+}
+
+TEST_F(DeviceFile, ATimeThatWasSetOutlivesLaterWrites) {
+    const FILETIME written = UtcTime(2019, 5, 6, 7, 8, 10);
+    const FILETIME read = UtcTime(2020, 1, 2);
+    const HANDLE file = Open(L"\\a.txt", GENERIC_WRITE, CREATE_NEW);
+    ASSERT_TRUE(Write(file, "a"));
+    EXPECT_TRUE(api_.CeSetFileTime(file, nullptr, &read, &written));
+    ASSERT_TRUE(Write(file, "b"));
+    FILETIME last_access{};
+    FILETIME last_write{};
+    EXPECT_TRUE(api_.CeGetFileTime(file, nullptr, &last_access, &last_write));
+    EXPECT_EQ(TicksOf(last_write), TicksOf(written));
+    EXPECT_EQ(TicksOf(last_access), TicksOf(read));
+    EXPECT_TRUE(api_.CeCloseHandle(file));
+    EXPECT_EQ(TicksOf(LastWriteTime(device_.PcPath(L"\\a.txt"))), TicksOf(written));
+
+    const HANDLE read_only = Open(L"\\a.txt", GENERIC_READ, OPEN_EXISTING);
+    EXPECT_EQ(ErrorOf(api_.CeSetFileTime(read_only, nullptr, nullptr, &read)), DWORD{ERROR_ACCESS_DENIED});
+}
+
+// How many seconds the time lies after now.
+double Ahead(const FILETIME& time) {
+    FILETIME now;
+    GetSystemTimeAsFileTime(&now);
+    return (static_cast<double>(TicksOf(time)) - static_cast<double>(TicksOf(now))) / 1e7;
+}
+
+TEST_F(DeviceFile, TheDevicesClockMayBeWrong) {
+    for (const double offset : {3600.0, -90000.0}) {
+        SCOPED_TRACE(offset);
+        device_.Set(L"CLOCK_OFFSET", std::to_wstring(static_cast<int>(offset)));
+        Reconnect();
+        const HANDLE file = Open(L"\\a.txt", GENERIC_READ | GENERIC_WRITE, CREATE_ALWAYS, FILE_SHARE_READ);
+        FILETIME creation{};
+        FILETIME last_write{};
+        EXPECT_TRUE(api_.CeGetFileTime(file, &creation, nullptr, &last_write));
+        EXPECT_NEAR(Ahead(creation), offset, 5);
+        EXPECT_NEAR(Ahead(last_write), offset, 5);
+        const FILETIME old = UtcTime(2001, 1, 1);
+        ASSERT_TRUE(Write(file, "a"));
+        EXPECT_TRUE(api_.CeGetFileTime(file, nullptr, nullptr, &last_write));
+        EXPECT_NEAR(Ahead(last_write), offset, 5);
+        EXPECT_TRUE(api_.CeCloseHandle(file));
+        rapi::FindData data{};
+        EXPECT_TRUE(api_.CeFindClose(api_.CeFindFirstFile(L"\\a.txt", &data)));
+        EXPECT_NEAR(Ahead(data.creation_time), offset, 5);
+        EXPECT_NEAR(Ahead(data.last_write_time), offset, 5);
+
+        // A time that is set is a time, whatever the clock shows; opening to read changes nothing.
+        const HANDLE stamped = Open(L"\\a.txt", GENERIC_WRITE, OPEN_EXISTING);
+        EXPECT_TRUE(api_.CeSetFileTime(stamped, nullptr, nullptr, &old));
+        EXPECT_TRUE(api_.CeCloseHandle(stamped));
+        EXPECT_TRUE(api_.CeCloseHandle(Open(L"\\a.txt", GENERIC_READ, OPEN_EXISTING)));
+        EXPECT_EQ(TicksOf(LastWriteTime(device_.PcPath(L"\\a.txt"))), TicksOf(old));
+        EXPECT_TRUE(api_.CeDeleteFile(L"\\a.txt"));
+    }
+}
+
+}  // namespace
+}  // namespace orvane::testing

@@ -1,1 +1,163 @@
+#include <algorithm>
+#include <cstring>
+
 #include "tests/folder_device/remote_api_table.h"
+
+namespace orvane::testing {
+namespace {
+
+using StringList = std::vector<std::wstring>;
+
+class Find : public FolderDeviceTest {
+  protected:
+    // The names that a search gives one by one; nothing when it finds none.
+    std::optional<StringList> Search(const wchar_t* pattern) {
+        rapi::FindData data;
+        const HANDLE search = api_.CeFindFirstFile(pattern, &data);
+        if (search == INVALID_HANDLE_VALUE) {
+            return std::nullopt;
+        }
+        StringList names;
+        do {
+            names.emplace_back(data.name);
+        } while (api_.CeFindNextFile(search, &data));
+        EXPECT_EQ(api_.CeGetLastError(), DWORD{ERROR_NO_MORE_FILES});
+        EXPECT_TRUE(api_.CeFindClose(search));
+        std::sort(names.begin(), names.end());
+        return names;
+    }
+};
+
+TEST_F(Find, PatternsAreOfNamesAsTheyStand) {
+    for (const wchar_t* name : {L"a.qvj", L"B.QVJ", L"a.qvj.001", L"long name.qvjx", L"noext"}) {
+        WriteTextFile(device_.PcPath(L"\\Jobs\\") + name, name == std::wstring(L"noext") ? "12345" : "");
+    }
+    MakeFolder(device_.PcPath(L"\\Jobs\\sub"));
+    const StringList all = {L"B.QVJ", L"a.qvj", L"a.qvj.001", L"long name.qvjx", L"noext", L"sub"};
+    const struct {
+        const wchar_t* pattern;
+        StringList names;
+        DWORD error;  // Of the search; a whole listing fails only where that is not "file not found".
+    } cases[] = {
+        {L"\\Jobs\\*", all, 0},
+        {L"\\Jobs\\*.*", all, 0},
+        {L"\\Jobs\\*.qvj", {L"B.QVJ", L"a.qvj"}, 0},
+        {L"\\JOBS\\?.q*", {L"B.QVJ", L"a.qvj", L"a.qvj.001"}, 0},
+        {L"\\Jobs\\*a*e*x", {L"long name.qvjx"}, 0},
+        {L"\\Jobs\\b.qvj", {L"B.QVJ"}, 0},
+        {L"\\Jobs", {L"Jobs"}, 0},
+        {L"\\*", {L"Jobs"}, 0},
+        {L"\\Jobs\\*.bmp", {}, ERROR_FILE_NOT_FOUND},
+        {L"\\Jobs\\c.qvj", {}, ERROR_FILE_NOT_FOUND},
+        {L"\\Jobs\\sub\\*", {}, ERROR_FILE_NOT_FOUND},
+    };
+    for (const auto& [pattern, names, error] : cases) {
+        SCOPED_TRACE(::testing::PrintToString(pattern));
+        EXPECT_EQ(Names(pattern), names);
+        EXPECT_EQ(Search(pattern), error == 0 ? std::optional(names) : std::nullopt);
+        if (error != 0) {
+            EXPECT_EQ(api_.CeGetLastError(), error);
+        }
+    }
+    const struct {
+        const wchar_t* pattern;
+        DWORD error;
+    } refused[] = {
+        {L"\\Jobs\\", ERROR_FILE_NOT_FOUND},  {L"\\", ERROR_FILE_NOT_FOUND},
+        {L"\\None\\*", ERROR_PATH_NOT_FOUND}, {L"\\Jobs\\a.qvj\\*", ERROR_PATH_NOT_FOUND},
+        {L"\\J*\\a.qvj", ERROR_INVALID_NAME}, {L"\\Jobs\\..\\*", ERROR_INVALID_NAME},
+        {L"\\Jobs\\*:*", ERROR_INVALID_NAME}, {L"*", ERROR_INVALID_NAME},
+        {nullptr, ERROR_INVALID_PARAMETER},
+    };
+    for (const auto& [pattern, error] : refused) {
+        EXPECT_EQ(Search(pattern), std::nullopt);
+        EXPECT_EQ(api_.CeGetLastError(), error);
+        EXPECT_EQ(Names(pattern), std::nullopt);
+        EXPECT_EQ(api_.CeGetLastError(), error);
+    }
+}
+
+TEST_F(Find, OnlyTheFieldsAskedForAreFilled) {
+    const FILETIME written = UtcTime(2018, 3, 4, 5, 6, 8);
+    WriteTextFile(device_.PcPath(L"\\a.txt"), "123", written);
+    const auto find = [&](DWORD flags) {
+        DWORD count = 0;
+        rapi::FindData* found = nullptr;
+        EXPECT_TRUE(api_.CeFindAllFiles(L"\\a.txt", flags, &count, &found));
+        EXPECT_EQ(count, 1U);
+        const rapi::FindData data = count == 1 ? *found : rapi::FindData{};
+        EXPECT_EQ(api_.CeRapiFreeBuffer(found), S_OK);
+        return data;
+    };
+    const rapi::FindData all = find(0xFF);
+    EXPECT_EQ(all.size_low, 3U);
+    EXPECT_EQ(TicksOf(all.last_write_time), TicksOf(written));
+    EXPECT_EQ(all.attributes & FILE_ATTRIBUTE_DIRECTORY, 0U);
+    EXPECT_NE(all.attributes, 0U);
+    EXPECT_NE(all.object_id, 0U);
+    EXPECT_STREQ(all.name, L"a.txt");
+    EXPECT_EQ(find(0xBF).object_id, 0U);
+    const rapi::FindData nothing{};
+    for (DWORD flag = 1; flag <= 0x80; flag <<= 1U) {
+        SCOPED_TRACE(flag);
+        const rapi::FindData one = find(flag);
+        const auto field = [&](DWORD wanted, auto member) {
+            const auto& expected = flag == wanted ? all : nothing;
+            EXPECT_EQ(std::memcmp(&(one.*member), &(expected.*member), sizeof(one.*member)), 0);
+        };
+        field(rapi::kFindAttributes, &rapi::FindData::attributes);
+        field(rapi::kFindCreationTime, &rapi::FindData::creation_time);
+        field(rapi::kFindLastAccessTime, &rapi::FindData::last_access_time);
+        field(rapi::kFindLastWriteTime, &rapi::FindData::last_write_time);
+        field(rapi::kFindSizeHigh, &rapi::FindData::size_high);
+        field(rapi::kFindSizeLow, &rapi::FindData::size_low);
+        field(rapi::kFindObjectId, &rapi::FindData::object_id);
+        field(rapi::kFindName, &rapi::FindData::name);
+    }
+}
+
+TEST_F(Find, ManyFilesComeInOneBuffer) {
+    for (int i = 0; i < 1500; ++i) {
+        WriteTextFile(device_.PcPath(L"\\many\\" + std::to_wstring(i) + L".txt"), "");
+    }
+    EXPECT_EQ(Names(L"\\many\\*").value_or(StringList{}).size(), 1500U);
+}
+
+TEST_F(Find, ListingsCanBeMadeHostile) {
+    WriteTextFile(device_.PcPath(L"\\Jobs\\real.qvj"), "");
+    device_.Set(
+        L"EXTRA_ENTRIES",
+        L"\\Jobs|..\\evil.qvj; \\jobs|;\\Jobs|..|folder;\\Jobs|CON;\\Jobs|full.|unterminated,size=5000000000"
+        L";\\|top.qvj");
+    Reconnect();
+    DWORD count = 0;
+    rapi::FindData* found = nullptr;
+    ASSERT_TRUE(api_.CeFindAllFiles(L"\\Jobs\\*", 0xBF, &count, &found));
+    ASSERT_EQ(count, 6U);
+    EXPECT_STREQ(found[0].name, L"real.qvj");
+    EXPECT_STREQ(found[1].name, L"..\\evil.qvj");
+    EXPECT_STREQ(found[2].name, L"");
+    EXPECT_STREQ(found[3].name, L"..");
+    EXPECT_EQ(found[3].attributes, DWORD{FILE_ATTRIBUTE_DIRECTORY});
+    EXPECT_STREQ(found[4].name, L"CON");
+    EXPECT_EQ(std::wstring_view(found[5].name, MAX_PATH).find(L'\0'), std::wstring_view::npos);
+    EXPECT_EQ(std::wstring_view(found[5].name, 7), L"full.fu");
+    EXPECT_EQ(found[5].size_high, 1U);
+    EXPECT_EQ(found[5].size_low, 705032704U);
+    EXPECT_EQ(api_.CeRapiFreeBuffer(found), S_OK);
+    EXPECT_EQ(Search(L"\\*.qvj"), StringList{L"top.qvj"});
+
+    device_.Set(L"FOUND_COUNT", L"0xFFFFFFFF");
+    Reconnect();
+    ASSERT_TRUE(api_.CeFindAllFiles(L"\\Jobs\\*", 0xBF, &count, &found));
+    EXPECT_EQ(count, MAXDWORD);
+    EXPECT_EQ(api_.CeRapiFreeBuffer(found), S_OK);
+    device_.Set(L"FOUND_NULL", L"1");
+    Reconnect();
+    ASSERT_TRUE(api_.CeFindAllFiles(L"\\Jobs\\*", 0xBF, &count, &found));
+    EXPECT_EQ(count, MAXDWORD);
+    EXPECT_EQ(found, nullptr);
+}
+
+}  // namespace
+}  // namespace orvane::testing

@@ -1,1 +1,183 @@
 #include "tests/folder_device/remote_api_table.h"
+
+namespace orvane::testing {
+namespace {
+
+using StringList = std::vector<std::wstring>;
+
+class Folder : public FolderDeviceTest {};
+
+TEST_F(Folder, CallsByNameFailAsADeviceDoes) {
+    WriteTextFile(device_.PcPath(L"\\a.txt"), "a");
+    WriteTextFile(device_.PcPath(L"\\b.txt"), "b");
+    WriteTextFile(device_.PcPath(L"\\full\\c.txt"), "c");
+    WriteTextFile(device_.PcPath(L"\\locked.txt"), "l");
+    MakeFolder(device_.PcPath(L"\\empty"));
+    SetFileAttributesW(device_.PcPath(L"\\locked.txt").c_str(), FILE_ATTRIBUTE_READONLY);
+    const StringList before = ListTree(device_.Root());
+    const struct {
+        const char* call;
+        DWORD error;
+        DWORD expected;
+    } calls[] = {
+        {"create folder again", ErrorOf(api_.CeCreateDirectory(L"\\empty", nullptr)), ERROR_ALREADY_EXISTS},
+        {"create folder on a file", ErrorOf(api_.CeCreateDirectory(L"\\a.txt", nullptr)),
+         ERROR_ALREADY_EXISTS},
+        {"create the root", ErrorOf(api_.CeCreateDirectory(L"\\", nullptr)), ERROR_ALREADY_EXISTS},
+        {"create two levels", ErrorOf(api_.CeCreateDirectory(L"\\x\\y", nullptr)), ERROR_PATH_NOT_FOUND},
+        {"remove the root", ErrorOf(api_.CeRemoveDirectory(L"\\")), ERROR_ACCESS_DENIED},
+        {"remove a full folder", ErrorOf(api_.CeRemoveDirectory(L"\\full")), ERROR_DIR_NOT_EMPTY},
+        {"remove a file as folder", ErrorOf(api_.CeRemoveDirectory(L"\\a.txt")), ERROR_DIRECTORY},
+        {"remove nothing", ErrorOf(api_.CeRemoveDirectory(L"\\none")), ERROR_FILE_NOT_FOUND},
+        {"delete a folder", ErrorOf(api_.CeDeleteFile(L"\\empty")), ERROR_ACCESS_DENIED},
+        {"delete a read-only file", ErrorOf(api_.CeDeleteFile(L"\\locked.txt")), ERROR_ACCESS_DENIED},
+        {"delete nothing", ErrorOf(api_.CeDeleteFile(L"\\none")), ERROR_FILE_NOT_FOUND},
+        {"move over a file", ErrorOf(api_.CeMoveFile(L"\\a.txt", L"\\b.txt")), ERROR_ALREADY_EXISTS},
+        {"move nothing", ErrorOf(api_.CeMoveFile(L"\\none", L"\\c.txt")), ERROR_FILE_NOT_FOUND},
+        {"move the root", ErrorOf(api_.CeMoveFile(L"\\", L"\\c")), ERROR_ACCESS_DENIED},
+        {"copy a folder", ErrorOf(api_.CeCopyFile(L"\\full", L"\\c", FALSE)), ERROR_ACCESS_DENIED},
+        {"copy onto a folder", ErrorOf(api_.CeCopyFile(L"\\a.txt", L"\\full", FALSE)), ERROR_ACCESS_DENIED},
+        {"copy over, forbidden", ErrorOf(api_.CeCopyFile(L"\\a.txt", L"\\b.txt", TRUE)), ERROR_FILE_EXISTS},
+        {"copy over read-only", ErrorOf(api_.CeCopyFile(L"\\a.txt", L"\\locked.txt", FALSE)),
+         ERROR_ACCESS_DENIED},
+        {"copy onto itself", ErrorOf(api_.CeCopyFile(L"\\a.txt", L"\\A.TXT", FALSE)),
+         ERROR_SHARING_VIOLATION},
+    };
+    for (const auto& [call, error, expected] : calls) {
+        EXPECT_EQ(error, expected) << call;
+    }
+    EXPECT_FALSE(api_.CeMoveFile(L"\\full", L"\\full\\inner"));
+    EXPECT_EQ(ListTree(device_.Root()), before);
+    EXPECT_EQ(ReadTextFile(device_.PcPath(L"\\a.txt")), "a");
+    EXPECT_EQ(ReadTextFile(device_.PcPath(L"\\b.txt")), "b");
+    SetFileAttributesW(device_.PcPath(L"\\locked.txt").c_str(), FILE_ATTRIBUTE_NORMAL);
+}
+
+TEST_F(Folder, IsFilledRearrangedAndEmptied) {
+    const FILETIME written = UtcTime(2017, 1, 2, 3, 4, 6);
+    ASSERT_TRUE(api_.CeCreateDirectory(L"\\a", nullptr));
+    WriteTextFile(device_.PcPath(L"\\a\\1.txt"), "one", written);
+    EXPECT_TRUE(api_.CeCopyFile(L"\\a\\1.txt", L"\\a\\2.txt", TRUE));
+    EXPECT_TRUE(api_.CeMoveFile(L"\\a\\1.txt", L"\\3.txt"));
+    EXPECT_TRUE(api_.CeMoveFile(L"\\a", L"\\b"));
+    EXPECT_EQ(ListTree(device_.Root()), (StringList{L"3.txt", L"b\\", L"b\\2.txt"}));
+    EXPECT_EQ(ReadTextFile(device_.PcPath(L"\\b\\2.txt")), "one");
+    EXPECT_EQ(TicksOf(LastWriteTime(device_.PcPath(L"\\b\\2.txt"))), TicksOf(written));
+    EXPECT_TRUE(api_.CeCopyFile(L"\\b\\2.txt", L"\\3.txt", FALSE));
+    EXPECT_TRUE(api_.CeDeleteFile(L"\\b\\2.txt"));
+    EXPECT_TRUE(api_.CeRemoveDirectory(L"\\b"));
+    EXPECT_EQ(ListTree(device_.Root()), StringList{L"3.txt"});
+}
+
+// Makes `link` a link to the folder, as the system does that the test runs on: Wine has no links of its own
+// but shows those of the system below it.
+void MakeLink(const std::wstring& link, const std::wstring& folder) {
+    using UnixName = char* CDECL(LPCWSTR);
+    auto* const unix_name = reinterpret_cast<UnixName*>(reinterpret_cast<void*>(
+        GetProcAddress(GetModuleHandleW(L"kernel32.dll"), "wine_get_unix_file_name")));
+    if (unix_name == nullptr) {
+        // A folder, and without administrator's rights where that is allowed.
+        CreateSymbolicLinkW(link.c_str(), folder.c_str(), 0x1 | 0x2);
+        return;
+    }
+    const auto unix_path = [unix_name](const std::wstring& path) {
+        char* const name = unix_name(path.c_str());
+        const std::string copy = name;
+        HeapFree(GetProcessHeap(), 0, name);
+        return std::wstring(copy.begin(), copy.end());
+    };
+    const std::size_t name = link.rfind(L'\\');
+    std::wstring command = L"ln -s \"" + unix_path(folder) + L"\" \"" + unix_path(link.substr(0, name)) +
+                           L"/" + link.substr(name + 1) + L"\"";
+    STARTUPINFOW start{};
+    start.cb = sizeof(start);
+    PROCESS_INFORMATION process{};
+    CreateProcessW(L"Z:\\bin\\ln", command.data(), nullptr, nullptr, FALSE, 0, nullptr, nullptr, &start,
+                   &process);
+    // It gives no handle to wait for; within the time it takes the link is there or never will be.
+    for (int i = 0; i < 200 && !Exists(link); ++i) {
+        Sleep(10);
+    }
+}
+
+TEST_F(Folder, LinksLeadNowhere) {
+    const TempFolder outside;
+    WriteTextFile(outside / L"secret.txt", "secret");
+    const std::wstring link = device_.PcPath(L"\\link");
+    MakeLink(link, outside.Path());
+    const DWORD attributes = GetFileAttributesW(link.c_str());
+    if (attributes == INVALID_FILE_ATTRIBUTES || (attributes & FILE_ATTRIBUTE_REPARSE_POINT) == 0) {
+        GTEST_SKIP() << "no links to be had here";
+    }
+    rapi::FindData data;
+    EXPECT_EQ(Names(L"\\*"), StringList{});
+    EXPECT_EQ(ErrorOf(Open(L"\\link\\secret.txt", GENERIC_READ, OPEN_EXISTING)), DWORD{ERROR_ACCESS_DENIED});
+    EXPECT_EQ(ErrorOf(api_.CeDeleteFile(L"\\link\\secret.txt")), DWORD{ERROR_ACCESS_DENIED});
+    EXPECT_EQ(ErrorOf(api_.CeFindFirstFile(L"\\link\\*", &data)), DWORD{ERROR_ACCESS_DENIED});
+    EXPECT_EQ(ErrorOf(api_.CeFindFirstFile(L"\\link", &data)), DWORD{ERROR_ACCESS_DENIED});
+    EXPECT_EQ(ErrorOf(api_.CeCreateDirectory(L"\\link\\made", nullptr)), DWORD{ERROR_ACCESS_DENIED});
+    EXPECT_EQ(ListTree(outside.Path()), StringList{L"secret.txt"});
+    RemoveDirectoryW(link.c_str());
+}
+
+TEST_F(Folder, AFullStorageRefusesAndHasRoomAgain) {
+    WriteTextFile(device_.PcPath(L"\\Jobs\\old.bin"), std::string(60, 'o'));
+    device_.Set(L"CAPACITY", L"100");
+    Reconnect();
+    const auto room = [this] {
+        ULARGE_INTEGER to_caller{};
+        ULARGE_INTEGER total{};
+        ULARGE_INTEGER left{};
+        EXPECT_TRUE(api_.CeGetDiskFreeSpaceEx(L"\\Jobs", &to_caller, &total, &left));
+        EXPECT_EQ(total.QuadPart, 100U);
+        EXPECT_EQ(to_caller.QuadPart, left.QuadPart);
+        return left.QuadPart;
+    };
+    EXPECT_EQ(room(), 40U);
+    const HANDLE file = Open(L"\\new.bin", GENERIC_WRITE, CREATE_NEW);
+    EXPECT_TRUE(Write(file, std::string(30, 'n')));
+    DWORD written = 99;
+    EXPECT_FALSE(api_.CeWriteFile(file, "12345678901", 11, &written, nullptr));
+    EXPECT_EQ(api_.CeGetLastError(), DWORD{ERROR_DISK_FULL});
+    EXPECT_EQ(written, 0U);
+    EXPECT_EQ(room(), 10U);
+    // Writing over what is there takes no room; a gap does.
+    api_.CeSetFilePointer(file, 0, nullptr, FILE_BEGIN);
+    EXPECT_TRUE(Write(file, std::string(40, 'm')));
+    EXPECT_EQ(room(), 0U);
+    EXPECT_TRUE(Write(file, ""));
+    api_.CeSetFilePointer(file, 500, nullptr, FILE_BEGIN);
+    EXPECT_TRUE(Write(file, ""));
+    EXPECT_FALSE(Write(file, "x"));
+    EXPECT_TRUE(api_.CeCloseHandle(file));
+    EXPECT_EQ(ErrorOf(api_.CeCopyFile(L"\\new.bin", L"\\copy.bin", TRUE)), DWORD{ERROR_DISK_FULL});
+    EXPECT_FALSE(Exists(device_.PcPath(L"\\copy.bin")));
+
+    EXPECT_TRUE(api_.CeDeleteFile(L"\\Jobs\\old.bin"));
+    EXPECT_EQ(room(), 60U);
+    EXPECT_TRUE(api_.CeCopyFile(L"\\new.bin", L"\\copy.bin", TRUE));
+    EXPECT_EQ(room(), 20U);
+    EXPECT_TRUE(api_.CeCopyFile(L"\\new.bin", L"\\copy.bin", FALSE));
+    EXPECT_EQ(room(), 20U);
+    EXPECT_TRUE(api_.CeCloseHandle(Open(L"\\copy.bin", GENERIC_WRITE, CREATE_ALWAYS)));
+    EXPECT_TRUE(api_.CeCloseHandle(Open(L"\\new.bin", GENERIC_WRITE, TRUNCATE_EXISTING)));
+    EXPECT_EQ(room(), 100U);
+    // What was put there past the device counts from the next session on.
+    WriteTextFile(device_.PcPath(L"\\Jobs\\past.bin"), std::string(150, 'p'));
+    Reconnect();
+    EXPECT_EQ(room(), 0U);
+    EXPECT_EQ(ErrorOf(api_.CeGetDiskFreeSpaceEx(L"\\none", nullptr, nullptr, nullptr)),
+              DWORD{ERROR_PATH_NOT_FOUND});
+}
+
+TEST_F(Folder, WithoutACapacityTheDisksSpaceIsGiven) {
+    ULARGE_INTEGER of_device{};
+    ULARGE_INTEGER of_disk{};
+    EXPECT_TRUE(api_.CeGetDiskFreeSpaceEx(nullptr, nullptr, &of_device, nullptr));
+    EXPECT_TRUE(GetDiskFreeSpaceExW(device_.Root().c_str(), nullptr, &of_disk, nullptr));
+    EXPECT_EQ(of_device.QuadPart, of_disk.QuadPart);
+    EXPECT_NE(of_device.QuadPart, 0U);
+}
+
+}  // namespace
+}  // namespace orvane::testing

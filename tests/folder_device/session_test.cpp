@@ -1,3 +1,4 @@
+#include <memory>
 #include <thread>
 
 #include "tests/folder_device/remote_api_table.h"
