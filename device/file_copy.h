@@ -9,10 +9,11 @@
 //
 // Results: kDone; kCancelled when the event was found signalled (but kFailed when that was already so while
 // the copy connected); kDiskFull when a write failed with error 112 in one of the copies that tell it;
-// kFailed for all else. After any result but kDone the partial target is gone. No old file is touched before
-// the source is open: after a failure up to there the target is what it was. A backup (see
-// device/backup_name.h) is made before the target is created and stays, whatever becomes of the copy; when it
-// is asked for and cannot be made, the copy is not begun and the old file stays as it was.
+// kFailed for all else. After any result but kDone the partial target is gone, unless the device no longer
+// answers. No old file is touched before the source is open: after a failure up to there the target is what
+// it was. A backup (see device/backup_name.h) is made before the target is created and stays, whatever
+// becomes of the copy; when it is asked for and cannot be made, the copy is not begun and the old file stays
+// as it was.
 #pragma once
 
 #include <windows.h>
