@@ -173,7 +173,7 @@ TEST(Control, HandlesItsMessagesUntilItIsDetached) {
     EXPECT_EQ(control.Handle(), nullptr);
 }
 
-TEST(MessageBox, BearsTheApplicationsNameUnlessToldOtherwise) {
+TEST(ShowMessageBox, BearsTheApplicationsNameUnlessToldOtherwise) {
     const std::wstring application = ResourceString(IDS_APPLICATION_NAME);
     ASSERT_FALSE(application.empty());
     for (const wchar_t* caption : {L"", L"Another caption"}) {
