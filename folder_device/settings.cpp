@@ -235,6 +235,10 @@ std::optional<Settings> ParseSettings(const SettingTexts& texts, const std::wstr
         settings.found_count = static_cast<DWORD>(*found_count);
     }
     settings.found_null = texts[kFoundNull] == L"1";
+    // A success that is not S_OK would look like a fault that is set and does nothing.
+    if (settings.init_result > 0 || settings.connect_result > 0) {
+        return std::nullopt;
+    }
     return reader.Ok() ? std::optional(std::move(settings)) : std::nullopt;
 }
 

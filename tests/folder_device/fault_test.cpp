@@ -20,6 +20,7 @@ TEST_F(Fault, SettingsThatCannotBeUnderstoodOpenNoSession) {
         {L"CALL_DELAY", L"4294967296"},
         {L"CONNECT_DELAY", L"Never"},
         {L"INIT_RESULT", L"0x1FFFFFFFF"},
+        {L"CONNECT_RESULT", L"5"},
         {L"REFUSE", L"CeWritFile=5"},
         {L"REFUSE", L"CeWriteFile#0=5"},
         {L"REFUSE", L"CeWriteFile#3"},

@@ -69,44 +69,69 @@ TEST_F(Folder, IsFilledRearrangedAndEmptied) {
     EXPECT_EQ(ListTree(device_.Root()), StringList{L"3.txt"});
 }
 
-// Makes `link` a link to the folder, as the system does that the test runs on: Wine has no links of its own
+// A link to a folder, made and removed as the system does that the test runs on: Wine has no links of its own
 // but shows those of the system below it.
-void MakeLink(const std::wstring& link, const std::wstring& folder) {
-    using UnixName = char* CDECL(LPCWSTR);
-    auto* const unix_name = reinterpret_cast<UnixName*>(reinterpret_cast<void*>(
-        GetProcAddress(GetModuleHandleW(L"kernel32.dll"), "wine_get_unix_file_name")));
-    if (unix_name == nullptr) {
-        // A folder, and without administrator's rights where that is allowed.
-        CreateSymbolicLinkW(link.c_str(), folder.c_str(), 0x1 | 0x2);
-        return;
+class FolderLink {
+  public:
+    FolderLink(std::wstring link, const std::wstring& folder) : link_(std::move(link)) {
+        if (unix_name_ == nullptr) {
+            // A folder, and without administrator's rights where that is allowed.
+            CreateSymbolicLinkW(link_.c_str(), folder.c_str(), 0x1 | 0x2);
+        } else {
+            RunUnix(L"ln", L"-s \"" + UnixPath(folder) + L"\" " + UnixLink(), true);
+        }
     }
-    const auto unix_path = [unix_name](const std::wstring& path) {
-        char* const name = unix_name(path.c_str());
+    ~FolderLink() {
+        if (unix_name_ == nullptr) {
+            RemoveDirectoryW(link_.c_str());
+        } else {
+            RunUnix(L"rm", UnixLink(), false);  // Wine would remove what the link leads to.
+        }
+    }
+    FolderLink(const FolderLink&) = delete;
+    FolderLink& operator=(const FolderLink&) = delete;
+
+    bool IsThere() const {
+        const DWORD attributes = GetFileAttributesW(link_.c_str());
+        return attributes != INVALID_FILE_ATTRIBUTES && (attributes & FILE_ATTRIBUTE_REPARSE_POINT) != 0;
+    }
+
+  private:
+    using UnixName = char* CDECL(LPCWSTR);
+
+    std::wstring UnixPath(const std::wstring& path) const {
+        char* const name = unix_name_(path.c_str());
         const std::string copy = name;
         HeapFree(GetProcessHeap(), 0, name);
         return std::wstring(copy.begin(), copy.end());
-    };
-    const std::size_t name = link.rfind(L'\\');
-    std::wstring command = L"ln -s \"" + unix_path(folder) + L"\" \"" + unix_path(link.substr(0, name)) +
-                           L"/" + link.substr(name + 1) + L"\"";
-    STARTUPINFOW start{};
-    start.cb = sizeof(start);
-    PROCESS_INFORMATION process{};
-    CreateProcessW(L"Z:\\bin\\ln", command.data(), nullptr, nullptr, FALSE, 0, nullptr, nullptr, &start,
-                   &process);
-    // It gives no handle to wait for; within the time it takes the link is there or never will be.
-    for (int i = 0; i < 200 && !Exists(link); ++i) {
-        Sleep(10);
     }
-}
+    std::wstring UnixLink() const {
+        const std::size_t name = link_.rfind(L'\\');
+        return L"\"" + UnixPath(link_.substr(0, name)) + L"/" + link_.substr(name + 1) + L"\"";
+    }
+    // Such a process gives no handle to wait for: within two seconds its work is done or never will be.
+    void RunUnix(const std::wstring& program, const std::wstring& arguments, bool makes) const {
+        std::wstring command = program + L" " + arguments;
+        STARTUPINFOW start{};
+        start.cb = sizeof(start);
+        PROCESS_INFORMATION process{};
+        CreateProcessW((L"Z:\\bin\\" + program).c_str(), command.data(), nullptr, nullptr, FALSE, 0, nullptr,
+                       nullptr, &start, &process);
+        for (int i = 0; i < 200 && Exists(link_) != makes; ++i) {
+            Sleep(10);
+        }
+    }
+
+    const std::wstring link_;
+    UnixName* const unix_name_ = reinterpret_cast<UnixName*>(reinterpret_cast<void*>(
+        GetProcAddress(GetModuleHandleW(L"kernel32.dll"), "wine_get_unix_file_name")));
+};
 
 TEST_F(Folder, LinksLeadNowhere) {
     const TempFolder outside;
     WriteTextFile(outside / L"secret.txt", "secret");
-    const std::wstring link = device_.PcPath(L"\\link");
-    MakeLink(link, outside.Path());
-    const DWORD attributes = GetFileAttributesW(link.c_str());
-    if (attributes == INVALID_FILE_ATTRIBUTES || (attributes & FILE_ATTRIBUTE_REPARSE_POINT) == 0) {
+    const FolderLink link(device_.PcPath(L"\\link"), outside.Path());
+    if (!link.IsThere()) {
         GTEST_SKIP() << "no links to be had here";
     }
     rapi::FindData data;
@@ -117,7 +142,6 @@ TEST_F(Folder, LinksLeadNowhere) {
     EXPECT_EQ(ErrorOf(api_.CeFindFirstFile(L"\\link", &data)), DWORD{ERROR_ACCESS_DENIED});
     EXPECT_EQ(ErrorOf(api_.CeCreateDirectory(L"\\link\\made", nullptr)), DWORD{ERROR_ACCESS_DENIED});
     EXPECT_EQ(ListTree(outside.Path()), StringList{L"secret.txt"});
-    RemoveDirectoryW(link.c_str());
 }
 
 TEST_F(Folder, AFullStorageRefusesAndHasRoomAgain) {
