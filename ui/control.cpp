@@ -2,8 +2,6 @@
 
 #include <commctrl.h>
 
-#include <unordered_map>
-
 namespace orvane::ui {
 
 namespace {
@@ -11,9 +9,11 @@ namespace {
 // One subclass per window: the procedure and this number identify it.
 constexpr UINT_PTR kSubclassId = 1;
 
-// The objects that are attached to windows of this thread. (The system could tell them from the subclass,
-// but not every import library has that call, and lists notify too often for a question to the system.)
-thread_local std::unordered_map<HWND, Control*> attached;
+// The objects that are attached to windows of this thread, a handful at most, each leading to the next. (The
+// system could tell them from the subclass, but not every import library has that call, and lists notify too
+// often for a question to the system.) A plain pointer: an object with a destructor may lose its memory
+// before that runs, when a thread other than the first one ends.
+thread_local Control* first_attached = nullptr;
 
 // The control that a notification is about, null for messages that are none.
 HWND NotifyingControl(HWND parent, UINT message, LPARAM lparam) {
@@ -52,13 +52,20 @@ bool Control::Attach(HWND window) {
     }
     window_ = window;
     class_procedure_ = reinterpret_cast<WNDPROC>(GetClassLongPtrW(window, GCLP_WNDPROC));
-    attached[window] = this;
+    next_attached_ = first_attached;
+    first_attached = this;
     return true;
 }
 
 void Control::Detach() {
     if (window_ != nullptr) {
-        attached.erase(window_);
+        Control** link = &first_attached;
+        while (*link != nullptr && *link != this) {
+            link = &(*link)->next_attached_;
+        }
+        if (*link == this) {
+            *link = next_attached_;
+        }
         RemoveWindowSubclass(window_, Thunk, kSubclassId);
         window_ = nullptr;
     }
@@ -78,8 +85,11 @@ LRESULT Control::Default(UINT message, WPARAM wparam, LPARAM lparam) {
 
 std::optional<LRESULT> Control::Reflect(HWND parent, UINT message, WPARAM wparam, LPARAM lparam) {
     HWND source = NotifyingControl(parent, message, lparam);
-    const auto control = attached.find(source);
-    return control != attached.end() ? control->second->OnReflected(message, wparam, lparam) : std::nullopt;
+    Control* control = source != nullptr ? first_attached : nullptr;
+    while (control != nullptr && control->window_ != source) {
+        control = control->next_attached_;
+    }
+    return control != nullptr ? control->OnReflected(message, wparam, lparam) : std::nullopt;
 }
 
 std::optional<LRESULT> Control::Dispatch(UINT message, WPARAM wparam, LPARAM lparam) noexcept {

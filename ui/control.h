@@ -47,6 +47,8 @@ class Control {
 
     HWND window_ = nullptr;
     WNDPROC class_procedure_ = nullptr;
+    // The next in the list of the controls that are attached on this thread.
+    Control* next_attached_ = nullptr;
 };
 
 }  // namespace orvane::ui
