@@ -1,0 +1,111 @@
+#include "transfer/candidates.h"
+
+#include <string_view>
+#include <unordered_map>
+
+#include "platform/file_time.h"
+#include "platform/paths.h"
+#include "platform/text_case.h"
+#include "qelutils/text_format.h"
+#include "selection/pc_listing.h"
+
+namespace orvane {
+
+namespace {
+
+constexpr std::size_t kExtensionChars = 4;
+
+struct NameHash {
+    std::size_t operator()(std::wstring_view name) const { return HashIgnoringCase(name); }
+};
+struct NameEqual {
+    bool operator()(std::wstring_view a, std::wstring_view b) const { return EqualIgnoringCase(a, b); }
+};
+
+std::wstring DateText(const FILETIME& time) {
+    const CalendarTime local = ToLocalCalendar(time);
+    return qel_text::Format(L"%02d/%02d/%04d %02d:%02d:%02d", local.day, local.month, local.year, local.hour,
+                            local.minute, local.second);
+}
+
+}  // namespace
+
+JobTable::JobTable(const FileNode& root) {
+    FlattenTree(table, rows, root, {}, CountEntries(0, root));
+}
+
+JobTable ListPcJobFolder(const std::wstring& folder) {
+    FileNode root;
+    if (!folder.empty()) {
+        ListPcFolder(JoinPath(folder, L"*.*"), true, root);
+    }
+    return JobTable(root);
+}
+
+Comparison NewComparison(const SyncSettingsBlock& settings) {
+    Comparison comparison;
+    comparison.types = {
+        .qvj = IsOn(settings.sync_qvj_files),
+        .tn3 = IsOn(settings.sync_tn3_files),
+        .rd3 = IsOn(settings.sync_rd3_files),
+        .pt3 = IsOn(settings.sync_pt3_files),
+        .ln3 = IsOn(settings.sync_ln3_files),
+        .jpg = IsOn(settings.sync_jpg_files),
+        .bmp = IsOn(settings.sync_bmp_files),
+        .img = IsOn(settings.sync_img_files),
+        .xml = IsOn(settings.sync_xml_files),
+        .tp3 = IsOn(settings.sync_tp3_files),
+        .wkf = IsOn(settings.sync_wkf_files),
+        .txt = IsOn(settings.sync_txt_files),
+    };
+    comparison.overwrite_old_files = IsOn(settings.overwrite_old_files);
+    return comparison;
+}
+
+bool IsListedType(std::wstring_view name, const FileTypes& types) {
+    return name.size() > kExtensionChars && PassesExtensionFilter(name, types);
+}
+
+bool BuildCandidates(const Comparison& comparison, const JobTable& source, const JobTable& target,
+                     std::vector<sFileDate>& candidates) {
+    candidates.clear();
+    const FileIndex index(target.table, target.rows);
+    const CopyTarget copy_target{target.table, target.rows, index};
+    for (std::int32_t i = 0; i < source.rows; ++i) {
+        if (comparison.stopped) {
+            return false;
+        }
+        const auto row = static_cast<std::size_t>(i);
+        const std::wstring& name = source.table.names[row];
+        const FILETIME& write_time = source.table.write_times[row];
+        // The user decides by ticking: nothing is asked here.
+        if (source.table.kinds[row] != kKindFile ||
+            ShouldSkipCopy(comparison.overwrite_old_files, write_time, name, copy_target, {})) {
+            continue;
+        }
+        std::wstring relative = name.substr(1);
+        if (IsListedType(relative, comparison.types)) {
+            candidates.push_back({std::move(relative), DateText(write_time)});
+        }
+    }
+    return true;
+}
+
+void RemoveCandidates(std::vector<sFileDate>& candidates, const std::vector<std::wstring>& names) {
+    std::unordered_map<std::wstring_view, int, NameHash, NameEqual> wanted;
+    for (const std::wstring& name : names) {
+        ++wanted[name];
+    }
+    std::vector<sFileDate> kept;
+    for (sFileDate& candidate : candidates) {
+        const auto found = wanted.find(candidate.first_text);
+        if (found != wanted.end() && found->second > 0) {
+            --found->second;
+        } else {
+            kept.push_back(std::move(candidate));
+        }
+    }
+    candidates = std::move(kept);
+}
+
+}  // namespace orvane

@@ -1,0 +1,58 @@
+// What the manual view lists: the files of one job folder that the other one lacks or holds an older
+// version of. No windows, no threads of its own.
+#pragma once
+
+#include <cstdint>
+#include <string>
+#include <vector>
+
+#include "controls/sorted_list_record.h"
+#include "device/file_node.h"
+#include "selection/copy_rules.h"
+#include "selection/file_table.h"
+#include "settings/settings_store.h"
+
+namespace orvane {
+
+// One entry of a list. Its first text is the name below the job folder, without "\" in front
+// ("Job1\pic.jpg"); its second one is the source's last-write time in local time, "dd/mm/yyyy hh:mm:ss".
+using sFileDate = SortedListRecord;
+
+// A job folder with all that lies below it, as a table.
+struct JobTable {
+    JobTable() = default;
+    explicit JobTable(const FileNode& root);
+
+    FileTable table;
+    std::int32_t rows = 0;
+};
+
+// Reads the PC job folder. A folder that cannot be searched, or no folder at all (an empty text, which must
+// not come to mean the root of a drive), gives an empty table; a sub-folder that cannot be searched ends the
+// listing there.
+JobTable ListPcJobFolder(const std::wstring& folder);
+
+// What the two lists are made from.
+struct Comparison {
+    JobTable pc;
+    JobTable device;
+    FileTypes types;           // Those that are listed; ".img" follows a flag of its own here.
+    bool overwrite_old_files;  // Whether an older file on the other side may be replaced.
+    bool stopped = false;      // Ends a build.
+};
+
+Comparison NewComparison(const SyncSettingsBlock& settings);
+
+// Whether a file of that name, taken without "\" in front, may be listed at all. A name of four characters
+// or fewer cannot carry an extension.
+bool IsListedType(std::wstring_view name, const FileTypes& types);
+
+// Collects into `candidates` (emptied first) the files of `source`, in its order and unticked, that would be
+// copied to the side of `target`. Both are tables of `comparison`. False when the build was stopped.
+bool BuildCandidates(const Comparison& comparison, const JobTable& source, const JobTable& target,
+                     std::vector<sFileDate>& candidates);
+
+// Takes out of `candidates` the first entry of each of the names, without regard to case.
+void RemoveCandidates(std::vector<sFileDate>& candidates, const std::vector<std::wstring>& names);
+
+}  // namespace orvane

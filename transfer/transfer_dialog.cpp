@@ -1,0 +1,435 @@
+#include "transfer/transfer_dialog.h"
+
+#include <algorithm>
+#include <utility>
+
+#include "device/clock_check.h"
+#include "device/connect.h"
+#include "platform/paths.h"
+#include "platform/text_case.h"
+#include "qelutils/xlate.h"
+#include "res/ids.h"
+#include "transfer/copy_progress.h"
+#include "transfer/selected_copy.h"
+#include "ui/message_box.h"
+#include "ui/wait_cursor.h"
+
+namespace orvane {
+
+namespace {
+
+struct Column {
+    const wchar_t* title;
+    int width;  // Pixels.
+};
+constexpr std::array<Column, 3> kColumns = {{{L"File Name", 300}, {L"Date", 130}, {L" ", 20}}};
+
+// A kind that needs an extra value, whatever it is.
+constexpr DWORD kColumnWithExtra = 0x2;
+constexpr INT_PTR kExtra = 1;
+
+void InsertColumn(HWND list, int index, const Column& column) {
+    std::wstring title = Xlate(column.title);
+    LVCOLUMNW item{};
+    item.mask = LVCF_FMT | LVCF_WIDTH | LVCF_TEXT;
+    item.fmt = LVCFMT_LEFT;
+    item.cx = column.width;
+    item.pszText = title.data();
+    SendMessageW(list, LVM_INSERTCOLUMNW, static_cast<WPARAM>(index), reinterpret_cast<LPARAM>(&item));
+}
+
+void InsertTab(HWND tabs, int index, const wchar_t* text) {
+    std::wstring title = Xlate(text);
+    TCITEMW item{};
+    item.mask = TCIF_TEXT;
+    item.pszText = title.data();
+    SendMessageW(tabs, TCM_INSERTITEMW, static_cast<WPARAM>(index), reinterpret_cast<LPARAM>(&item));
+}
+
+bool SameFolder(std::wstring_view a, std::wstring_view b) {
+    return EqualIgnoringCase(WithoutTrailingBackslashes(a), WithoutTrailingBackslashes(b));
+}
+
+}  // namespace
+
+bool CCeFileTransfDlg::Page::HasTicked() const {
+    return std::any_of(candidates.begin(), candidates.end(),
+                       [](const sFileDate& entry) { return entry.ticked; });
+}
+
+bool CCeFileTransfDlg::Page::AllTicked() const {
+    return std::all_of(candidates.begin(), candidates.end(),
+                       [](const sFileDate& entry) { return entry.ticked; });
+}
+
+CCeFileTransfDlg::CCeFileTransfDlg(const SyncSettingsBlock& settings, bool date_check_done, HWND parent)
+    : ui::Dialog(IDD_TRANSFER, parent),
+      settings_(settings),
+      date_check_done_(date_check_done),
+      pages_{Page{.list_id = IDC_TRANSFER_PC_LIST,
+                  .from_id = IDC_TRANSFER_PC_FROM,
+                  .folder_id = IDC_TRANSFER_PC_FOLDER,
+                  .all_id = IDC_TRANSFER_PC_ALL},
+             Page{.list_id = IDC_TRANSFER_DEVICE_LIST,
+                  .from_id = IDC_TRANSFER_DEVICE_FROM,
+                  .folder_id = IDC_TRANSFER_DEVICE_FOLDER,
+                  .all_id = IDC_TRANSFER_DEVICE_ALL}} {}
+
+void CCeFileTransfDlg::DoDataExchange(ui::DataExchange& exchange) {
+    for (Page& page : pages_) {
+        exchange.Check(page.all_id, page.all_ticked);
+    }
+}
+
+bool CCeFileTransfDlg::OnInitDialog() {
+    ui::Dialog::OnInitDialog();
+    XlateWnd(Handle());
+    UpdateData(true);
+    for (Page& page : pages_) {
+        SetUpList(page);
+    }
+    // Meant for the PC's list alone; text columns of this kind look like all others.
+    pages_[kPcPage].list.SetColumnKind(0, kColumnWithExtra, kExtra);
+    pages_[kPcPage].list.SetColumnKind(1, kColumnWithExtra, kExtra);
+    ShowFolders();
+    SetUpTabs();
+    ShowWindow(Handle(), SW_SHOW);
+    UpdateWindow(Handle());
+    if (!date_check_done_ && CheckDeviceDateTimeForFileView(Handle(), device_tree_.StopEvent()) == 0) {
+        End(0);
+        return true;
+    }
+    OnRefresh();
+    return true;
+}
+
+void CCeFileTransfDlg::SetUpList(Page& page) {
+    HWND list = Item(page.list_id);
+    for (std::size_t column = 0; column < kColumns.size(); ++column) {
+        InsertColumn(list, static_cast<int>(column), kColumns[column]);
+    }
+    page.list.Attach(list);
+    page.list.SetItems(page.candidates);
+    page.list.SetColumnCount(kColumns.size());
+    page.list.SetSortEnabled(true);
+    page.list.SetColumnKind(2, kColumnCheckBox);
+    page.list.SetNotifyWindow(Handle());
+}
+
+void CCeFileTransfDlg::SetUpTabs() {
+    tabs_.Attach(Item(IDC_TRANSFER_TABS));
+    // The item that is at its place already moves on.
+    InsertTab(tabs_.Handle(), 0, L"Mobile Device");
+    InsertTab(tabs_.Handle(), 0, L"PC");
+    for (const int number : {kDevicePage, kPcPage}) {
+        const Page& page = pages_[static_cast<std::size_t>(number)];
+        for (const int id : {page.list_id, page.from_id, page.folder_id, page.all_id, IDC_TRANSFER_COPY}) {
+            tabs_.AttachControlToTab(Item(id), number);
+        }
+    }
+    tabs_.SetCurSel(kPcPage);
+    current_page_ = kPcPage;
+    tabs_.SetNotifyWindow(Handle());
+}
+
+void CCeFileTransfDlg::ShowFolders() {
+    SetDlgItemTextW(Handle(), IDC_TRANSFER_PC_FOLDER, settings_.sync_path_dt.c_str());
+    SetDlgItemTextW(Handle(), IDC_TRANSFER_DEVICE_FOLDER, settings_.sync_path_ce.c_str());
+}
+
+bool CCeFileTransfDlg::OnCommand(int id, UINT code) {
+    if (code != BN_CLICKED) {
+        return false;
+    }
+    switch (id) {
+        case IDC_TRANSFER_REFRESH:
+            UpdateData(true);
+            OnRefresh();
+            return true;
+        case IDC_TRANSFER_SETTINGS:
+            OnSettings();
+            return true;
+        case IDC_TRANSFER_COPY:
+            OnCopySelected();
+            return true;
+        case IDC_TRANSFER_COPY_ALL:
+            OnCopyAll(/*ticked_only=*/true);
+            return true;
+        case IDC_TRANSFER_SYNCHRONIZE:
+            OnCopyAll(/*ticked_only=*/false);
+            return true;
+        case IDC_TRANSFER_PC_ALL:
+            OnSelectAll(pages_[kPcPage]);
+            return true;
+        case IDC_TRANSFER_DEVICE_ALL:
+            OnSelectAll(pages_[kDevicePage]);
+            return true;
+        case IDC_TRANSFER_CLOSE:
+            UpdateData(true);
+            OnCancel();
+            return true;
+        default:
+            return false;
+    }
+}
+
+std::optional<LRESULT> CCeFileTransfDlg::OnMessage(UINT message, WPARAM wparam, LPARAM lparam) {
+    switch (message) {
+        case kTabPageChanged:
+            OnPageChanged(static_cast<int>(lparam));
+            return 0;
+        case kListDoubleClick:
+            OnListDoubleClick(reinterpret_cast<HWND>(lparam));
+            return 0;
+        case kListItemsDrawn:
+            OnListItemsDrawn(reinterpret_cast<HWND>(lparam));
+            return 0;
+        case kListingReady:
+            if (wparam != 0) {
+                return std::nullopt;
+            }
+            OnListingReady(lparam == 0 ? kDevicePage : kPcPage);
+            return 0;
+        default:
+            return std::nullopt;
+    }
+}
+
+void CCeFileTransfDlg::OnRefresh() {
+    const ui::WaitCursor wait;
+    for (Page& page : pages_) {
+        page.candidates.clear();
+        page.list.SetItems(page.candidates);
+    }
+    if (!ReadListings()) {
+        // No list was delivered; what the buttons show must still go with the empty lists.
+        OnPageChanged(current_page_);
+    }
+    for (const int id : {IDC_TRANSFER_REFRESH, IDC_TRANSFER_SETTINGS, IDC_TRANSFER_CLOSE}) {
+        EnableItem(id, true);
+    }
+    EnableItem(IDC_TRANSFER_COPY_ALL, false);
+    EnableItem(IDC_TRANSFER_SYNCHRONIZE, AnyCandidates());
+    for (const Page& page : pages_) {
+        InvalidateRect(page.list.Handle(), nullptr, TRUE);
+    }
+    UpdateData(false);
+}
+
+// False when the device was not read (the lists stay empty then) or a build was stopped.
+bool CCeFileTransfDlg::ReadListings() {
+    Comparison comparison = NewComparison(settings_);
+    {
+        FileNode device_root;
+        if (!device_tree_.ReadDirectly(WithTrailingBackslash(settings_.sync_path_ce), {}, device_root,
+                                       Handle())) {
+            ui::ShowMessageBox(Handle(), Xlate(L"Failed to read from remote device."));
+            return false;
+        }
+        comparison.device = JobTable(device_root);
+    }
+    comparison.pc = ListPcJobFolder(settings_.sync_path_dt);
+    if (!BuildCandidates(comparison, comparison.pc, comparison.device, ready_listing_)) {
+        return false;
+    }
+    SendMessageW(Handle(), kListingReady, 0, 1);
+    if (!BuildCandidates(comparison, comparison.device, comparison.pc, ready_listing_)) {
+        return false;
+    }
+    SendMessageW(Handle(), kListingReady, 0, 0);
+    return true;
+}
+
+void CCeFileTransfDlg::OnListingReady(int number) {
+    Page& page = pages_[static_cast<std::size_t>(number)];
+    // The list must not hold on to entries that are about to end.
+    std::vector<sFileDate> none;
+    page.list.SetItems(none);
+    page.candidates = std::exchange(ready_listing_, {});
+    page.list.SetItems(page.candidates);
+    OnPageChanged(static_cast<int>(SendMessageW(tabs_.Handle(), TCM_GETCURSEL, 0, 0)));
+    InvalidateRect(Handle(), nullptr, TRUE);
+}
+
+void CCeFileTransfDlg::OnPageChanged(int number) {
+    if (number != kPcPage && number != kDevicePage) {
+        return;
+    }
+    current_page_ = number;
+    Page& page = pages_[static_cast<std::size_t>(number)];
+    SetDlgItemTextW(Handle(), IDC_TRANSFER_COPY,
+                    Xlate(number == kPcPage ? L"Copy Selected File(s) from PC to Device"
+                                            : L"Copy Selected File(s) from Device to PC")
+                        .c_str());
+    // Which of the entries are ticked counts as soon as the list has been drawn.
+    const bool has_items = page.list.ItemCount() > 0;
+    EnableItem(IDC_TRANSFER_COPY, has_items);
+    EnableItem(page.all_id, has_items);
+    if (!has_items) {
+        page.all_ticked = 0;
+        UpdateData(false);
+    }
+    EnableItem(IDC_TRANSFER_SYNCHRONIZE, AnyCandidates());
+}
+
+void CCeFileTransfDlg::OnListDoubleClick(HWND list) {
+    Page* page = PageOfList(list);
+    if (page == nullptr) {
+        return;
+    }
+    UpdateData(true);
+    const auto selected = static_cast<int>(
+        SendMessageW(list, LVM_GETNEXTITEM, static_cast<WPARAM>(-1), MAKELPARAM(LVNI_SELECTED, 0)));
+    if (SortedListRecord* record = selected >= 0 ? page->list.RecordAt(selected) : nullptr) {
+        record->ticked = !record->ticked;
+    }
+    page->list.SetItems(page->candidates);
+    UpdateData(false);
+}
+
+// Comes once for each round of painting, also after every change of a tick. It may come late: for a page
+// that is no longer shown, or whose entries have all been copied since. Then it says nothing about what is
+// on the screen.
+void CCeFileTransfDlg::OnListItemsDrawn(HWND list) {
+    const Page* drawn = PageOfList(list);
+    if (drawn == nullptr || drawn != &pages_[static_cast<std::size_t>(current_page_)] ||
+        drawn->list.ItemCount() == 0) {
+        return;
+    }
+    UpdateData(true);
+    for (Page& page : pages_) {
+        page.all_ticked = page.AllTicked() ? 1 : 0;
+    }
+    EnableItem(IDC_TRANSFER_COPY, drawn->HasTicked());
+    if (pages_[kPcPage].HasTicked() || pages_[kDevicePage].HasTicked()) {
+        EnableItem(IDC_TRANSFER_COPY_ALL, true);
+    }
+    UpdateData(false);
+}
+
+void CCeFileTransfDlg::OnSelectAll(Page& page) {
+    UpdateData(true);
+    for (sFileDate& entry : page.candidates) {
+        entry.ticked = page.all_ticked != 0;
+    }
+    page.list.SetItems(page.candidates);
+}
+
+void CCeFileTransfDlg::OnSettings() {
+    SyncSettingsBlock changed = settings_;
+    if (!RunOptions(changed)) {
+        return;
+    }
+    const bool other_folders = !SameFolder(changed.sync_path_dt, settings_.sync_path_dt) ||
+                               !SameFolder(changed.sync_path_ce, settings_.sync_path_ce);
+    settings_ = std::move(changed);
+    ShowFolders();
+    if (other_folders) {
+        OnRefresh();
+    }
+}
+
+bool CCeFileTransfDlg::RunOptions(SyncSettingsBlock& /*settings*/) {
+    return false;
+}
+
+void CCeFileTransfDlg::OnCopySelected() {
+    if (current_page_ != kPcPage && current_page_ != kDevicePage) {
+        return;
+    }
+    UpdateData(true);
+    {
+        const ui::WaitCursor wait;
+        CopyFiles(current_page_, Names(pages_[static_cast<std::size_t>(current_page_)], true));
+    }
+    EnableItem(IDC_TRANSFER_COPY_ALL, AnyCandidates());
+    UpdateData(false);
+}
+
+void CCeFileTransfDlg::OnCopyAll(bool ticked_only) {
+    const ui::WaitCursor wait;
+    for (const int number : {kPcPage, kDevicePage}) {
+        CopyFiles(number, Names(pages_[static_cast<std::size_t>(number)], ticked_only));
+    }
+    EnableItem(IDC_TRANSFER_COPY_ALL, AnyCandidates());
+    if (!AnyCandidates()) {
+        EnableItem(IDC_TRANSFER_SYNCHRONIZE, false);
+    }
+}
+
+// In the order in which the list shows the entries.
+std::vector<std::wstring> CCeFileTransfDlg::Names(const Page& page, bool ticked_only) const {
+    std::vector<std::wstring> names;
+    const int count = page.list.ItemCount();
+    for (int index = 0; index < count; ++index) {
+        const SortedListRecord* record = page.list.RecordAt(index);
+        if (record != nullptr && (record->ticked || !ticked_only)) {
+            names.push_back(record->first_text);
+        }
+    }
+    return names;
+}
+
+// Copies the files of one page to the other side. Without a device nothing happens.
+void CCeFileTransfDlg::CopyFiles(int number, const std::vector<std::wstring>& names) {
+    DeviceSession session(names.empty() ? nullptr : device_tree_.StopEvent());
+    if (names.empty() || !session) {
+        return;
+    }
+    Page& page = pages_[static_cast<std::size_t>(number)];
+    const auto direction = static_cast<CopyDirection>(number);
+    CopyProgress progress(direction);
+    const TransferOutcome outcome =
+        CopySelectedFiles({.direction = direction,
+                           .pc_folder = settings_.sync_path_dt,
+                           .device_folder = settings_.sync_path_ce,
+                           .names = names,
+                           .warn_before_replacing = IsOn(settings_.overwrite_warn),
+                           .stop_event = device_tree_.StopEvent()},
+                          progress);
+    // Before anything can paint the list, which shows the entries where they lie.
+    RemoveCandidates(page.candidates, outcome.copied);
+    page.list.SetItems(page.candidates);
+    if (outcome.disk_full) {
+        ui::ShowMessageBox(
+            Handle(),
+            Xlate(direction == CopyDirection::kPcToDevice ? L"Device Disk Full!" : L"PC Disk Full!"),
+            MB_OK | MB_ICONINFORMATION, Xlate(L"Copying File"));
+    }
+    progress.Close();
+    session.Close();
+    FinishCopy(page);
+}
+
+void CCeFileTransfDlg::FinishCopy(Page& page) {
+    const bool has_items = page.list.ItemCount() > 0;
+    if (&page == &pages_[static_cast<std::size_t>(current_page_)]) {
+        EnableItem(IDC_TRANSFER_COPY, has_items);
+    }
+    EnableItem(page.all_id, has_items);
+    if (!has_items) {
+        page.all_ticked = 0;
+    }
+    UpdateData(false);
+}
+
+bool CCeFileTransfDlg::AnyCandidates() const {
+    return std::any_of(pages_.begin(), pages_.end(),
+                       [](const Page& page) { return !page.candidates.empty(); });
+}
+
+CCeFileTransfDlg::Page* CCeFileTransfDlg::PageOfList(HWND list) {
+    const auto page = std::find_if(pages_.begin(), pages_.end(),
+                                   [list](const Page& each) { return each.list.Handle() == list; });
+    return list == nullptr || page == pages_.end() ? nullptr : &*page;
+}
+
+void CCeFileTransfDlg::EnableItem(int id, bool enable) {
+    HWND item = Item(id);
+    if (!enable && item == GetFocus()) {
+        SendMessageW(Handle(), WM_NEXTDLGCTL, 0, FALSE);
+    }
+    EnableWindow(item, enable);
+}
+
+}  // namespace orvane

@@ -1,0 +1,96 @@
+// The manual view of both job folders.
+#pragma once
+
+#include <array>
+#include <string>
+#include <vector>
+
+#include "controls/page_tab.h"
+#include "controls/record_list.h"
+#include "device/device_tree_reader.h"
+#include "settings/settings_store.h"
+#include "transfer/candidates.h"
+#include "transfer/copy_progress_dialog.h"
+#include "ui/dialog.h"
+
+namespace orvane {
+
+// Sent by the dialog to itself when the entries of a list are ready; wParam 0, lParam 0 for the device's list
+// and 1 for the PC's. (With another wParam this number is the dialog manager's own DM_SETDEFID.)
+inline constexpr UINT kListingReady = WM_USER + 1;
+
+// The "File Transfer - Copy From" dialog: on one page the PC's files that would be copied to the device, on
+// the other the device's files that would be copied to the PC. The user ticks files and has them copied,
+// which happens on the dialog's thread; only the progress window has a thread of its own. A modal dialog on
+// the user-interface thread. It ends with 0 at once when the user declines the clock check.
+class CCeFileTransfDlg : public ui::Dialog {
+  public:
+    // `date_check_done` leaves the clock check out.
+    CCeFileTransfDlg(const SyncSettingsBlock& settings, bool date_check_done, HWND parent);
+
+    // The settings as they are now; the caller takes them back when the dialog has ended.
+    const SyncSettingsBlock& Settings() const { return settings_; }
+
+  protected:
+    bool OnInitDialog() override;
+    bool OnCommand(int id, UINT code) override;
+    std::optional<LRESULT> OnMessage(UINT message, WPARAM wparam, LPARAM lparam) override;
+    void DoDataExchange(ui::DataExchange& exchange) override;
+
+    // Lets the user change the settings and stores them. True when `settings` may have changed.
+    virtual bool RunOptions(SyncSettingsBlock& settings);
+
+  private:
+    // A page with its list. Its number is that of the tab and of the direction in which its files go.
+    struct Page {
+        int list_id;
+        int from_id;
+        int folder_id;
+        int all_id;
+        USortedListCtrl list{};
+        std::vector<sFileDate> candidates{};
+        int all_ticked = 0;  // The "Select all file(s)" value.
+
+        bool HasTicked() const;
+        bool AllTicked() const;
+    };
+    static constexpr int kPcPage = 0;
+    static constexpr int kDevicePage = 1;
+
+    // Initialisation.
+    void SetUpList(Page& page);
+    void SetUpTabs();
+    void ShowFolders();
+
+    // Commands.
+    void OnRefresh();
+    void OnSettings();
+    void OnCopySelected();
+    void OnCopyAll(bool ticked_only);
+    void OnSelectAll(Page& page);
+
+    // Messages.
+    void OnPageChanged(int page);
+    void OnListDoubleClick(HWND list);
+    void OnListItemsDrawn(HWND list);
+    void OnListingReady(int page);
+
+    bool ReadListings();
+    std::vector<std::wstring> Names(const Page& page, bool ticked_only) const;
+    void CopyFiles(int page, const std::vector<std::wstring>& names);
+    void FinishCopy(Page& page);
+    bool AnyCandidates() const;
+    Page* PageOfList(HWND list);
+    // EnableWindow, without leaving the keyboard focus on a disabled control.
+    void EnableItem(int id, bool enable);
+
+    SyncSettingsBlock settings_;
+    const bool date_check_done_;
+    DeviceTreeReader device_tree_;  // Its stop event serves all operations on the device.
+    int current_page_ = -1;
+    CSTabCtrl tabs_;
+    std::array<Page, 2> pages_;
+    std::vector<sFileDate> ready_listing_;  // On its way with kListingReady.
+};
+
+}  // namespace orvane
