@@ -1,0 +1,178 @@
+// Copying from the dialog, with the progress window and its questions.
+#include "tests/transfer/transfer_fixture.h"
+#include "transfer/copy_progress_dialog.h"
+
+namespace orvane::testing {
+
+TEST_F(TransferTest, CopiesTheTickedFilesOfAPage) {
+    PutOnPc(L"a.qvj");
+    PutOnPc(L"sub\\b.qvj", 60);
+    PutOnDevice(L"sub\\B.QVJ");
+    PutOnDevice(L"c.qvj");
+    PutOnDevice(L"new\\deep\\d.qvj", 60);
+    const TransferRun run(settings_);
+    run.Tick(IDC_TRANSFER_PC_LIST, L"sub\\b.qvj");
+    run.Press(IDC_TRANSFER_COPY);
+    EXPECT_EQ(run.Column(IDC_TRANSFER_PC_LIST), Names{L"a.qvj"});
+    EXPECT_EQ(ReadTextFile(OnDevice(L"sub\\b.qvj")), "from the PC");
+    EXPECT_EQ(ReadTextFile(OnDevice(L"sub\\b.qvj.001")), "from the device") << "a backup is always made";
+    EXPECT_FALSE(Exists(OnDevice(L"a.qvj")));
+    EXPECT_TRUE(run.IsEnabled(IDC_TRANSFER_COPY_ALL));
+
+    run.SelectPage(1);
+    run.Tick(IDC_TRANSFER_DEVICE_LIST, L"new\\deep\\d.qvj");
+    run.Press(IDC_TRANSFER_COPY);
+    EXPECT_EQ(run.Column(IDC_TRANSFER_DEVICE_LIST), Names{L"c.qvj"});
+    EXPECT_EQ(ReadTextFile(OnPc(L"new\\deep\\d.qvj")), "from the device");
+    EXPECT_EQ(TicksOf(LastWriteTime(OnPc(L"new\\deep\\d.qvj"))), TicksOf(AddSeconds(noon_, 60)));
+    EXPECT_FALSE(Exists(OnPc(L"c.qvj")));
+}
+
+TEST_F(TransferTest, CopyAllTakesTheTickedAndSynchronizeEverything) {
+    PutOnPc(L"a.qvj");
+    PutOnPc(L"b.qvj");
+    PutOnDevice(L"c.qvj");
+    PutOnDevice(L"d.qvj");
+    const TransferRun run(settings_);
+    run.Tick(IDC_TRANSFER_PC_LIST, L"a.qvj");
+    run.Tick(IDC_TRANSFER_DEVICE_LIST, L"d.qvj");
+    run.Press(IDC_TRANSFER_COPY_ALL);
+    EXPECT_EQ(run.Column(IDC_TRANSFER_PC_LIST), Names{L"b.qvj"});
+    EXPECT_EQ(run.Column(IDC_TRANSFER_DEVICE_LIST), Names{L"c.qvj"});
+    EXPECT_TRUE(run.IsEnabled(IDC_TRANSFER_COPY_ALL));
+
+    run.Press(IDC_TRANSFER_PC_ALL);
+    run.Press(IDC_TRANSFER_SYNCHRONIZE);
+    EXPECT_EQ(ListTree(pc_.Path()), (Names{L"a.qvj", L"b.qvj", L"c.qvj", L"d.qvj"}));
+    EXPECT_EQ(ListTree(OnDevice(L"").substr(0, OnDevice(L"").size() - 1)),
+              (Names{L"a.qvj", L"b.qvj", L"c.qvj", L"d.qvj"}));
+    for (const int id :
+         {IDC_TRANSFER_COPY, IDC_TRANSFER_PC_ALL, IDC_TRANSFER_COPY_ALL, IDC_TRANSFER_SYNCHRONIZE}) {
+        EXPECT_FALSE(run.IsEnabled(id)) << id;
+    }
+    EXPECT_FALSE(run.IsChecked(IDC_TRANSFER_PC_ALL));
+}
+
+TEST_F(TransferTest, ReplacesOnlyWhatTheUserAllows) {
+    settings_.overwrite_warn = L"1";
+    PutOnPc(L"close.qvj", 10);
+    PutOnPc(L"kept.qvj", 11);
+    PutOnPc(L"new.qvj", 11);
+    PutOnDevice(L"close.qvj");
+    PutOnDevice(L"kept.qvj");
+    PutOnPc(L"replaced.txt");
+    PutOnDevice(L"replaced.txt", 11);
+    const MessageBoxAnswerer boxes({IDCANCEL, IDOK});
+    const TransferRun run(settings_);
+    run.Press(IDC_TRANSFER_SYNCHRONIZE);
+
+    ASSERT_EQ(boxes.Seen().size(), 2U);
+    EXPECT_EQ(boxes.Seen()[0].caption, L"Synchronization - Warning");
+    EXPECT_EQ(boxes.Seen()[0].style, 0x1121U);
+    EXPECT_EQ(boxes.Seen()[0].text,
+              L"The file:\n\\Jobs\\kept.qvj [ DEVICE ] \n\nWill be replaced by the file:\n" +
+                  OnPc(L"kept.qvj") + L" [ PC ]");
+    EXPECT_EQ(boxes.Seen()[1].text, L"The file:\n" + OnPc(L"replaced.txt") +
+                                        L" [ PC ] \n\nWill be replaced by the file:\n"
+                                        L"\\Jobs\\replaced.txt [ DEVICE ]");
+    EXPECT_EQ(run.Column(IDC_TRANSFER_PC_LIST), Names{L"kept.qvj"});
+    EXPECT_EQ(run.Column(IDC_TRANSFER_DEVICE_LIST), Names{});
+    EXPECT_EQ(ReadTextFile(OnDevice(L"close.qvj")), "from the PC");
+    EXPECT_EQ(ReadTextFile(OnDevice(L"kept.qvj")), "from the device");
+    EXPECT_EQ(ReadTextFile(OnPc(L"replaced.txt")), "from the device");
+    EXPECT_EQ(ReadTextFile(OnPc(L"replaced.txt.001")), "from the PC");
+}
+
+TEST_F(TransferTest, AFullDeviceEndsTheCopy) {
+    for (const wchar_t* name : {L"1.txt", L"2.txt", L"3.txt", L"4.txt", L"5.txt"}) {
+        PutOnPc(name);
+    }
+    device_.Set(L"REFUSE", L"CeWriteFile#3=112");
+    const MessageBoxAnswerer boxes;
+    const TransferRun run(settings_);
+    run.Press(IDC_TRANSFER_SYNCHRONIZE);
+    ASSERT_EQ(boxes.Seen().size(), 1U);
+    EXPECT_EQ(boxes.Seen()[0].text, L"Device Disk Full!");
+    EXPECT_EQ(boxes.Seen()[0].caption, L"Copying File");
+    EXPECT_EQ(boxes.Seen()[0].style, static_cast<UINT>(MB_OK | MB_ICONINFORMATION));
+    EXPECT_EQ(boxes.Seen()[0].owner, run.Window());
+    EXPECT_EQ(run.Column(IDC_TRANSFER_PC_LIST), (Names{L"3.txt", L"4.txt", L"5.txt"}));
+    EXPECT_FALSE(Exists(OnDevice(L"3.txt")));
+    EXPECT_EQ(ProgressWindow(), nullptr);
+}
+
+TEST_F(TransferTest, AJobFileTakesItsFolderAlong) {
+    PutOnPc(L"job1.wkf");
+    PutOnPc(L"job1\\data\\any.thing");
+    PutOnPc(L"alone.wkf");
+    PutOnDevice(L"job2.WKF");
+    PutOnDevice(L"job2\\any.thing");
+    const TransferRun run(settings_);
+    run.Press(IDC_TRANSFER_SYNCHRONIZE);
+    EXPECT_EQ(ReadTextFile(OnDevice(L"job1\\data\\any.thing")), "from the PC");
+    EXPECT_EQ(ReadTextFile(OnPc(L"job2\\any.thing")), "from the device");
+    EXPECT_FALSE(Exists(OnDevice(L"alone")));
+}
+
+// The user stops a copy to the device, or goes on, while it asks.
+TEST_F(TransferTest, StopsWhenTheUserSaysSo) {
+    for (const int answer : {IDYES, IDNO}) {
+        for (const wchar_t* name : {L"1.txt", L"2.txt", L"3.txt", L"4.txt", L"5.txt"}) {
+            PutOnPc(name);
+            DeleteFileW(OnDevice(name).c_str());
+        }
+        device_.Set(L"CALL_DELAY", L"25");
+        const MessageBoxAnswerer boxes({answer});
+        const TransferRun run(settings_);
+        run.PressAndGoOn(IDC_TRANSFER_SYNCHRONIZE);
+        ASSERT_TRUE(TransferRun::WaitUntil([] { return ProgressWindow() != nullptr; }));
+        HWND progress = ProgressWindow();
+        EXPECT_EQ(GetWindow(progress, GW_OWNER), nullptr);
+        PostMessageW(progress, WM_COMMAND, IDC_COPY_CANCEL, 0);
+        EXPECT_TRUE(TransferRun::WaitUntil([] { return ProgressWindow() == nullptr; }));
+        SendMessageW(run.Window(), WM_NULL, 0, 0);
+        ASSERT_EQ(boxes.Seen().size(), 1U);
+        EXPECT_EQ(boxes.Seen()[0].text, L"Would you like to stop the file copy?");
+        EXPECT_EQ(boxes.Seen()[0].caption, L"Copying File");
+        EXPECT_EQ(boxes.Seen()[0].style, static_cast<UINT>(MB_YESNO | MB_ICONQUESTION));
+        const Names left = run.Column(IDC_TRANSFER_PC_LIST);
+        EXPECT_EQ(left.empty(), answer == IDNO);
+        for (const std::wstring& name : left) {
+            EXPECT_FALSE(Exists(OnDevice(name)));
+        }
+    }
+}
+
+TEST_F(TransferTest, FilesThatCannotBeCopiedStayListed) {
+    // A device may claim to have anything.
+    device_.Set(L"EXTRA_ENTRIES", L"\\Jobs|NUL.txt;\\Jobs|vanished.txt;\\Jobs|...wkf");
+    PutOnDevice(L"good.txt");
+    const TransferRun run(settings_);
+    ASSERT_EQ(run.Column(IDC_TRANSFER_DEVICE_LIST).size(), 4U);
+    run.Press(IDC_TRANSFER_SYNCHRONIZE);
+    EXPECT_EQ(run.Column(IDC_TRANSFER_DEVICE_LIST).size(), 3U);
+    EXPECT_EQ(ListTree(pc_.Path()), Names{L"good.txt"});
+}
+
+TEST_F(TransferTest, ADeviceThatVanishesLeavesTheDialogUsable) {
+    for (const wchar_t* name : {L"1.txt", L"2.txt", L"3.txt"}) {
+        PutOnDevice(name);
+    }
+    const MessageBoxAnswerer boxes;
+    const TransferRun run(settings_);
+    device_.Set(L"VANISH", L"8");
+    run.Press(IDC_TRANSFER_SYNCHRONIZE);
+    EXPECT_FALSE(run.Column(IDC_TRANSFER_DEVICE_LIST).empty());
+    EXPECT_EQ(run.Column(IDC_TRANSFER_DEVICE_LIST).size() + ListTree(pc_.Path()).size(), 3U);
+    run.Press(IDC_TRANSFER_REFRESH);
+    EXPECT_TRUE(run.IsEnabled(IDC_TRANSFER_REFRESH));
+}
+
+TEST(CopyProgressTest, TitleCountsFiles) {
+    EXPECT_EQ(CopyProgressTitle(3, 7, CopyDirection::kPcToDevice),
+              L"{Copying File 3/7  - From PC to Device}");
+    EXPECT_EQ(CopyProgressTitle(1, 5, CopyDirection::kDeviceToPc),
+              L"{Copying File 1/5  - From Device to PC}");
+}
+
+}  // namespace orvane::testing
