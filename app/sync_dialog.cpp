@@ -10,6 +10,7 @@
 #include "qelutils/xlate.h"
 #include "res/ids.h"
 #include "selection/pc_listing.h"
+#include "transfer/transfer_dialog.h"
 #include "ui/message_box.h"
 #include "ui/wait_cursor.h"
 
@@ -61,6 +62,12 @@ bool CWendlowDlg::OnInitDialog() {
 
     task_.reports.SetTarget(Handle(), WM_SYNC_NOTIFY);
 
+    if (settings_.start_file_view != 0) {
+        // The program is a file viewer then; this dialog never comes into view.
+        OnFileView();
+        End(0);
+        return true;
+    }
     UpdateWindow(Handle());
     ShowWindow(Handle(), SW_SHOW);
     const ui::WaitCursor wait;
@@ -96,6 +103,9 @@ bool CWendlowDlg::OnCommand(int id, UINT code) {
             return true;
         case IDC_SYNC_CANCEL_EXIT:
             OnCancelExit();
+            return true;
+        case IDC_SYNC_FILE_VIEW:
+            OnFileView();
             return true;
         default:
             return false;
@@ -272,6 +282,14 @@ void CWendlowDlg::OnCancelExit() {
     } else if (text == Xlate(L"Cancel")) {
         CancelWorker();
     }
+}
+
+// The view's settings come back in the block alone: what it stored in the registry reaches this dialog's own
+// settings at the next start.
+void CWendlowDlg::OnFileView() {
+    CCeFileTransfDlg view(settings_block_, false, Handle());
+    view.DoModal();
+    settings_block_ = view.Settings();
 }
 
 void CWendlowDlg::CancelWorker() {

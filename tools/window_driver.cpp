@@ -1,17 +1,22 @@
-// Drives the windows of another program from a script. A window is named by its caption, a control by its
-// id. Every command waits up to two minutes for what it needs and ends with exit code 1 if that does not
-// come.
+// Drives the windows of another program from a script. A window is named by its caption, or by the start of
+// it and a "*", a control by its id. Every command waits up to two minutes for what it needs and ends with
+// exit code 1 if that does not come.
 //
 //   window_driver wait CAPTION               until the window is shown and takes input
 //   window_driver gone CAPTION               until there is no such window
 //   window_driver click CAPTION ID           presses a button, without waiting for what it does
 //   window_driver wait-text CAPTION ID TEXT  until the control's text is TEXT
 //   window_driver list CAPTION ID            prints the lines of a list box, in UTF-8
+//   window_driver tab CAPTION ID INDEX       turns to a page of a tab control
+//   window_driver command CAPTION ID NUMBER  sends the control a menu command; ID 0: the window, a command of
+//                                            its system menu
 //
 // The windows are looked for on the desktop that the environment variable WINDOW_DESKTOP names, by default
 // on that of the driver itself.
 
 #include <windows.h>
+
+#include <commctrl.h>
 
 #include <cstdio>
 #include <cstdlib>
@@ -43,6 +48,12 @@ std::wstring TextOf(HWND window) {
     return text;
 }
 
+bool HasCaption(HWND window, const std::wstring& caption) {
+    const std::wstring text = TextOf(window);
+    return caption.ends_with(L'*') ? text.starts_with(caption.substr(0, caption.size() - 1))
+                                   : text == caption;
+}
+
 // The shown window of that caption that takes input, null if there is none.
 HWND FindDialog(const std::wstring& caption) {
     struct Search {
@@ -52,7 +63,7 @@ HWND FindDialog(const std::wstring& caption) {
     EnumWindows(
         [](HWND window, LPARAM parameter) -> BOOL {
             auto& wanted = *reinterpret_cast<Search*>(parameter);
-            if (IsWindowVisible(window) && IsWindowEnabled(window) && TextOf(window) == wanted.caption) {
+            if (IsWindowVisible(window) && IsWindowEnabled(window) && HasCaption(window, wanted.caption)) {
                 wanted.found = window;
                 return FALSE;
             }
@@ -82,6 +93,10 @@ void PrintList(HWND list) {
 }
 
 bool RunOnControl(const std::wstring& verb, HWND dialog, int id, const std::wstring& text) {
+    const auto number = static_cast<WPARAM>(std::wcstol(text.c_str(), nullptr, 10));
+    if (verb == L"command" && id == 0) {
+        return PostMessageW(dialog, WM_SYSCOMMAND, number, 0) != FALSE;
+    }
     HWND control = GetDlgItem(dialog, id);
     if (control == nullptr) {
         return false;
@@ -92,6 +107,12 @@ bool RunOnControl(const std::wstring& verb, HWND dialog, int id, const std::wstr
     }
     if (verb == L"wait-text") {
         return WaitUntil([&] { return TextOf(control) == text; });
+    }
+    if (verb == L"tab") {
+        return PostMessageW(control, TCM_SETCURFOCUS, number, 0) != FALSE;
+    }
+    if (verb == L"command") {
+        return PostMessageW(control, WM_COMMAND, number, 0) != FALSE;
     }
     if (verb == L"list") {
         PrintList(control);
