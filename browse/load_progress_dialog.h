@@ -1,0 +1,37 @@
+// The wait dialog of the device folder tree.
+#pragma once
+
+#include <windows.h>
+
+#include <array>
+#include <string>
+
+#include "platform/handles.h"
+#include "ui/dialog.h"
+
+namespace orvane {
+
+// Modeless: a text beside a small animation. The user cannot close it; its owner does, by Destroy or with
+// the object. The animation moves only while the thread handles messages, so not during a read.
+class CLoadProgressDlg : public ui::Dialog {
+  public:
+    CLoadProgressDlg(std::wstring text, HWND parent);
+
+    // Shows the window and paints all of it before it returns.
+    void ShowPainted();
+
+  protected:
+    bool OnInitDialog() override;
+    void OnOK() override {}
+    void OnCancel() override {}
+    std::optional<LRESULT> OnMessage(UINT message, WPARAM wparam, LPARAM lparam) override;
+
+  private:
+    void ShowNextFrame();
+
+    std::size_t frame_ = 0;
+    std::wstring text_;
+    std::array<UniqueIcon, 5> icons_;
+};
+
+}  // namespace orvane
