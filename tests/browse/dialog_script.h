@@ -1,0 +1,25 @@
+// Running a modal dialog on the test's thread while a script on another thread uses it.
+#pragma once
+
+#include <windows.h>
+
+#include <functional>
+#include <string>
+#include <vector>
+
+namespace orvane::testing {
+
+// Calls `modal`, which shows a dialog without an owner, and runs `script` on another thread as soon as that
+// dialog can be seen. Dialogs that the script leaves open are closed. Returns what `modal` returns.
+INT_PTR RunWithScript(const std::function<INT_PTR()>& modal, const std::function<void(HWND)>& script);
+
+// The visible dialogs of the window's thread, the window itself among them.
+std::vector<HWND> DialogsBeside(HWND window);
+
+// Waits up to five seconds; whether the condition came true.
+bool WaitUntil(const std::function<bool()>& condition);
+
+std::wstring ItemText(HWND dialog, int id);
+void Press(HWND dialog, int id);
+
+}  // namespace orvane::testing

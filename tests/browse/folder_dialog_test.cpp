@@ -1,0 +1,64 @@
+#include "browse/folder_dialog.h"
+
+#include <gtest/gtest.h>
+
+#include <filesystem>
+
+#include "platform/text_case.h"
+#include "res/ids.h"
+#include "tests/browse/dialog_script.h"
+#include "tests/support/temp_folder.h"
+#include "ui/data_exchange.h"
+
+namespace orvane {
+
+namespace {
+
+using testing::ItemText;
+
+TEST(FolderDialog, AnswersTheFolderThatWasOpened) {
+    const testing::TempFolder folder;
+    testing::MakeFolder(folder / L"sub");
+    const auto current = std::filesystem::current_path();
+    CFolderDialog dialog(folder.Path(), folder.Path(), 1, L"", nullptr);
+    const INT_PTR result = testing::RunWithScript(
+        [&] { return dialog.DoModal(); },
+        [&](HWND window) {
+            HWND list = GetDlgItem(window, IDC_FOLDER_DIRECTORY_LIST);
+            EXPECT_TRUE(testing::WaitUntil([&] { return SendMessageW(list, LB_GETCURSEL, 0, 0) == 0; }));
+            EXPECT_EQ(ui::WindowText(window), L"Select Directory");
+            EXPECT_EQ(ItemText(window, IDC_FOLDER_DIRECTORY), folder.Path());
+            EXPECT_EQ(ItemText(window, IDC_FOLDER_FILE_NAME), L"Dummy");
+            EXPECT_NE(SendMessageW(list, LB_SELECTSTRING, static_cast<WPARAM>(-1),
+                                   reinterpret_cast<LPARAM>(L"[sub]")),
+                      LB_ERR);
+            SendMessageW(window, WM_COMMAND, MAKEWPARAM(IDC_FOLDER_DIRECTORY_LIST, LBN_DBLCLK),
+                         reinterpret_cast<LPARAM>(list));
+            testing::Press(window, IDOK);
+        });
+    EXPECT_EQ(result, IDOK);
+    EXPECT_TRUE(EqualIgnoringCase(dialog.Chosen().folder, folder / L"sub")) << dialog.Chosen().folder;
+    EXPECT_TRUE(EqualIgnoringCase(dialog.Chosen().directory, folder / L"sub")) << dialog.Chosen().directory;
+    EXPECT_EQ(std::filesystem::current_path(), current);
+}
+
+TEST(FolderDialog, PutsTheCurrentDirectoryBackAfterCancel) {
+    const testing::TempFolder folder;
+    const auto current = std::filesystem::current_path();
+    for (const std::wstring& start : {folder.Path(), folder / L"missing"}) {
+        CFolderDialog dialog(start, start, 1, L"Jobs", nullptr);
+        const INT_PTR result =
+            testing::RunWithScript([&] { return dialog.DoModal(); },
+                                   [&](HWND window) {
+                                       EXPECT_EQ(ui::WindowText(window), L"Jobs");
+                                       EXPECT_EQ(ItemText(window, IDC_FOLDER_DIRECTORY), start);
+                                       testing::Press(window, IDCANCEL);
+                                   });
+        EXPECT_EQ(result, IDCANCEL);
+        EXPECT_EQ(std::filesystem::current_path(), current) << start;
+    }
+}
+
+}  // namespace
+
+}  // namespace orvane
