@@ -10,6 +10,7 @@
 #include "qelutils/xlate.h"
 #include "res/ids.h"
 #include "selection/pc_listing.h"
+#include "settings/options_dialog.h"
 #include "transfer/transfer_dialog.h"
 #include "ui/message_box.h"
 #include "ui/wait_cursor.h"
@@ -103,6 +104,9 @@ bool CWendlowDlg::OnCommand(int id, UINT code) {
             return true;
         case IDC_SYNC_CANCEL_EXIT:
             OnCancelExit();
+            return true;
+        case IDC_SYNC_SETTINGS:
+            OnSettings();
             return true;
         case IDC_SYNC_FILE_VIEW:
             OnFileView();
@@ -282,6 +286,13 @@ void CWendlowDlg::OnCancelExit() {
     } else if (text == Xlate(L"Cancel")) {
         CancelWorker();
     }
+}
+
+void CWendlowDlg::OnSettings() {
+    if (auto saved = RunOptions(Handle(), settings_block_)) {
+        settings_ = std::move(*saved);
+    }
+    RefreshSettingsBlock(settings_, settings_block_);
 }
 
 // The view's settings come back in the block alone: what it stored in the registry reaches this dialog's own

@@ -41,6 +41,7 @@ class CWendlowDlg : public ui::Dialog {
 
     void OnSynchronize();
     void OnCancelExit();
+    void OnSettings();
     void OnFileView();
     void OnSyncNotify();
     bool OnSysCommand(UINT command);
