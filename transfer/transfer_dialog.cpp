@@ -185,7 +185,7 @@ std::optional<LRESULT> CCeFileTransfDlg::OnMessage(UINT message, WPARAM wparam, 
             OnListItemsDrawn(reinterpret_cast<HWND>(lparam));
             return 0;
         case kListingReady:
-            if (wparam != 0) {
+            if (wparam != 0 || !ready_listing_) {
                 return std::nullopt;
             }
             OnListingReady(lparam == 0 ? kDevicePage : kPcPage);
@@ -229,11 +229,11 @@ bool CCeFileTransfDlg::ReadListings() {
         comparison.device = JobTable(device_root);
     }
     comparison.pc = ListPcJobFolder(settings_.sync_path_dt);
-    if (!BuildCandidates(comparison, comparison.pc, comparison.device, ready_listing_)) {
+    if (!BuildCandidates(comparison, comparison.pc, comparison.device, ready_listing_.emplace())) {
         return false;
     }
     SendMessageW(Handle(), kListingReady, 0, 1);
-    if (!BuildCandidates(comparison, comparison.device, comparison.pc, ready_listing_)) {
+    if (!BuildCandidates(comparison, comparison.device, comparison.pc, ready_listing_.emplace())) {
         return false;
     }
     SendMessageW(Handle(), kListingReady, 0, 0);
@@ -245,7 +245,8 @@ void CCeFileTransfDlg::OnListingReady(int number) {
     // The list must not hold on to entries that are about to end.
     std::vector<sFileDate> none;
     page.list.SetItems(none);
-    page.candidates = std::exchange(ready_listing_, {});
+    page.candidates = std::move(*ready_listing_);
+    ready_listing_.reset();
     page.list.SetItems(page.candidates);
     OnPageChanged(static_cast<int>(SendMessageW(tabs_.Handle(), TCM_GETCURSEL, 0, 0)));
     InvalidateRect(Handle(), nullptr, TRUE);
@@ -372,8 +373,11 @@ std::vector<std::wstring> CCeFileTransfDlg::Names(const Page& page, bool ticked_
 
 // Copies the files of one page to the other side. Without a device nothing happens.
 void CCeFileTransfDlg::CopyFiles(int number, const std::vector<std::wstring>& names) {
-    DeviceSession session(names.empty() ? nullptr : device_tree_.StopEvent());
-    if (names.empty() || !session) {
+    if (names.empty()) {
+        return;
+    }
+    DeviceSession session(device_tree_.StopEvent());
+    if (!session) {
         return;
     }
     Page& page = pages_[static_cast<std::size_t>(number)];
@@ -391,6 +395,8 @@ void CCeFileTransfDlg::CopyFiles(int number, const std::vector<std::wstring>& na
     RemoveCandidates(page.candidates, outcome.copied);
     page.list.SetItems(page.candidates);
     if (outcome.disk_full) {
+        // The progress window, which belongs to another thread, would cover the box.
+        SetForegroundWindow(Handle());
         ui::ShowMessageBox(
             Handle(),
             Xlate(direction == CopyDirection::kPcToDevice ? L"Device Disk Full!" : L"PC Disk Full!"),

@@ -2,6 +2,7 @@
 #pragma once
 
 #include <array>
+#include <optional>
 #include <string>
 #include <vector>
 
@@ -16,7 +17,7 @@
 namespace orvane {
 
 // Sent by the dialog to itself when the entries of a list are ready; wParam 0, lParam 0 for the device's list
-// and 1 for the PC's. (With another wParam this number is the dialog manager's own DM_SETDEFID.)
+// and 1 for the PC's. Without a listing on its way this number is the dialog manager's own DM_SETDEFID.
 inline constexpr UINT kListingReady = WM_USER + 1;
 
 // The "File Transfer - Copy From" dialog: on one page the PC's files that would be copied to the device, on
@@ -90,7 +91,7 @@ class CCeFileTransfDlg : public ui::Dialog {
     int current_page_ = -1;
     CSTabCtrl tabs_;
     std::array<Page, 2> pages_;
-    std::vector<sFileDate> ready_listing_;  // On its way with kListingReady.
+    std::optional<std::vector<sFileDate>> ready_listing_;  // While kListingReady is on its way.
 };
 
 }  // namespace orvane

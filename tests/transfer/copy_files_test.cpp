@@ -143,6 +143,25 @@ TEST_F(TransferTest, StopsWhenTheUserSaysSo) {
     }
 }
 
+// The last file is done while the user still thinks about stopping.
+TEST_F(TransferTest, AnOpenStopQuestionGoesWithTheLastFile) {
+    PutOnPc(L"a.txt");
+    device_.Set(L"CALL_DELAY", L"100");
+    const TransferRun run(settings_);
+    run.PressAndGoOn(IDC_TRANSFER_SYNCHRONIZE);
+    ASSERT_TRUE(TransferRun::WaitUntil([] {
+        wchar_t title[100] = {};
+        GetWindowTextW(ProgressWindow(), title, static_cast<int>(std::size(title)));
+        return std::wstring(title).find(L"1/1") != std::wstring::npos;
+    }));
+    HWND progress = ProgressWindow();
+    PostMessageW(progress, WM_COMMAND, IDC_COPY_CANCEL, 0);
+    EXPECT_TRUE(TransferRun::WaitUntil([&] { return GetLastActivePopup(progress) != progress; }));
+    EXPECT_TRUE(TransferRun::WaitUntil([&] { return !IsWindow(progress); }));
+    EXPECT_EQ(run.Column(IDC_TRANSFER_PC_LIST), Names{});
+    EXPECT_TRUE(Exists(OnDevice(L"a.txt")));
+}
+
 TEST_F(TransferTest, FilesThatCannotBeCopiedStayListed) {
     // A device may claim to have anything.
     device_.Set(L"EXTRA_ENTRIES", L"\\Jobs|NUL.txt;\\Jobs|vanished.txt;\\Jobs|...wkf");

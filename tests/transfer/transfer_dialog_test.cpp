@@ -69,8 +69,30 @@ TEST_F(TransferTest, DoubleClickFlipsTheSelectedEntry) {
                  reinterpret_cast<LPARAM>(list));
     EXPECT_EQ(run.Column(IDC_TRANSFER_PC_LIST, 2), Names{L"1"});
     // The dialog manager's message of the same number is not taken for a listing.
-    SendMessageW(run.Window(), DM_SETDEFID, IDC_TRANSFER_REFRESH, 1);
+    SendMessageW(run.Window(), DM_SETDEFID, 0, 1);
     EXPECT_EQ(run.Column(IDC_TRANSFER_PC_LIST), Names{L"a.qvj"});
+}
+
+TEST_F(TransferTest, FollowsTheKeyboard) {
+    PutOnPc(L"a.qvj");
+    TransferRun run(settings_);
+    std::vector<int> order;
+    for (HWND item = run.Item(IDC_TRANSFER_TABS); order.empty() || item != run.Item(IDC_TRANSFER_TABS);
+         item = GetNextDlgTabItem(run.Window(), item, FALSE)) {
+        order.push_back(GetDlgCtrlID(item));
+    }
+    std::erase(order, IDC_TRANSFER_COPY);  // Enabled or not, as it was before the first painting.
+    EXPECT_EQ(order, (std::vector<int>{IDC_TRANSFER_TABS, IDC_TRANSFER_PC_LIST, IDC_TRANSFER_PC_ALL,
+                                       IDC_TRANSFER_SETTINGS, IDC_TRANSFER_REFRESH, IDC_TRANSFER_SYNCHRONIZE,
+                                       IDC_TRANSFER_CLOSE}));
+    PutOnPc(L"b.qvj");
+    PostMessageW(run.Item(IDC_TRANSFER_PC_LIST), WM_KEYDOWN, VK_RETURN, 1);
+    EXPECT_TRUE(TransferRun::WaitUntil([&] {
+        return run.Column(IDC_TRANSFER_PC_LIST) == Names{L"a.qvj", L"b.qvj"};
+    }));
+    PostMessageW(run.Item(IDC_TRANSFER_PC_LIST), WM_KEYDOWN, VK_ESCAPE, 1);
+    EXPECT_TRUE(TransferRun::WaitUntil([&] { return run.HasEnded(); }));
+    EXPECT_EQ(run.Result(), IDCANCEL);
 }
 
 TEST_F(TransferTest, NewFoldersAreListedAtOnce) {
