@@ -102,8 +102,7 @@ bool RunOnControl(const std::wstring& verb, HWND dialog, int id, const std::wstr
         return false;
     }
     if (verb == L"click") {
-        return PostMessageW(dialog, WM_COMMAND, MAKEWPARAM(id, BN_CLICKED),
-                            reinterpret_cast<LPARAM>(control)) != FALSE;
+        return PostMessageW(control, BM_CLICK, 0, 0) != FALSE;
     }
     if (verb == L"wait-text") {
         return WaitUntil([&] { return TextOf(control) == text; });

@@ -9,6 +9,7 @@
 #include "platform/text_case.h"
 #include "qelutils/xlate.h"
 #include "res/ids.h"
+#include "settings/options_dialog.h"
 #include "transfer/copy_progress.h"
 #include "transfer/selected_copy.h"
 #include "ui/message_box.h"
@@ -330,8 +331,12 @@ void CCeFileTransfDlg::OnSettings() {
     }
 }
 
-bool CCeFileTransfDlg::RunOptions(SyncSettingsBlock& /*settings*/) {
-    return false;
+bool CCeFileTransfDlg::RunOptions(SyncSettingsBlock& settings) {
+    const auto saved = orvane::RunOptions(Handle(), settings);
+    if (saved) {
+        RefreshSettingsBlock(*saved, settings);
+    }
+    return saved.has_value();
 }
 
 void CCeFileTransfDlg::OnCopySelected() {
