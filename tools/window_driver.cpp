@@ -6,6 +6,7 @@
 //   window_driver gone CAPTION               until there is no such window
 //   window_driver click CAPTION ID           presses a button, without waiting for what it does
 //   window_driver wait-text CAPTION ID TEXT  until the control's text is TEXT
+//   window_driver wait-disabled CAPTION ID   until the control takes no input
 //   window_driver list CAPTION ID            prints the lines of a list box, in UTF-8
 //   window_driver tab CAPTION ID INDEX       turns to a page of a tab control
 //   window_driver command CAPTION ID NUMBER  sends the control a menu command; ID 0: the window, a command of
@@ -106,6 +107,9 @@ bool RunOnControl(const std::wstring& verb, HWND dialog, int id, const std::wstr
     }
     if (verb == L"wait-text") {
         return WaitUntil([&] { return TextOf(control) == text; });
+    }
+    if (verb == L"wait-disabled") {
+        return WaitUntil([&] { return !IsWindowEnabled(control); });
     }
     if (verb == L"tab") {
         return PostMessageW(control, TCM_SETCURFOCUS, number, 0) != FALSE;

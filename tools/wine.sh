@@ -1,13 +1,10 @@
 #!/usr/bin/env bash
 # Runs a Windows program in Wine: wine.sh PROGRAM [ARGUMENT...]
 #
-# The prefix is WINEPREFIX, by default build/wine_prefix_UID of this checkout; it is created on first
-# use (Wine wants a prefix to belong to the user who runs it). DLL_FOLDER, a path of this system, is put in
-# front of the program's PATH. A display must exist
-# (see with_display.sh).
+# The prefix (see wine_prefix.sh) is created on first use. DLL_FOLDER, a path of this system, is put in front
+# of the program's PATH. A display must exist (see with_display.sh).
 set -eu
-root=$(cd "$(dirname "${BASH_SOURCE[0]}")/.." && pwd)
-export WINEPREFIX=${WINEPREFIX:-$root/build/wine_prefix_$(id -u)}
+source "$(dirname "${BASH_SOURCE[0]}")/wine_prefix.sh"
 export WINEDEBUG=${WINEDEBUG:--all}
 # Without the last override a program that crashes would wait for a debugger for ever.
 export WINEDLLOVERRIDES="mscoree,mshtml,winedbg.exe="

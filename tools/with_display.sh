@@ -1,11 +1,9 @@
 #!/usr/bin/env bash
 # Runs a command on a display of its own: with_display.sh COMMAND [ARGUMENT...]
 #
-# The wine server of WINEPREFIX (by default build/wine_prefix_UID of this checkout) is ended afterwards, so
-# that no process stays behind.
+# The wine server of the prefix is ended afterwards, so that no process stays behind.
 set -u
-root=$(cd "$(dirname "${BASH_SOURCE[0]}")/.." && pwd)
-export WINEPREFIX=${WINEPREFIX:-$root/build/wine_prefix_$(id -u)}
+source "$(dirname "${BASH_SOURCE[0]}")/wine_prefix.sh"
 
 xvfb-run -a -s "-screen 0 1280x1024x24" "$@"
 status=$?
