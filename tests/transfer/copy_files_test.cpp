@@ -1,8 +1,24 @@
 // Copying from the dialog, with the progress window and its questions.
 #include "tests/transfer/transfer_fixture.h"
-#include "transfer/copy_progress_dialog.h"
 
 namespace orvane::testing {
+
+namespace {
+
+// The progress window of this process, null when there is none.
+HWND ProgressWindow() {
+    HWND found = nullptr;
+    while ((found = FindWindowExW(nullptr, found, L"#32770", nullptr)) != nullptr) {
+        DWORD process = 0;
+        GetWindowThreadProcessId(found, &process);
+        if (process == GetCurrentProcessId() && GetDlgItem(found, IDC_COPY_CANCEL) != nullptr) {
+            break;
+        }
+    }
+    return found;
+}
+
+}  // namespace
 
 TEST_F(TransferTest, CopiesTheTickedFilesOfAPage) {
     PutOnPc(L"a.qvj");
@@ -19,7 +35,7 @@ TEST_F(TransferTest, CopiesTheTickedFilesOfAPage) {
     EXPECT_FALSE(Exists(OnDevice(L"a.qvj")));
     EXPECT_TRUE(run.IsEnabled(IDC_TRANSFER_COPY_ALL));
 
-    run.SelectPage(1);
+    run.SelectDevicePage();
     run.Tick(IDC_TRANSFER_DEVICE_LIST, L"new\\deep\\d.qvj");
     run.Press(IDC_TRANSFER_COPY);
     EXPECT_EQ(run.Column(IDC_TRANSFER_DEVICE_LIST), Names{L"c.qvj"});
@@ -125,11 +141,11 @@ TEST_F(TransferTest, StopsWhenTheUserSaysSo) {
         const MessageBoxAnswerer boxes({answer});
         const TransferRun run(settings_);
         run.PressAndGoOn(IDC_TRANSFER_SYNCHRONIZE);
-        ASSERT_TRUE(TransferRun::WaitUntil([] { return ProgressWindow() != nullptr; }));
+        ASSERT_TRUE(WaitUntil([] { return ProgressWindow() != nullptr; }));
         HWND progress = ProgressWindow();
         EXPECT_EQ(GetWindow(progress, GW_OWNER), nullptr);
         PostMessageW(progress, WM_COMMAND, IDC_COPY_CANCEL, 0);
-        EXPECT_TRUE(TransferRun::WaitUntil([] { return ProgressWindow() == nullptr; }));
+        EXPECT_TRUE(WaitUntil([] { return ProgressWindow() == nullptr; }));
         SendMessageW(run.Window(), WM_NULL, 0, 0);
         ASSERT_EQ(boxes.Seen().size(), 1U);
         EXPECT_EQ(boxes.Seen()[0].text, L"Would you like to stop the file copy?");
@@ -149,28 +165,48 @@ TEST_F(TransferTest, AnOpenStopQuestionGoesWithTheLastFile) {
     device_.Set(L"CALL_DELAY", L"100");
     const TransferRun run(settings_);
     run.PressAndGoOn(IDC_TRANSFER_SYNCHRONIZE);
-    ASSERT_TRUE(TransferRun::WaitUntil([] {
+    ASSERT_TRUE(WaitUntil([] {
         wchar_t title[100] = {};
         GetWindowTextW(ProgressWindow(), title, static_cast<int>(std::size(title)));
         return std::wstring(title).find(L"1/1") != std::wstring::npos;
     }));
     HWND progress = ProgressWindow();
     PostMessageW(progress, WM_COMMAND, IDC_COPY_CANCEL, 0);
-    EXPECT_TRUE(TransferRun::WaitUntil([&] { return GetLastActivePopup(progress) != progress; }));
-    EXPECT_TRUE(TransferRun::WaitUntil([&] { return !IsWindow(progress); }));
+    EXPECT_TRUE(WaitUntil([&] { return GetLastActivePopup(progress) != progress; }));
+    EXPECT_TRUE(WaitUntil([&] { return !IsWindow(progress); }));
     EXPECT_EQ(run.Column(IDC_TRANSFER_PC_LIST), Names{});
     EXPECT_TRUE(Exists(OnDevice(L"a.txt")));
 }
 
 TEST_F(TransferTest, FilesThatCannotBeCopiedStayListed) {
-    // A device may claim to have anything.
-    device_.Set(L"EXTRA_ENTRIES", L"\\Jobs|NUL.txt;\\Jobs|vanished.txt;\\Jobs|...wkf");
-    PutOnDevice(L"good.txt");
+    // What a device may claim to have; the first name is one that the PC takes for a device of its own. The
+    // job file would have the folder above for its companion.
+    device_.Set(L"EXTRA_ENTRIES", L"\\Jobs|NUL.txt;\\Jobs|vanished.txt");
+    PutOnDevice(L"...wkf");
+    device_.StartTrace();
     const TransferRun run(settings_);
-    ASSERT_EQ(run.Column(IDC_TRANSFER_DEVICE_LIST).size(), 4U);
     run.Press(IDC_TRANSFER_SYNCHRONIZE);
-    EXPECT_EQ(run.Column(IDC_TRANSFER_DEVICE_LIST).size(), 3U);
-    EXPECT_EQ(ListTree(pc_.Path()), Names{L"good.txt"});
+    EXPECT_EQ(run.Column(IDC_TRANSFER_DEVICE_LIST), (Names{L"NUL.txt", L"vanished.txt"}));
+    EXPECT_EQ(ListTree(pc_.Path()), Names{L"...wkf"});
+    for (const TraceLine& line : device_.Trace()) {
+        const bool is_open = line.function == L"CeCreateFile";
+        EXPECT_FALSE(is_open && line.arguments[0].find(L"NUL.txt") != std::wstring::npos);
+        EXPECT_FALSE(line.function == L"CeFindAllFiles" &&
+                     line.arguments[0].find(L"..") != std::wstring::npos);
+    }
+}
+
+TEST_F(TransferTest, APathWithoutRoomForItsBackupIsNotCopied) {
+    settings_.sync_path_ce = L"\\Jobs\\" + std::wstring(200, L'f');
+    MakeFolder(device_.PcPath(settings_.sync_path_ce));
+    // On the device they have 255 and 256 characters, without the backup's four.
+    const std::wstring fits = std::wstring(44, L'a') + L".txt";
+    const std::wstring too_long = std::wstring(45, L'b') + L".txt";
+    PutOnPc(fits);
+    PutOnPc(too_long);
+    const TransferRun run(settings_);
+    run.Press(IDC_TRANSFER_SYNCHRONIZE);
+    EXPECT_EQ(run.Column(IDC_TRANSFER_PC_LIST), Names{too_long});
 }
 
 TEST_F(TransferTest, ADeviceThatVanishesLeavesTheDialogUsable) {

@@ -1,26 +1,30 @@
 // The dialog itself: its lists, what its controls offer, its settings and its clock check.
-#include "transfer/transfer_dialog.h"
-
 #include "tests/transfer/transfer_fixture.h"
 
 namespace orvane::testing {
 
 TEST_F(TransferTest, ListsWhatEachSideLacks) {
-    PutOnPc(L"new.qvj");
+    settings_.sync_img_files = L"1";
+    for (const wchar_t* name : {L"new.qvj", L"notes.doc", L".qvj", L"picture.bmp", L"picture.IMG"}) {
+        PutOnPc(name);
+    }
     PutOnPc(L"newer.qvj", 10);
-    PutOnDevice(L"newer.qvj");
+    PutOnDevice(L"NEWER.qvj");
     PutOnPc(L"same.qvj", 9);
     PutOnDevice(L"same.qvj");
-    PutOnPc(L"notes.doc");
-    PutOnPc(L"picture.bmp");
     PutOnDevice(L"a.TN3");
     PutOnDevice(L"Job1\\pic.jpg");
+    {
+        const TransferRun run(settings_);
+        EXPECT_EQ(run.Column(IDC_TRANSFER_PC_LIST), (Names{L"new.qvj", L"newer.qvj", L"picture.IMG"}));
+        EXPECT_EQ(run.Column(IDC_TRANSFER_PC_LIST, 2), (Names{L"1", L"1", L"1"}));
+        EXPECT_EQ(run.Column(IDC_TRANSFER_DEVICE_LIST), (Names{L"a.TN3", L"Job1\\pic.jpg"}));
+        EXPECT_EQ(run.Text(IDC_TRANSFER_PC_FOLDER), pc_.Path() + L"\\");
+        EXPECT_EQ(run.Text(IDC_TRANSFER_DEVICE_FOLDER), L"\\Jobs\\");
+    }
+    settings_.overwrite_old_files = L"0";
     const TransferRun run(settings_);
-    EXPECT_EQ(run.Column(IDC_TRANSFER_PC_LIST), (Names{L"new.qvj", L"newer.qvj"}));
-    EXPECT_EQ(run.Column(IDC_TRANSFER_PC_LIST, 2), (Names{L"1", L"1"}));
-    EXPECT_EQ(run.Column(IDC_TRANSFER_DEVICE_LIST), (Names{L"a.TN3", L"Job1\\pic.jpg"}));
-    EXPECT_EQ(run.Text(IDC_TRANSFER_PC_FOLDER), pc_.Path() + L"\\");
-    EXPECT_EQ(run.Text(IDC_TRANSFER_DEVICE_FOLDER), L"\\Jobs\\");
+    EXPECT_EQ(run.Column(IDC_TRANSFER_PC_LIST), (Names{L"new.qvj", L"picture.IMG"}));
 }
 
 TEST_F(TransferTest, CopyButtonFollowsTheTicksOfThePageShown) {
@@ -29,21 +33,20 @@ TEST_F(TransferTest, CopyButtonFollowsTheTicksOfThePageShown) {
     PutOnDevice(L"c.qvj");
     const TransferRun run(settings_);
     const auto is_enabled = [&](int id, bool enabled) {
-        return TransferRun::WaitUntil([&] { return run.IsEnabled(id) == enabled; });
+        return WaitUntil([&] { return run.IsEnabled(id) == enabled; });
     };
     EXPECT_TRUE(is_enabled(IDC_TRANSFER_COPY, false));
     EXPECT_FALSE(run.IsEnabled(IDC_TRANSFER_COPY_ALL));
     EXPECT_TRUE(run.IsEnabled(IDC_TRANSFER_SYNCHRONIZE));
     EXPECT_EQ(run.Text(IDC_TRANSFER_COPY), L"Copy Selected File(s) from PC to Device");
-
     run.Tick(IDC_TRANSFER_PC_LIST, L"b.qvj");
     EXPECT_TRUE(is_enabled(IDC_TRANSFER_COPY, true));
     EXPECT_TRUE(is_enabled(IDC_TRANSFER_COPY_ALL, true));
     EXPECT_FALSE(run.IsChecked(IDC_TRANSFER_PC_ALL));
     run.Tick(IDC_TRANSFER_PC_LIST, L"a.qvj");
-    EXPECT_TRUE(TransferRun::WaitUntil([&] { return run.IsChecked(IDC_TRANSFER_PC_ALL); }));
+    EXPECT_TRUE(WaitUntil([&] { return run.IsChecked(IDC_TRANSFER_PC_ALL); }));
 
-    run.SelectPage(1);
+    run.SelectDevicePage();
     EXPECT_TRUE(is_enabled(IDC_TRANSFER_COPY, false));
     // A late report about the page that is hidden now.
     HWND hidden = run.Item(IDC_TRANSFER_PC_LIST);
@@ -87,11 +90,9 @@ TEST_F(TransferTest, FollowsTheKeyboard) {
                                        IDC_TRANSFER_CLOSE}));
     PutOnPc(L"b.qvj");
     PostMessageW(run.Item(IDC_TRANSFER_PC_LIST), WM_KEYDOWN, VK_RETURN, 1);
-    EXPECT_TRUE(TransferRun::WaitUntil([&] {
-        return run.Column(IDC_TRANSFER_PC_LIST) == Names{L"a.qvj", L"b.qvj"};
-    }));
+    EXPECT_TRUE(WaitUntil([&] { return run.Column(IDC_TRANSFER_PC_LIST) == Names{L"a.qvj", L"b.qvj"}; }));
     PostMessageW(run.Item(IDC_TRANSFER_PC_LIST), WM_KEYDOWN, VK_ESCAPE, 1);
-    EXPECT_TRUE(TransferRun::WaitUntil([&] { return run.HasEnded(); }));
+    EXPECT_TRUE(WaitUntil([&] { return run.HasEnded(); }));
     EXPECT_EQ(run.Result(), IDCANCEL);
 }
 
@@ -142,7 +143,7 @@ TEST_F(TransferTest, ADeclinedClockCheckEndsTheDialog) {
     device_.Set(L"CLOCK_OFFSET", L"3600");
     const MessageBoxAnswerer boxes({IDCANCEL, IDOK});
     TransferRun declined(settings_, /*date_check_done=*/false);
-    EXPECT_TRUE(TransferRun::WaitUntil([&] { return declined.HasEnded(); }));
+    EXPECT_TRUE(WaitUntil([&] { return declined.HasEnded(); }));
     EXPECT_EQ(declined.Result(), 0);
     TransferRun accepted(settings_, /*date_check_done=*/false);
     EXPECT_FALSE(accepted.HasEnded());
