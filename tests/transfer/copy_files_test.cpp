@@ -8,13 +8,16 @@ namespace {
 // The progress window of this process, null when there is none.
 HWND ProgressWindow() {
     HWND found = nullptr;
-    while ((found = FindWindowExW(nullptr, found, L"#32770", nullptr)) != nullptr) {
+    const auto look_at = [](HWND window, LPARAM result) -> BOOL {
         DWORD process = 0;
-        GetWindowThreadProcessId(found, &process);
-        if (process == GetCurrentProcessId() && GetDlgItem(found, IDC_COPY_CANCEL) != nullptr) {
-            break;
+        GetWindowThreadProcessId(window, &process);
+        if (process == GetCurrentProcessId() && GetDlgItem(window, IDC_COPY_CANCEL) != nullptr) {
+            *reinterpret_cast<HWND*>(result) = window;
         }
-    }
+        return TRUE;
+    };
+    // A snapshot: going from one window to the next would end where one has just been closed.
+    EnumWindows(look_at, reinterpret_cast<LPARAM>(&found));
     return found;
 }
 
