@@ -38,15 +38,22 @@ void RemoveTree(const std::wstring& folder) {
     RemoveDirectoryW(folder.c_str());
 }
 
+ULONGLONG NowTicks() {
+    FILETIME now{};
+    GetSystemTimeAsFileTime(&now);
+    return TicksOf(now);
+}
+
 }  // namespace
 
 TempFolder::TempFolder() {
+    // Never a name that was there before: what an ended test program has left under it might only now go
+    // away. Process ids come again, the time does not.
     static std::atomic<int> count{0};
-    const fs::path folder =
-        fs::temp_directory_path() /
-        (L"orvane_test_" + std::to_wstring(GetCurrentProcessId()) + L"_" + std::to_wstring(++count));
-    RemoveTree(L"\\\\?\\" + folder.wstring());
-    fs::create_directories(folder);
+    static const std::wstring run =
+        std::to_wstring(GetCurrentProcessId()) + L"_" + std::to_wstring(NowTicks()) + L"_";
+    const fs::path folder = fs::temp_directory_path() / (L"orvane_test_" + run + std::to_wstring(++count));
+    EXPECT_TRUE(fs::create_directories(folder));
     path_ = folder.wstring();
 }
 
