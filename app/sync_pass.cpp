@@ -5,13 +5,10 @@
 #include <utility>
 
 #include "app/sync_task.h"
-#include "device/device_path.h"
-#include "device/ensure_folder.h"
 #include "device/file_copy.h"
-#include "device/folder_copy.h"
 #include "platform/handles.h"
-#include "platform/paths.h"
 #include "qelutils/xlate.h"
+#include "selection/entry_copy.h"
 #include "ui/message_box.h"
 
 namespace orvane {
@@ -95,12 +92,14 @@ class SyncPass {
     }
 
     bool CopyRow(const std::wstring& name, const FILETIME& write_time) {
-        const bool can_copy = CanCopy(name);
+        const EntryCopy entry = {task_.pc.folder, task_.device.folder, name, kind_.to_device};
+        const HANDLE cancel = task_.copy_cancel_event;
+        const bool can_copy = CanCopyEntry(entry, kind_.to_device && task_.overwrite_bkp);
         if (can_copy) {
-            EnsureTargetFolder(name);
+            EnsureTargetFolder(entry, cancel, /*nested=*/false);
         }
         Report(kAddInfoDisplay, CopyLine(name));
-        const DeviceResult result = can_copy ? CopyFile(name, write_time) : DeviceResult::kFailed;
+        const DeviceResult result = can_copy ? CopyFile(entry, write_time, cancel) : DeviceResult::kFailed;
         if (result == DeviceResult::kDiskFull) {
             Report(kAddInfoDisplay, Xlate(kind_.disk_full));
             return false;
@@ -108,54 +107,16 @@ class SyncPass {
         if (result != DeviceResult::kDone) {
             Report(kErrorInfoDisplay, Xlate(kind_.failure));
         }
-        if (HasCompanionFolder(name)) {
-            CopyCompanion(CompanionFolder(name));
-        }
+        CopyCompanionFolder(entry, cancel, /*nested=*/false);
         return true;
     }
 
-    // Whether both sides can hold the paths of a copy, that of its backup included, and the PC the names.
-    // (The device judges names of its own accord.) Nothing that fails here reaches an operation.
-    bool CanCopy(std::wstring_view name) const {
-        return DevicePathFits(task_.device.folder.size() + name.size(), task_.overwrite_bkp) &&
-               PcPathFits(task_.pc.folder.size() + name.size()) &&
-               (kind_.to_device || IsSafePcRelativePath(name));
-    }
-
-    void EnsureTargetFolder(const std::wstring& name) const {
-        const std::wstring parent(ParentPath(target_.folder + name));
-        if (kind_.to_device) {
-            EnsureDeviceFolder(parent, task_.copy_cancel_event);
-        } else {
-            EnsurePcFolder(parent);
-        }
-    }
-
-    DeviceResult CopyFile(const std::wstring& name, const FILETIME& write_time) const {
-        const HANDLE cancel = task_.copy_cancel_event;
-        const std::wstring pc_path = task_.pc.folder + name;
-        const std::wstring device_path = task_.device.folder + name;
-        return kind_.to_device ? CopyPcFileToDeviceWithBackup(write_time, pc_path, device_path, cancel,
-                                                              task_.overwrite_bkp)
-                               : CopyDeviceFileToPcWithBackup(write_time, device_path, pc_path, cancel, false,
-                                                              task_.overwrite_bkp);
-    }
-
-    // The folder of a job file's name goes with it; what becomes of it is not reported. A job file called
-    // "..wkf" or "...wkf" has no companion: its name without extension is not that of a folder.
-    void CopyCompanion(std::wstring_view name) const {
-        const std::wstring pc_folder = task_.pc.folder + std::wstring(name);
-        const std::wstring device_folder = task_.device.folder + std::wstring(name);
-        if (!IsSafePcRelativePath(name) || !PcPathFits(pc_folder.size()) ||
-            !DevicePathFits(device_folder.size())) {
-            return;
-        }
-        const HANDLE cancel = task_.copy_cancel_event;
-        if (!kind_.to_device) {
-            CopyDeviceFolderToPc(device_folder, pc_folder, cancel, false);
-        } else if (PcEntryExists(pc_folder)) {
-            CopyPcFolderToDevice(pc_folder, device_folder, cancel);
-        }
+    DeviceResult CopyFile(const EntryCopy& entry, const FILETIME& write_time, HANDLE cancel) const {
+        const bool backup = task_.overwrite_bkp;
+        return kind_.to_device ? CopyPcFileToDeviceWithBackup(write_time, entry.PcPath(), entry.DevicePath(),
+                                                              cancel, backup)
+                               : CopyDeviceFileToPcWithBackup(write_time, entry.DevicePath(), entry.PcPath(),
+                                                              cancel, false, backup);
     }
 
     // The question has no owner window: it stands above all windows, whatever the dialog does meanwhile.

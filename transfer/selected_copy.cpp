@@ -1,17 +1,14 @@
 #include "transfer/selected_copy.h"
 
 #include <optional>
-#include <string_view>
 
 #include "device/connect.h"
-#include "device/device_path.h"
-#include "device/ensure_folder.h"
 #include "device/file_copy.h"
-#include "device/folder_copy.h"
 #include "device/remote_api.h"
 #include "platform/handles.h"
 #include "platform/paths.h"
 #include "selection/copy_rules.h"
+#include "selection/entry_copy.h"
 
 namespace orvane {
 
@@ -72,34 +69,23 @@ class SelectedCopy {
   private:
     // A file that the user keeps counts as one that failed: it stays listed.
     DeviceResult CopyOne(const std::wstring& name) const {
-        const std::wstring pc_path = pc_folder_ + name;
-        const std::wstring device_path = device_folder_ + name;
-        if (!CanCopy(name, pc_path, device_path)) {
+        const EntryCopy entry = {pc_folder_, device_folder_, name, to_device_};
+        if (request_.pc_folder.empty() || !CanCopyEntry(entry, /*with_device_backup=*/to_device_)) {
             return DeviceResult::kFailed;
         }
-        if (to_device_) {
-            EnsureDeviceFolderInSession(ParentPath(device_path));
-        } else {
-            EnsurePcFolder(std::wstring(ParentPath(pc_path)));
-        }
+        const HANDLE stop = request_.stop_event;
+        const std::wstring pc_path = entry.PcPath();
+        const std::wstring device_path = entry.DevicePath();
+        EnsureTargetFolder(entry, stop, /*nested=*/true);
         if (request_.warn_before_replacing && !MayReplace(pc_path, device_path)) {
             return DeviceResult::kFailed;
         }
-        const DeviceResult result = to_device_
-                                        ? TransferPcFileToDevice(pc_path, device_path, request_.stop_event)
-                                        : TransferDeviceFileToPc(device_path, pc_path, request_.stop_event);
-        if (result == DeviceResult::kDone && HasCompanionFolder(name)) {
-            CopyCompanion(CompanionFolder(name));
+        const DeviceResult result = to_device_ ? TransferPcFileToDevice(pc_path, device_path, stop)
+                                               : TransferDeviceFileToPc(device_path, pc_path, stop);
+        if (result == DeviceResult::kDone) {
+            CopyCompanionFolder(entry, stop, /*nested=*/true);
         }
         return result;
-    }
-
-    // Whether both sides can hold the paths, that of a backup on the device included, and the PC the names.
-    // (The device judges names of its own accord.) Nothing that fails here reaches an operation.
-    bool CanCopy(std::wstring_view name, std::wstring_view pc_path, std::wstring_view device_path) const {
-        return !request_.pc_folder.empty() && PcPathFits(pc_path.size()) &&
-               DevicePathFits(device_path.size(), /*with_backup=*/to_device_) &&
-               (to_device_ || IsSafePcRelativePath(name));
     }
 
     // Whether the target may be replaced; true when there is none. Asks the user about two versions. A source
@@ -122,22 +108,6 @@ class SelectedCopy {
         const std::wstring device_text = device_path + L" [ DEVICE ]";
         return progress_.AskReplace(to_device_ ? ReplaceQuestion(device_text, pc_text)
                                                : ReplaceQuestion(pc_text, device_text));
-    }
-
-    // The folder of a job file's name goes with it; what becomes of it is not reported. A job file called
-    // "..wkf" or "...wkf" has no companion: its name without extension is not that of a folder.
-    void CopyCompanion(std::wstring_view name) const {
-        const std::wstring pc_path = pc_folder_ + std::wstring(name);
-        const std::wstring device_path = device_folder_ + std::wstring(name);
-        if (!IsSafePcRelativePath(name) || !PcPathFits(pc_path.size()) ||
-            !DevicePathFits(device_path.size())) {
-            return;
-        }
-        if (!to_device_) {
-            CopyDeviceFolderToPc(device_path, pc_path, request_.stop_event, /*nested=*/true);
-        } else if (PcEntryExists(pc_path)) {
-            CopyPcFolderToDevice(pc_path, device_path, request_.stop_event);
-        }
     }
 
     const TransferRequest& request_;
