@@ -14,15 +14,15 @@ namespace {
 // What numbering needs to know of the side that it works on.
 struct Side {
     int end_number;  // One past the last number.
-    bool (*exists)(const std::wstring& path);
+    EntryKind (*find)(const std::wstring& path);
     bool (*rename)(const std::wstring& from, const std::wstring& to);
 };
 
-constexpr Side kPc = {INT_MAX, PcEntryExists, [](const std::wstring& from, const std::wstring& to) {
+constexpr Side kPc = {INT_MAX, PcEntry, [](const std::wstring& from, const std::wstring& to) {
                           return MoveFileW(from.c_str(), to.c_str()) != FALSE;
                       }};
 // The device's backup names have exactly three digits.
-constexpr Side kDevice = {1000, DeviceEntryExists, [](const std::wstring& from, const std::wstring& to) {
+constexpr Side kDevice = {1000, DeviceEntry, [](const std::wstring& from, const std::wstring& to) {
                               return CeMoveFile(PathBuffer(from).Get(), PathBuffer(to).Get()) != FALSE;
                           }};
 
@@ -34,15 +34,16 @@ std::wstring BackupName(const std::wstring& path, int number) {
 }
 
 bool KeepOldFile(const Side& side, const std::wstring& path) {
-    if (!side.exists(path)) {
-        return true;
+    const EntryKind kind = side.find(path);
+    if (kind != EntryKind::kFile) {
+        return kind == EntryKind::kNone;  // A folder of that name is in the way; it is no old file.
     }
     for (int number = 1; number < side.end_number; ++number) {
         const std::wstring backup = BackupName(path, number);
         if (!FitsPathBuffer(backup.size())) {
             return false;
         }
-        if (!side.exists(backup)) {
+        if (side.find(backup) == EntryKind::kNone) {
             return side.rename(path, backup);
         }
     }

@@ -22,6 +22,22 @@ static_assert(kWantedFields == 0xBF);
 // A count beyond this cannot be true: the Remote API's buffers are below 2 GiB.
 constexpr DWORD kMaxRecords = INT32_MAX / sizeof(rapi::FindData);
 
+// Whether all of that memory can be read. A device that claims more records than it sent must not make the
+// program read beyond them; what lies within readable memory is only names that are not trusted.
+bool IsReadable(const void* memory, std::size_t bytes) {
+    auto at = reinterpret_cast<std::uintptr_t>(memory);
+    const std::uintptr_t end = at + bytes;
+    while (at < end) {
+        MEMORY_BASIC_INFORMATION region{};
+        if (VirtualQuery(reinterpret_cast<const void*>(at), &region, sizeof(region)) == 0 ||
+            region.State != MEM_COMMIT || (region.Protect & (PAGE_NOACCESS | PAGE_GUARD)) != 0) {
+            return false;
+        }
+        at = reinterpret_cast<std::uintptr_t>(region.BaseAddress) + region.RegionSize;
+    }
+    return true;
+}
+
 // The records of one folder. Owns the buffer that the Remote API made for them.
 class FoundRecords {
   public:
@@ -37,7 +53,8 @@ class FoundRecords {
     // False when the device refuses or its answer makes no sense.
     bool Find(const std::wstring& pattern) {
         return CeFindAllFiles(pattern.c_str(), kWantedFields, &count_, &data_) &&
-               (count_ == 0 || (data_ != nullptr && count_ <= kMaxRecords));
+               (count_ == 0 || (data_ != nullptr && count_ <= kMaxRecords &&
+                                IsReadable(data_, count_ * sizeof(rapi::FindData))));
     }
     std::span<const rapi::FindData> All() const { return {data_, count_}; }
 

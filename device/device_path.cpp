@@ -4,6 +4,7 @@
 
 #include "device/remote_api.h"
 #include "platform/handles.h"
+#include "platform/text_case.h"
 
 namespace orvane {
 
@@ -14,19 +15,38 @@ PathBuffer::PathBuffer(std::wstring_view path) {
     characters_[path.copy(characters_, path.size())] = L'\0';
 }
 
-bool PcEntryExists(const std::wstring& path) {
-    WIN32_FIND_DATAW found;
-    return static_cast<bool>(UniqueFind(FindFirstFileW(path.c_str(), &found)));
+namespace {
+
+EntryKind KindOf(DWORD attributes) {
+    return (attributes & FILE_ATTRIBUTE_DIRECTORY) != 0 ? EntryKind::kFolder : EntryKind::kFile;
 }
 
-bool DeviceEntryExists(const std::wstring& path) {
-    rapi::FindData found;
+}  // namespace
+
+EntryKind PcEntry(const std::wstring& path) {
+    WIN32_FIND_DATAW found;
+    const UniqueFind search(FindFirstFileW(path.c_str(), &found));
+    return search ? KindOf(found.dwFileAttributes) : EntryKind::kNone;
+}
+
+EntryKind DeviceEntry(const std::wstring& path) {
+    rapi::FindData found{};
     const HANDLE search = CeFindFirstFile(PathBuffer(path).Get(), &found);
     if (search == INVALID_HANDLE_VALUE) {
-        return false;
+        return EntryKind::kNone;
     }
     CeFindClose(search);
-    return true;
+    return KindOf(found.attributes);
+}
+
+bool IsShortNameOfAnother(const std::wstring& pc_path) {
+    const std::wstring_view name = std::wstring_view(pc_path).substr(pc_path.rfind(L'\\') + 1);
+    if (name.find(L'~') == std::wstring_view::npos) {
+        return false;
+    }
+    WIN32_FIND_DATAW found;
+    const UniqueFind search(FindFirstFileW(pc_path.c_str(), &found));
+    return search && !EqualIgnoringCase(found.cFileName, name);
 }
 
 }  // namespace orvane

@@ -34,9 +34,14 @@ class PathBuffer {
     wchar_t characters_[kPathBufferChars];
 };
 
-// Whether a search for the path finds a file or folder.
-bool PcEntryExists(const std::wstring& path);
+// What a search for a path finds.
+enum class EntryKind { kNone, kFile, kFolder };
+EntryKind PcEntry(const std::wstring& path);
 // The same on the device, in the caller's session.
-bool DeviceEntryExists(const std::wstring& path);
+EntryKind DeviceEntry(const std::wstring& path);
+
+// Whether the last component of the path is the short name ("LONGNA~1.QVJ") that the PC's file system has
+// given to an entry of another name. To open such a path is to open that other file.
+bool IsShortNameOfAnother(const std::wstring& pc_path);
 
 }  // namespace orvane

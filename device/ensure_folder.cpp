@@ -14,7 +14,7 @@ void CreateDeviceLevels(std::wstring_view path, bool look_up_first) {
     for (std::size_t end = levels.find(L'\\', 1); end != std::wstring::npos;
          end = levels.find(L'\\', end + 1)) {
         const std::wstring level = levels.substr(0, end);
-        if (!look_up_first || !DeviceEntryExists(level)) {
+        if (!look_up_first || DeviceEntry(level) == EntryKind::kNone) {
             CeCreateDirectory(PathBuffer(level).Get(), nullptr);
         }
     }
@@ -39,7 +39,7 @@ void EnsurePcFolder(const std::wstring& path) {
     }
     // Ends because each parent is shorter; a path without a parent gives an empty one.
     const std::wstring parent(ParentPath(path));
-    if (!parent.empty() && !PcEntryExists(parent)) {
+    if (!parent.empty() && PcEntry(parent) == EntryKind::kNone) {
         EnsurePcFolder(parent);
     }
     CreateDirectoryW(path.c_str(), nullptr);

@@ -12,6 +12,12 @@ namespace {
 
 constexpr DWORD kChunkBytes = 8192;
 
+// 1990-01-01 UTC, what a target is dated as long as it is not complete. A device that vanishes, or a process
+// that ends, in the middle of a copy leaves a partial file behind: it must count as older than the whole one
+// on the other side, so that the next synchronization repairs it and never copies it back. (A device that is
+// lost between the calls that create and date the file still leaves an empty one behind.)
+constexpr FILETIME kUnfinished = {0x18D64000, 0x1B41E2A};
+
 struct DeviceFileTraits {
     using Type = HANDLE;
     static Type Invalid() noexcept { return INVALID_HANDLE_VALUE; }
@@ -31,7 +37,6 @@ constexpr Side kPc = {
         return ReadFile(file, buffer, wanted, read, nullptr);
     },
     [](HANDLE file, const void* buffer, DWORD wanted, DWORD* written) {
-        SetLastError(ERROR_SUCCESS);  // A short write may succeed: no older error must explain it.
         return WriteFile(file, buffer, wanted, written, nullptr);
     },
     [] { return GetLastError(); },
@@ -84,8 +89,11 @@ DeviceResult CopyChunks(const Side& from, HANDLE source, const Side& to, HANDLE 
             return DeviceResult::kFailed;
         }
         DWORD written = 0;
-        if (!to.write(target, chunk, read, &written) || written != read) {
+        if (!to.write(target, chunk, read, &written)) {
             return to.last_error() == ERROR_DISK_FULL ? DeviceResult::kDiskFull : DeviceResult::kFailed;
+        }
+        if (written != read) {
+            return DeviceResult::kFailed;
         }
         if (read < kChunkBytes) {
             return DeviceResult::kDone;
@@ -164,12 +172,17 @@ DeviceResult CopyToDevice(const std::wstring& pc_path, const std::wstring& devic
     if (IsSignalled(cancel_event)) {
         return DeviceResult::kCancelled;
     }
-    // Meant: only INVALID_HANDLE_VALUE counts as refused. The null of a missing entry point goes on, and
-    // fails with the first write.
     UniqueDeviceFile target(CeCreateFile(PathBuffer(device_path).Get(), GENERIC_WRITE, FILE_SHARE_READ,
                                          nullptr, plan.TargetCreation(), FILE_ATTRIBUTE_NORMAL, nullptr));
     if (!target) {
         return plan.not_begun;
+    }
+    // The null of a missing entry point is no refusal, but nothing was created that could be cleaned up.
+    if (target.Get() == nullptr) {
+        return DeviceResult::kFailed;
+    }
+    if (plan.stamp != CopyPlan::Stamp::kNone) {
+        CeSetFileTime(target.Get(), nullptr, nullptr, &kUnfinished);
     }
     DeviceResult result = CopyChunks(kPc, source.Get(), kDevice, target.Get(), cancel_event);
     if (result == DeviceResult::kDone) {
@@ -195,7 +208,7 @@ DeviceResult CopyToPc(const std::wstring& device_path, const std::wstring& pc_pa
     UniqueDeviceFile source(OpenDeviceFile(device_path, GENERIC_READ, FILE_SHARE_READ, OPEN_EXISTING,
                                            cancel_event, /*nested=*/true));
     // The null of a missing entry point could never be read: no old file is given up for it.
-    if (!source || source.Get() == nullptr) {
+    if (!source || source.Get() == nullptr || IsShortNameOfAnother(pc_path)) {
         return DeviceResult::kFailed;
     }
     if (plan.make_backup && !KeepOldPcFile(pc_path)) {
@@ -209,6 +222,9 @@ DeviceResult CopyToPc(const std::wstring& device_path, const std::wstring& pc_pa
                                   FILE_ATTRIBUTE_NORMAL, nullptr));
     if (!target) {
         return DeviceResult::kFailed;
+    }
+    if (plan.stamp != CopyPlan::Stamp::kNone) {
+        SetFileTime(target.Get(), nullptr, nullptr, &kUnfinished);
     }
     FileTimes times;
     if (plan.stamp == CopyPlan::Stamp::kAllThree) {

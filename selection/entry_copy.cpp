@@ -35,7 +35,7 @@ void CopyCompanionFolder(const EntryCopy& entry, HANDLE cancel_event, bool neste
     }
     if (!entry.to_device) {
         CopyDeviceFolderToPc(companion.DevicePath(), companion.PcPath(), cancel_event, nested);
-    } else if (PcEntryExists(companion.PcPath())) {
+    } else if (PcEntry(companion.PcPath()) != EntryKind::kNone) {
         CopyPcFolderToDevice(companion.PcPath(), companion.DevicePath(), cancel_event);
     }
 }

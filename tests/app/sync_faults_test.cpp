@@ -61,9 +61,13 @@ TEST_F(SyncTest, ADeviceThatVanishesCostsNoFile) {
         PutOnPc(name, "older", noon_);
         PutOnDevice(name, "newer", AddSeconds(noon_, 60));
     }
+    // A copy that is cut off must not be taken for a newer file by the next run.
+    const std::string whole(50'000, 'w');
+    PutOnPc(L"big.qvj", whole, noon_);
+    PutOnDevice(L"big.txt", whole, noon_);
     const DialogRun dialog;
-    // Every place in the run where the device may be lost, up to its regular end.
-    for (int call = 2; call < 60; call += 3) {
+    // Places all over the run where the device may be lost, up to its regular end.
+    for (int call = 2; call < 100; call += 3) {
         device_.Set(L"VANISH", std::to_wstring(call));
         const MessageBoxAnswerer answers({IDOK});
         dialog.Press(IDC_SYNC_START);
@@ -74,8 +78,16 @@ TEST_F(SyncTest, ADeviceThatVanishesCostsNoFile) {
             const auto on_pc = ReadTextFile(OnPc(name));
             EXPECT_TRUE(!on_pc || on_pc == "older" || on_pc == "newer") << call;
         }
+        // Lost between the calls that create and date the file: the one moment that cannot be covered.
+        if (ReadTextFile(OnDevice(L"big.qvj")) == "") {
+            DeleteFileW(OnDevice(L"big.qvj").c_str());
+        }
+        EXPECT_TRUE(ReadTextFile(OnPc(L"big.qvj")) == whole) << call;
+        EXPECT_TRUE(ReadTextFile(OnDevice(L"big.txt")) == whole) << call;
     }
     dialog.Synchronize();
+    EXPECT_TRUE(ReadTextFile(OnDevice(L"big.qvj")) == whole);
+    EXPECT_TRUE(ReadTextFile(OnPc(L"big.txt")) == whole);
     EXPECT_EQ(ReadTextFile(OnPc(L"c.qvj")), "newer");
 }
 

@@ -159,7 +159,8 @@ TEST_F(DeviceListing, DoesNotTrustTheDevice) {
     const Case cases[] = {
         {L"", L"1", DeviceResult::kFailed},          {L"0", L"", DeviceResult::kDone},
         {L"0", L"1", DeviceResult::kDone},           {L"4294967295", L"", DeviceResult::kFailed},
-        {L"2147483648", L"", DeviceResult::kFailed}, {L"100000000", L"", DeviceResult::kFailed}};
+        {L"2147483648", L"", DeviceResult::kFailed}, {L"100000000", L"", DeviceResult::kFailed},
+        {L"3000000", L"", DeviceResult::kFailed}};
     for (const Case& c : cases) {
         device_.Set(L"FOUND_COUNT", c.found_count);
         device_.Set(L"FOUND_NULL", c.found_null);
