@@ -9,7 +9,7 @@
 #include "browse/property_texts.h"
 #include "platform/handles.h"
 #include "res/ids.h"
-#include "tests/browse/dialog_script.h"
+#include "tests/support/dialog_script.h"
 #include "tests/support/folder_device.h"
 #include "tests/support/message_boxes.h"
 

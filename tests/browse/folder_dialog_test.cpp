@@ -6,7 +6,7 @@
 
 #include "platform/text_case.h"
 #include "res/ids.h"
-#include "tests/browse/dialog_script.h"
+#include "tests/support/dialog_script.h"
 #include "tests/support/temp_folder.h"
 #include "ui/data_exchange.h"
 

@@ -9,8 +9,8 @@
 
 namespace orvane::testing {
 
-// Calls `modal`, which shows a dialog without an owner, and runs `script` on another thread as soon as that
-// dialog can be seen. Dialogs that the script leaves open are closed. Returns what `modal` returns.
+// Calls `modal`, which shows a dialog that no other dialog owns, and runs `script` on another thread as soon
+// as that dialog can be seen. Dialogs that the script leaves open are closed. Returns what `modal` returns.
 INT_PTR RunWithScript(const std::function<INT_PTR()>& modal, const std::function<void(HWND)>& script);
 
 // The visible dialogs of the window's thread, the window itself among them.

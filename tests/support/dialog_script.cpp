@@ -1,4 +1,4 @@
-#include "tests/browse/dialog_script.h"
+#include "tests/support/dialog_script.h"
 
 #include <gtest/gtest.h>
 
@@ -27,10 +27,12 @@ std::vector<HWND> DialogsOfThread(DWORD thread) {
     return dialogs;
 }
 
-HWND FindUnowned(DWORD thread) {
+// The dialog that all others of the thread stand on.
+HWND FindFirst(DWORD thread) {
     const std::vector<HWND> dialogs = DialogsOfThread(thread);
-    const auto found = std::find_if(dialogs.begin(), dialogs.end(),
-                                    [](HWND dialog) { return GetWindow(dialog, GW_OWNER) == nullptr; });
+    const auto found = std::find_if(dialogs.begin(), dialogs.end(), [&dialogs](HWND dialog) {
+        return std::find(dialogs.begin(), dialogs.end(), GetWindow(dialog, GW_OWNER)) == dialogs.end();
+    });
     return found != dialogs.end() ? *found : nullptr;
 }
 
@@ -40,7 +42,7 @@ INT_PTR RunWithScript(const std::function<INT_PTR()>& modal, const std::function
     const DWORD thread = GetCurrentThreadId();
     std::thread runner([thread, &script] {
         HWND dialog = nullptr;
-        if (!WaitUntil([&] { return (dialog = FindUnowned(thread)) != nullptr; })) {
+        if (!WaitUntil([&] { return (dialog = FindFirst(thread)) != nullptr; })) {
             ADD_FAILURE() << "the dialog does not show";
             return;
         }
