@@ -1,0 +1,266 @@
+#include "settings/options_dialog.h"
+
+#include <gtest/gtest.h>
+
+#include <commctrl.h>
+
+#include <array>
+#include <bitset>
+
+#include "res/ids.h"
+#include "settings/registry_strings.h"
+#include "tests/support/dialog_script.h"
+#include "tests/support/folder_device.h"
+#include "tests/support/scratch_registry.h"
+
+namespace orvane {
+namespace {
+
+using testing::Press;
+
+const std::wstring kKey = L"Software\\Veltrano\\CE Devices";
+const std::wstring kAutoStartKey = L"SOFTWARE\\Microsoft\\Windows CE Services\\AutoStartOnConnect";
+
+// The boxes in the order of the block, which has all but the last.
+constexpr std::array kIds = {1021, 1022, 1023, 1024, 1025, 1027, 1029, 1026, 1038,
+                             1039, 1040, 1028, 1030, 1031, 1032, 1033, 1041};
+constexpr std::size_t kCount = kIds.size();
+constexpr std::array<const wchar_t*, kCount> kNames = {L"qvj", L"tn3", L"rd3", L"pt3", L"ln3",  L"jpg",
+                                                       L"bmp", L"all", L"old", L"bkp", L"warn", L"img",
+                                                       L"xml", L"tp3", L"wkf", L"txt", L"view"};
+constexpr std::array<const wchar_t*, kCount> kValues = {
+    L"Sync_qvj_files", L"Sync_tn3_files", L"Sync_rd3_files", L"Sync_pt3_files",      L"Sync_ln3_files",
+    L"Sync_jpg_files", L"Sync_bmp_files", L"Sync_all_files", L"Overwrite_old_files", L"Overwrite_bkp",
+    L"Overwrite_warn", L"Sync_img_files", L"Sync_xml_files", L"Sync_tp3_files",      L"Sync_wkf_files",
+    L"Sync_txt_files", L"Start_File_View"};
+
+using Boxes = std::bitset<kCount>;
+
+template <class Condition>
+Boxes Those(Condition condition) {
+    Boxes boxes;
+    for (std::size_t i = 0; i < kCount; ++i) {
+        boxes[i] = condition(i);
+    }
+    return boxes;
+}
+
+Boxes Named(std::wstring_view names) {
+    return Those([&](std::size_t i) { return names.find(kNames[i]) != std::wstring_view::npos; });
+}
+
+const Boxes kAll = Named(L"all");
+const Boxes kOverwrite = Named(L"old");
+const Boxes kWarn = Named(L"warn");
+const Boxes kDependent = Named(L"warn bkp");
+const Boxes kTypes = Named(L"qvj tn3 rd3 pt3 ln3 jpg bmp img xml tp3 wkf txt");
+
+Boxes Ticked(HWND dialog) {
+    return Those([&](std::size_t i) { return IsDlgButtonChecked(dialog, kIds[i]) == BST_CHECKED; });
+}
+
+// Without telling the dialog.
+void Tick(HWND dialog, const Boxes& boxes) {
+    for (std::size_t i = 0; i < kCount; ++i) {
+        CheckDlgButton(dialog, kIds[i], boxes[i] ? BST_CHECKED : BST_UNCHECKED);
+    }
+}
+
+void Click(HWND dialog, int id) {
+    SendDlgItemMessageW(dialog, id, BM_CLICK, 0, 0);
+}
+
+void Type(HWND dialog, const wchar_t* pc_folder, const wchar_t* device_folder) {
+    SetDlgItemTextW(dialog, IDC_OPTIONS_PC_FOLDER, pc_folder);
+    SetDlgItemTextW(dialog, IDC_OPTIONS_DEVICE_FOLDER, device_folder);
+}
+
+std::wstring Folders(HWND dialog) {
+    return testing::ItemText(dialog, IDC_OPTIONS_PC_FOLDER) + L" " +
+           testing::ItemText(dialog, IDC_OPTIONS_DEVICE_FOLDER);
+}
+
+// Presses a "Browse" button and, when the field of what opens shows `start`, `button` there.
+void Browse(HWND dialog, int browse, int button, const std::wstring& start) {
+    const bool device = browse == IDC_OPTIONS_DEVICE_BROWSE;
+    HWND opened = nullptr;
+    Press(dialog, browse);
+    EXPECT_TRUE(testing::WaitUntil([&] {
+        opened = FindWindowW(L"#32770", device ? L"Mobile Device Browse" : L"Select Directory");
+        return testing::ItemText(opened, device ? IDC_BROWSE_FOLDER : IDC_FOLDER_DIRECTORY) == start;
+    }));
+    Press(opened, button);
+    EXPECT_TRUE(testing::WaitUntil([&] { return !IsWindow(opened) && IsWindowEnabled(dialog); }));
+}
+
+std::wstring Stored(const wchar_t* name, HKEY root = HKEY_CURRENT_USER, const std::wstring& key = kKey) {
+    std::wstring text;
+    return RegReadString(root, key, name, text) ? text : L"(none)";
+}
+
+class OptionsDialog : public ::testing::Test {
+  protected:
+    OptionsDialog() {
+        const INITCOMMONCONTROLSEX controls = {sizeof(controls), ICC_WIN95_CLASSES};
+        InitCommonControlsEx(&controls);
+        SetActiveWindow(owner_);
+    }
+    ~OptionsDialog() override { DestroyWindow(owner_); }
+
+    // What the dialog begins with. It does not look at the folders that are stored.
+    void Set(const Boxes& ticked, const std::wstring& pc_folder = L"C:\\") {
+        block_.sync_path_dt = pc_folder;
+        block_.sync_path_ce = L"\\Jobs\\";
+        RegWriteString(HKEY_CURRENT_USER, kKey, L"SyncPath_DT", L"C:\\stored");
+        RegWriteString(HKEY_CURRENT_USER, kKey, L"SyncPath_CE", L"\\stored");
+        for (std::size_t i = 0; i < kCount; ++i) {
+            RegWriteString(HKEY_CURRENT_USER, kKey, kValues[i], ticked[i] ? L"1" : L"0");
+            if (i + 1 < kCount) {
+                (&block_.sync_qvj_files)[i] = ticked[i] ? L"1" : L"0";
+            }
+        }
+    }
+    void Run(const std::function<void(HWND)>& script) {
+        testing::RunWithScript([&] { return RunOptions(owner_, block_) ? IDOK : IDCANCEL; }, script);
+    }
+
+    testing::ScratchRegistry registry_;
+    testing::FolderDevice device_;
+    SyncSettingsBlock block_;
+    HWND owner_ = CreateWindowExW(0, L"STATIC", L"", WS_POPUP | WS_VISIBLE, 0, 0, 9, 9, nullptr, nullptr,
+                                  GetModuleHandleW(nullptr), nullptr);
+};
+
+TEST_F(OptionsDialog, TypeBoxesDecideOnAllFiles) {
+    // Boxes with handlers of a kind, the box that these read if not the clicked one, the ones they overlook.
+    const struct {
+        Boxes clicked, read, overlooked;
+    } handlers[] = {{Named(L"qvj tn3 rd3 pt3 ln3 jpg"), {}, {}},
+                    {Named(L"img xml tp3 wkf"), {}, Named(L"bmp")},
+                    {Named(L"txt"), Named(L"wkf"), Named(L"bmp txt")}};
+    COptionsDlg dialog(block_, owner_);
+    ASSERT_TRUE(dialog.Create());
+    // Every type is clicked with any other one unticked or none, in all combinations with "All files.".
+    for (std::size_t run = 0; run < 4 * kCount * kCount; ++run) {
+        const std::size_t clicked = run / 4 / kCount;
+        const Boxes all_before = (run & 1U) != 0 ? kAll : Boxes();
+        const Boxes types = Boxes(kTypes).reset(run / 4 % kCount).set(clicked, (run & 2U) != 0);
+        Boxes all = all_before;
+        for (const auto& handler : handlers) {
+            if (handler.clicked[clicked]) {
+                const Boxes read = handler.read.any() ? handler.read : Boxes().set(clicked);
+                const bool ticks = (types | handler.overlooked) == kTypes;
+                all = (types & read).none() ? Boxes() : ticks ? kAll : all_before;
+            }
+        }
+        if (kTypes[clicked]) {
+            Tick(dialog.Handle(), (types | all_before).flip(clicked));
+            Click(dialog.Handle(), kIds[clicked]);
+            EXPECT_EQ(Ticked(dialog.Handle()), types | all) << kNames[clicked] << " " << all_before;
+        }
+    }
+}
+
+TEST_F(OptionsDialog, SelectAllAndAllFilesTickEveryType) {
+    Set(Named(L"bmp") | kWarn | kOverwrite);
+    COptionsDlg dialog(block_, owner_);
+    ASSERT_TRUE(dialog.Create());
+    for (const Boxes& expected : {kTypes, kTypes | kAll, Boxes()}) {
+        Click(dialog.Handle(), expected == kTypes ? IDC_OPTIONS_SELECT_ALL : IDC_OPTIONS_ALL_FILES);
+        EXPECT_EQ(Ticked(dialog.Handle()), expected | kWarn | kOverwrite);
+    }
+}
+
+TEST_F(OptionsDialog, WarningAndBackupDependOnOverwriting) {
+    for (const Boxes& at_start : {kDependent, kDependent | kOverwrite}) {
+        Set(at_start);
+        COptionsDlg dialog(block_, owner_);
+        ASSERT_TRUE(dialog.Create());
+        bool on = at_start != kDependent;
+        EXPECT_EQ(Ticked(dialog.Handle()), on ? at_start : Boxes());
+        for (int clicks = 0; clicks < 2; ++clicks, on = !on) {
+            EXPECT_EQ(IsWindowEnabled(GetDlgItem(dialog.Handle(), IDC_OPTIONS_WARN)) != FALSE, on);
+            EXPECT_EQ(IsWindowEnabled(GetDlgItem(dialog.Handle(), IDC_OPTIONS_BACKUP)) != FALSE, on);
+            Click(dialog.Handle(), IDC_OPTIONS_OVERWRITE);
+        }
+        // Of two that were ticked the warning stays so.
+        EXPECT_EQ(Ticked(dialog.Handle()), on ? kWarn | kOverwrite : Boxes());
+    }
+}
+
+TEST_F(OptionsDialog, OkStoresAndCancelDoesNot) {
+    // An empty folder on the device leaves the one that is stored.
+    const std::array<std::array<const wchar_t*, 2>, 3> folders = {
+        {{L"\\typed\\\\", L"\\typed\\"}, {L"", L"\\stored"}, {L"\\", L"\\"}}};
+    for (std::size_t run = 0; run < 2 * kCount; ++run) {
+        const bool ok = run % 2 == 0;
+        const auto& [typed, stored] = folders[run / 2 % folders.size()];
+        const Boxes box = Boxes(1) << run / 2;
+        const Boxes ticked = (box & kDependent).any() ? box | kOverwrite : box;
+        Set(ticked);
+        Run([&](HWND dialog) {
+            EXPECT_EQ(Ticked(dialog), ticked);
+            EXPECT_EQ(Folders(dialog), L"C:\\ \\Jobs\\");
+            Type(dialog, L"C:\\typed", typed);
+            Tick(dialog, ticked ^ kOverwrite);
+            Press(dialog, ok ? IDOK : IDCANCEL);
+        });
+        const Boxes stored_boxes = Those([](std::size_t i) { return Stored(kValues[i]) == L"1"; });
+        EXPECT_EQ(stored_boxes, ok ? ticked ^ kOverwrite : ticked);
+        EXPECT_EQ(Stored(L"SyncPath_DT"), ok ? L"C:\\typed\\" : L"C:\\stored");
+        EXPECT_EQ(Stored(L"SyncPath_CE"), ok ? stored : L"\\stored");
+    }
+}
+
+TEST_F(OptionsDialog, AutoStartFollowsTheBoxAfterOkOnly) {
+    constexpr const wchar_t* kValue = L"ORVANE ActiveSync";
+    std::array<wchar_t, MAX_PATH> program{};
+    GetModuleFileNameW(nullptr, program.data(), MAX_PATH);
+    for (const unsigned run : {0U, 1U, 2U, 3U, 4U, 5U, 6U, 7U}) {
+        const bool was_on = (run & 1U) != 0;
+        const bool toggled = (run & 2U) != 0;
+        const bool ok = (run & 4U) != 0;
+        RegWriteString(HKEY_LOCAL_MACHINE, kAutoStartKey, kValue, was_on ? L"C:\\elsewhere.exe" : L"");
+        Run([&](HWND dialog) {
+            EXPECT_EQ(IsDlgButtonChecked(dialog, IDC_OPTIONS_AUTO_START) != 0, was_on);
+            if (toggled) {
+                Click(dialog, IDC_OPTIONS_AUTO_START);
+                Click(dialog, IDC_OPTIONS_SELECT_ALL);  // Takes the values of all boxes.
+            }
+            Press(dialog, ok ? IDOK : IDCANCEL);
+        });
+        EXPECT_EQ(Stored(kValue, HKEY_LOCAL_MACHINE, kAutoStartKey),
+                  was_on != (toggled && ok) ? program.data() : L"")
+            << run;
+    }
+}
+
+TEST_F(OptionsDialog, OnlyAChosenPcFolderDropsWhatWasTyped) {
+    const testing::TempFolder pc_folder;
+    testing::MakeFolder(device_.PcPath(L"\\Jobs\\North"));
+    Set(kOverwrite, pc_folder.Path());
+    Run([&](HWND dialog) {
+        const struct {
+            int browse, button;
+            std::wstring start, folders;
+            Boxes ticked;
+        } runs[] = {
+            {IDC_OPTIONS_PC_BROWSE, IDCANCEL, pc_folder.Path(), L"C:\\a \\jobs\\north\\b",
+             kWarn | kOverwrite},
+            {IDC_OPTIONS_PC_BROWSE, IDOK, pc_folder.Path(), pc_folder.Path() + L" \\Jobs\\", kOverwrite},
+            {IDC_OPTIONS_DEVICE_BROWSE, IDCANCEL, L"\\Jobs\\North\\", L"C:\\a \\jobs\\north\\b",
+             kWarn | kOverwrite},
+            {IDC_OPTIONS_DEVICE_BROWSE, IDOK, L"\\Jobs\\North\\", L"C:\\a \\Jobs\\North\\",
+             kWarn | kOverwrite}};
+        for (const auto& run : runs) {
+            Type(dialog, L"C:\\a", L"\\jobs\\north\\b");
+            Tick(dialog, kWarn | kOverwrite);
+            Browse(dialog, run.browse, run.button, run.start);
+            EXPECT_EQ(Folders(dialog), run.folders);
+            EXPECT_EQ(Ticked(dialog), run.ticked);
+        }
+    });
+}
+
+}  // namespace
+}  // namespace orvane
