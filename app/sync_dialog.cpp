@@ -2,6 +2,8 @@
 
 #include <commctrl.h>
 
+#include <utility>
+
 #include "app/about_dialog.h"
 #include "app/sync_pass.h"
 #include "device/clock_check.h"
@@ -31,6 +33,10 @@ constexpr DWORD kCancelledWorkerWaitMs = 2000;
 // timer that resumes is served after both.
 constexpr DWORD kReportBudgetMs = 30;
 constexpr UINT_PTR kReportTimer = 1;
+
+// Painting a step of the bar or a line of the log takes longer than most files take to be copied: what the
+// reports change is shown in one go, this often at most.
+constexpr DWORD kShowIntervalMs = 50;
 
 }  // namespace
 
@@ -217,6 +223,7 @@ bool CWendlowDlg::SettleEarlierRun() {
             worker.Reset();
         }
         if (!first_worker_ && !second_worker_) {
+            ShowReports();
             return true;
         }
     }
@@ -315,8 +322,12 @@ void CWendlowDlg::CancelWorker() {
 void CWendlowDlg::OnSyncNotify() {
     const bool all_handled =
         task_.reports.Drain(kReportBudgetMs, [this](SyncReport report) { HandleReport(std::move(report)); });
-    if (!all_handled) {
-        SetTimer(Handle(), kReportTimer, USER_TIMER_MINIMUM, nullptr);
+    const bool due = GetTickCount64() - reports_shown_at_ >= kShowIntervalMs;
+    if (due) {
+        ShowReports();
+    }
+    if (!all_handled || !due) {
+        SetTimer(Handle(), kReportTimer, all_handled ? kShowIntervalMs : USER_TIMER_MINIMUM, nullptr);
     }
 }
 
@@ -326,7 +337,7 @@ void CWendlowDlg::HandleReport(SyncReport report) {
         task_.info_text = std::move(*report.info_text);
     }
     if (task_.command == kIncrementProgress) {
-        AdvanceProgress();
+        ++unshown_steps_;
     } else if (task_.command == kAddInfoDisplay) {
         OnAddInfo();
     } else if (task_.command == kErrorInfoDisplay) {
@@ -340,16 +351,16 @@ void CWendlowDlg::HandleReport(SyncReport report) {
 
 void CWendlowDlg::OnAddInfo() {
     if (!task_.info_text.empty()) {
-        AdvanceProgress();
-        AddLogLine(task_.info_text);
+        ++unshown_steps_;
+        unshown_lines_.push_back(std::move(task_.info_text));
         task_.info_text.clear();
     }
-    SelectLastLogLine();
 }
 
 // Marks the line of the failed file in the log, if the log's lines were windows. They are not, and so an
 // error only discards its text: the file's line stays as it was. That is meant.
 void CWendlowDlg::OnErrorInfo() {
+    ShowReports();
     if (!task_.info_text.empty()) {
         HWND progress = Item(IDC_SYNC_PROGRESS);
         const LRESULT position = SendMessageW(progress, PBM_GETPOS, 0, 0);
@@ -374,6 +385,7 @@ void CWendlowDlg::OnSecondPassComplete() {
         return;
     }
     AwaitAndForget(second_worker_);
+    ShowReports();
     HWND progress = Item(IDC_SYNC_PROGRESS);
     const LRESULT upper_end = SendMessageW(progress, PBM_GETRANGE, FALSE, 0);
     SendMessageW(progress, PBM_SETPOS, static_cast<WPARAM>(upper_end), 0);
@@ -407,10 +419,26 @@ void CWendlowDlg::SelectLastLogLine() {
     SendMessageW(log, LB_SETCURSEL, static_cast<WPARAM>(lines - 1), 0);
 }
 
-void CWendlowDlg::AdvanceProgress() {
-    HWND progress = Item(IDC_SYNC_PROGRESS);
-    const LRESULT position = SendMessageW(progress, PBM_GETPOS, 0, 0);
-    SendMessageW(progress, PBM_SETPOS, static_cast<WPARAM>(position + 1), 0);
+// Brings the bar and the log to where the reports handled so far have moved them.
+void CWendlowDlg::ShowReports() {
+    reports_shown_at_ = GetTickCount64();
+    if (unshown_steps_ > 0) {
+        HWND progress = Item(IDC_SYNC_PROGRESS);
+        const LRESULT position = SendMessageW(progress, PBM_GETPOS, 0, 0);
+        SendMessageW(progress, PBM_SETPOS, static_cast<WPARAM>(position + std::exchange(unshown_steps_, 0)),
+                     0);
+    }
+    if (!unshown_lines_.empty()) {
+        HWND log = Item(IDC_SYNC_LOG);
+        SendMessageW(log, WM_SETREDRAW, FALSE, 0);
+        for (const std::wstring& line : unshown_lines_) {
+            AddLogLine(line);
+        }
+        unshown_lines_.clear();
+        SelectLastLogLine();
+        SendMessageW(log, WM_SETREDRAW, TRUE, 0);
+        InvalidateRect(log, nullptr, TRUE);
+    }
 }
 
 }  // namespace orvane

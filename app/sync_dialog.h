@@ -67,7 +67,7 @@ class CWendlowDlg : public ui::Dialog {
     void AwaitAndForget(UniqueThread& worker);
     void AddLogLine(const std::wstring& text);
     void SelectLastLogLine();
-    void AdvanceProgress();
+    void ShowReports();
 
     UniqueBrush background_;
     HICON icon_;
@@ -78,6 +78,10 @@ class CWendlowDlg : public ui::Dialog {
     // them.
     std::vector<std::unique_ptr<JobListing>> listings_;
     SyncTask task_;
+    // What reports have changed and the controls do not show yet; since when they do not, in ticks.
+    LRESULT unshown_steps_ = 0;
+    std::vector<std::wstring> unshown_lines_;
+    ULONGLONG reports_shown_at_ = 0;
     UniqueThread first_worker_;   // Desktop to device.
     UniqueThread second_worker_;  // Device to desktop.
 };
