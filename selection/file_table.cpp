@@ -1,6 +1,7 @@
 #include "selection/file_table.h"
 
 #include <bit>
+#include <cwchar>
 
 #include "platform/text_case.h"
 
@@ -31,16 +32,16 @@ void FlattenTree(FileTable& table, std::int32_t& row, const FileNode& node, cons
             return;
         }
         const auto index = static_cast<std::size_t>(row++);
-        std::wstring name = prefix + L"\\" + child.name;
+        std::wstring& name = table.names[index];
+        name.reserve(prefix.size() + 1 + std::wcslen(child.name));
+        name.append(prefix).append(1, L'\\').append(child.name);
         const bool is_folder = child.is_folder != 0;
         table.kinds[index] = is_folder ? kKindFolder : kKindFile;
-        if (!is_folder) {
-            table.creation_times[index] = child.creation_time;
-            table.write_times[index] = child.last_write_time;
-        }
-        table.names[index] = name;
         if (is_folder) {
             FlattenTree(table, row, child, name, capacity);
+        } else {
+            table.creation_times[index] = child.creation_time;
+            table.write_times[index] = child.last_write_time;
         }
     }
 }
