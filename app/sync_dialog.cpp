@@ -11,7 +11,7 @@
 #include "platform/resources.h"
 #include "qelutils/xlate.h"
 #include "res/ids.h"
-#include "selection/pc_listing.h"
+#include "selection/job_table.h"
 #include "settings/options_dialog.h"
 #include "transfer/transfer_dialog.h"
 #include "ui/message_box.h"
@@ -71,6 +71,7 @@ bool CWendlowDlg::OnInitDialog() {
 
     if (settings_.start_file_view != 0) {
         // The program is a file viewer then; this dialog never comes into view.
+        stay_hidden_ = true;
         OnFileView();
         End(0);
         return true;
@@ -134,6 +135,12 @@ std::optional<LRESULT> CWendlowDlg::OnMessage(UINT message, WPARAM wparam, LPARA
             KillTimer(Handle(), kReportTimer);
             OnSyncNotify();
             return 0;
+        case WM_WINDOWPOSCHANGING:
+            // The dialog manager may show even a dialog that has ended while it was initialised.
+            if (stay_hidden_) {
+                reinterpret_cast<WINDOWPOS*>(lparam)->flags &= ~static_cast<UINT>(SWP_SHOWWINDOW);
+            }
+            return std::nullopt;
         case WM_SYSCOMMAND:
             return OnSysCommand(static_cast<UINT>(wparam)) ? std::optional<LRESULT>(0) : std::nullopt;
         case WM_PAINT:
@@ -191,18 +198,13 @@ void CWendlowDlg::OnSynchronize() {
     }
     const ui::WaitCursor wait;
     SetDlgItemTextW(Handle(), IDC_SYNC_STATUS, Xlate(L"Synchronization in progress...").c_str());
-    JobListing& device = NewListing();
-    if (!device_tree_.ReadOnThread(settings_.sync_path_ce, {}, device.root, Handle())) {
+    FileNode device_root;
+    if (!device_tree_.ReadOnThread(settings_.sync_path_ce, {}, device_root, Handle())) {
         ui::ShowMessageBox(Handle(), Xlate(L"failed to read from remote device."));
         SetDlgItemTextW(Handle(), IDC_SYNC_STATUS, L"");
         return;
     }
-    JobListing& pc = NewListing();
-    // A folder that is missing gives an empty listing: then there is nothing to copy from the PC.
-    ListPcFolder(settings_.sync_path_dt + L"\\*.*", true, pc.root);
-    Flatten(device);
-    Flatten(pc);
-    FillTask(pc, device);
+    FillTask(ListPcJobFolder(settings_.sync_path_dt), JobTable(device_root));
     ShowStart();
     StartWorker(first_worker_, SyncThreadDT2CE);
 }
@@ -229,23 +231,11 @@ bool CWendlowDlg::SettleEarlierRun() {
     }
 }
 
-CWendlowDlg::JobListing& CWendlowDlg::NewListing() {
-    return *listings_.emplace_back(std::make_unique<JobListing>());
-}
-
-void CWendlowDlg::Flatten(JobListing& listing) {
-    const std::int32_t capacity = CountEntries(0, listing.root);
-    FlattenTree(listing.table, listing.rows, listing.root, {}, capacity);
-}
-
-void CWendlowDlg::FillTask(const JobListing& pc, const JobListing& device) {
-    const auto side = [](const JobListing& listing, const std::wstring& folder) {
-        return SyncSide{&listing.table, listing.rows, std::wstring(WithoutTrailingBackslashes(folder))};
-    };
+void CWendlowDlg::FillTask(JobTable pc, JobTable device) {
     task_.cancelled = false;
     task_.info_text.clear();
-    task_.pc = side(pc, settings_.sync_path_dt);
-    task_.device = side(device, settings_.sync_path_ce);
+    task_.pc = {std::move(pc), std::wstring(WithoutTrailingBackslashes(settings_.sync_path_dt))};
+    task_.device = {std::move(device), std::wstring(WithoutTrailingBackslashes(settings_.sync_path_ce))};
     // Sync_img_files and Sync_all_files play no part in a synchronization: images go with the bitmaps.
     task_.types = {.qvj = settings_.sync_qvj_files != 0,
                    .tn3 = settings_.sync_tn3_files != 0,
@@ -268,7 +258,8 @@ void CWendlowDlg::ShowStart() {
     SetDlgItemTextW(Handle(), IDC_SYNC_CANCEL_EXIT, Xlate(L"Cancel").c_str());
     HWND progress = Item(IDC_SYNC_PROGRESS);
     // The maximum is a 16-bit value; more rows than that wrap.
-    SendMessageW(progress, PBM_SETRANGE, 0, MAKELPARAM(0, LOWORD(task_.device.rows + task_.pc.rows)));
+    SendMessageW(progress, PBM_SETRANGE, 0,
+                 MAKELPARAM(0, LOWORD(task_.device.listing.rows + task_.pc.listing.rows)));
     SendMessageW(progress, PBM_SETPOS, 0, 0);
     ShowWindow(progress, SW_SHOW);
     AddLogLine(Xlate(L"Checking files..."));
@@ -320,14 +311,18 @@ void CWendlowDlg::CancelWorker() {
 }
 
 void CWendlowDlg::OnSyncNotify() {
+    // Armed first: should a report run out of memory, the timer brings the dialog back for the rest.
+    SetTimer(Handle(), kReportTimer, kShowIntervalMs, nullptr);
     const bool all_handled =
         task_.reports.Drain(kReportBudgetMs, [this](SyncReport report) { HandleReport(std::move(report)); });
-    const bool due = GetTickCount64() - reports_shown_at_ >= kShowIntervalMs;
-    if (due) {
-        ShowReports();
+    if (!all_handled) {
+        SetTimer(Handle(), kReportTimer, USER_TIMER_MINIMUM, nullptr);
     }
-    if (!all_handled || !due) {
-        SetTimer(Handle(), kReportTimer, all_handled ? kShowIntervalMs : USER_TIMER_MINIMUM, nullptr);
+    if (GetTickCount64() - reports_shown_at_ >= kShowIntervalMs) {
+        ShowReports();
+        if (all_handled) {
+            KillTimer(Handle(), kReportTimer);
+        }
     }
 }
 
@@ -376,7 +371,9 @@ void CWendlowDlg::OnErrorInfo() {
 void CWendlowDlg::OnFirstPassComplete() {
     if (first_worker_) {
         AwaitAndForget(first_worker_);
-        StartWorker(second_worker_, SyncThreadCE2DT);
+        if (!task_.cancelled) {
+            StartWorker(second_worker_, SyncThreadCE2DT);
+        }
     }
 }
 

@@ -2,13 +2,11 @@
 #pragma once
 
 #include <cstdint>
-#include <memory>
 #include <string>
 #include <vector>
 
 #include "app/sync_task.h"
 #include "device/device_tree_reader.h"
-#include "device/file_node.h"
 #include "platform/handles.h"
 #include "settings/settings_store.h"
 #include "ui/dialog.h"
@@ -32,13 +30,6 @@ class CWendlowDlg : public ui::Dialog {
     std::optional<LRESULT> OnMessage(UINT message, WPARAM wparam, LPARAM lparam) override;
 
   private:
-    // The listing of one side: tree and table.
-    struct JobListing {
-        FileNode root;
-        FileTable table;
-        std::int32_t rows = 0;
-    };
-
     void OnSynchronize();
     void OnCancelExit();
     void OnSettings();
@@ -50,9 +41,7 @@ class CWendlowDlg : public ui::Dialog {
 
     // Starting a synchronization.
     bool SettleEarlierRun();
-    JobListing& NewListing();
-    static void Flatten(JobListing& listing);
-    void FillTask(const JobListing& pc, const JobListing& device);
+    void FillTask(JobTable pc, JobTable device);
     void ShowStart();
     void StartWorker(UniqueThread& worker, LPTHREAD_START_ROUTINE procedure);
 
@@ -69,14 +58,12 @@ class CWendlowDlg : public ui::Dialog {
     void SelectLastLogLine();
     void ShowReports();
 
+    bool stay_hidden_ = false;
     UniqueBrush background_;
     HICON icon_;
     SyncSettings settings_;
     SyncSettingsBlock settings_block_;
     DeviceTreeReader device_tree_;
-    // Every synchronization's listings live until the dialog does: a worker that is late may still read
-    // them.
-    std::vector<std::unique_ptr<JobListing>> listings_;
     SyncTask task_;
     // What reports have changed and the controls do not show yet; since when they do not, in ticks.
     LRESULT unshown_steps_ = 0;

@@ -60,32 +60,37 @@ class SyncPass {
           kind_(kind),
           source_(task.*kind.source),
           target_(task.*kind.target),
-          index_(*target_.table, target_.rows) {
+          index_(target_.listing.table, target_.listing.rows),
+          // A PC listing that broke off lacks files that are there: none of them is replaced without a
+          // backup.
+          make_backup_(task.overwrite_bkp || (!kind.to_device && !target_.listing.complete)) {
         if (task_.overwrite_warn) {
             ask_replace_ = [this](std::wstring_view name) { return AskReplace(name); };
         }
     }
 
     void Run() {
-        for (std::int32_t row = 0; row < source_.rows; ++row) {
+        for (std::int32_t row = 0; row < source_.listing.rows; ++row) {
             if (task_.cancelled || !HandleRow(static_cast<std::size_t>(row))) {
                 return;
             }
         }
-        Report(kind_.completion);
+        if (!task_.cancelled) {
+            Report(kind_.completion);
+        }
     }
 
   private:
     // False when the pass is over because the target disk is full.
     bool HandleRow(std::size_t row) {
-        const std::wstring& name = source_.table->names[row];
-        const FILETIME& write_time = source_.table->write_times[row];
+        const std::wstring& name = source_.listing.table.names[row];
+        const FILETIME& write_time = source_.listing.table.write_times[row];
         if (ShouldSkipCopy(task_.overwrite_old_files, write_time, name,
-                           {*target_.table, target_.rows, index_}, ask_replace_)) {
+                           {target_.listing.table, target_.listing.rows, index_}, ask_replace_)) {
             Report(kIncrementProgress);
             return true;
         }
-        if (source_.table->kinds[row] != kKindFile || !PassesExtensionFilter(name, task_.types)) {
+        if (source_.listing.table.kinds[row] != kKindFile || !PassesExtensionFilter(name, task_.types)) {
             return true;
         }
         return CopyRow(name, write_time);
@@ -94,7 +99,7 @@ class SyncPass {
     bool CopyRow(const std::wstring& name, const FILETIME& write_time) {
         const EntryCopy entry = {task_.pc.folder, task_.device.folder, name, kind_.to_device};
         const HANDLE cancel = task_.copy_cancel_event;
-        const bool can_copy = CanCopyEntry(entry, kind_.to_device && task_.overwrite_bkp);
+        const bool can_copy = CanCopyEntry(entry, kind_.to_device && make_backup_);
         if (can_copy) {
             EnsureTargetFolder(entry, cancel, /*nested=*/false);
         }
@@ -112,11 +117,10 @@ class SyncPass {
     }
 
     DeviceResult CopyFile(const EntryCopy& entry, const FILETIME& write_time, HANDLE cancel) const {
-        const bool backup = task_.overwrite_bkp;
         return kind_.to_device ? CopyPcFileToDeviceWithBackup(write_time, entry.PcPath(), entry.DevicePath(),
-                                                              cancel, backup)
+                                                              cancel, make_backup_)
                                : CopyDeviceFileToPcWithBackup(write_time, entry.DevicePath(), entry.PcPath(),
-                                                              cancel, false, backup);
+                                                              cancel, false, make_backup_);
     }
 
     // The question has no owner window: it stands above all windows, whatever the dialog does meanwhile.
@@ -125,7 +129,7 @@ class SyncPass {
                                                   source_.folder + std::wstring(name) + kind_.source_label);
         return ui::ShowMessageBox(nullptr, text,
                                   MB_OKCANCEL | MB_ICONQUESTION | MB_DEFBUTTON2 | MB_SYSTEMMODAL,
-                                  Xlate(L"Synchronization - Warning")) != IDCANCEL;
+                                  Xlate(L"Synchronization - Warning")) == IDOK;
     }
 
     std::wstring CopyLine(const std::wstring& name) const {
@@ -141,6 +145,7 @@ class SyncPass {
     const SyncSide& source_;
     const SyncSide& target_;
     FileIndex index_;
+    const bool make_backup_;
     std::function<bool(std::wstring_view)> ask_replace_;  // Empty when the user wants no warning.
 };
 

@@ -4,13 +4,12 @@
 #include <windows.h>
 
 #include <atomic>
-#include <cstdint>
 #include <optional>
 #include <string>
 #include <string_view>
 
 #include "selection/copy_rules.h"
-#include "selection/file_table.h"
+#include "selection/job_table.h"
 #include "ui/report_queue.h"
 
 namespace orvane {
@@ -31,11 +30,9 @@ struct SyncReport {
     std::optional<std::wstring> info_text;
 };
 
-// One side of a synchronization: its listing and its job folder, without a trailing "\". The table is
-// owned by the dialog and is not changed any more.
+// One side of a synchronization: its listing and its job folder, without a trailing "\".
 struct SyncSide {
-    const FileTable* table = nullptr;
-    std::int32_t rows = 0;
+    JobTable listing;
     std::wstring folder;
 };
 

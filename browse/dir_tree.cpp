@@ -40,10 +40,11 @@ UCeDirTree::~UCeDirTree() {
 }
 
 bool UCeDirTree::Create(DWORD style, DWORD ex_style, const RECT& place, HWND parent, int id) {
-    HWND window =
-        CreateWindowExW(ex_style, WC_TREEVIEWW, L"", style != 0 ? style : kUsualStyle, place.left, place.top,
-                        place.right - place.left, place.bottom - place.top, parent,
-                        reinterpret_cast<HMENU>(static_cast<INT_PTR>(id)), ResourceModule(), nullptr);
+    // The text is not shown: screen readers name the tree by it.
+    HWND window = CreateWindowExW(
+        ex_style, WC_TREEVIEWW, Xlate(L"Mobile Device Browse").c_str(), style != 0 ? style : kUsualStyle,
+        place.left, place.top, place.right - place.left, place.bottom - place.top, parent,
+        reinterpret_cast<HMENU>(static_cast<INT_PTR>(id)), ResourceModule(), nullptr);
     if (window == nullptr || !Attach(window)) {
         return false;
     }
@@ -111,8 +112,10 @@ void UCeDirTree::OnLoaded() {
     if (reader_.Result() == DeviceResult::kDone) {
         SetWindowRedraw(Handle(), FALSE);
         InsertChildren(root_, TVI_ROOT);
-        SetWindowRedraw(Handle(), TRUE);
         SelectPath(path_to_select_);
+        SetWindowRedraw(Handle(), TRUE);
+        // What was selected while nothing was drawn need not have scrolled into view.
+        TreeView_EnsureVisible(Handle(), TreeView_GetSelection(Handle()));
     } else if (reader_.Result() == DeviceResult::kFailed) {
         ShowMessage(Xlate(L"failed to read from remote device"));
     }
@@ -190,7 +193,7 @@ std::optional<LRESULT> UCeDirTree::OnMessage(UINT message, WPARAM wparam, LPARAM
         case WM_RBUTTONUP:
             return OnRightButtonUp({GET_X_LPARAM(lparam), GET_Y_LPARAM(lparam)});
         case WM_CONTEXTMENU:
-            if (lparam == -1) {
+            if (GET_X_LPARAM(lparam) == -1 && GET_Y_LPARAM(lparam) == -1) {
                 OnContextMenuKey();
                 return 0;
             }

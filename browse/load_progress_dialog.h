@@ -16,6 +16,7 @@ namespace orvane {
 class CLoadProgressDlg : public ui::Dialog {
   public:
     CLoadProgressDlg(std::wstring text, HWND parent);
+    ~CLoadProgressDlg() override { Destroy(); }  // Before the icons that the window shows.
 
     // Shows the window and paints all of it before it returns.
     void ShowPainted();

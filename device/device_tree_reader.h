@@ -15,8 +15,8 @@
 namespace orvane {
 
 // Owns a stop event, the thread of a read and the request that it works on; used by one thread, the one
-// whose dialog shows the tree. The `root` of a read belongs to the caller, lives until the next read begins
-// or the reader ends, and holds the tree afterwards. Each read first ends what the previous one left.
+// whose dialog shows the tree. The `root` of a read belongs to the caller and holds the tree when the
+// read returns. Each read first ends what the previous one left.
 class DeviceTreeReader {
   public:
     DeviceTreeReader() : stop_event_(NewManualResetEvent()) {}

@@ -5,11 +5,12 @@
 #include "device/folder_copy.h"
 #include "platform/paths.h"
 #include "selection/copy_rules.h"
+#include "selection/job_table.h"
 
 namespace orvane {
 
 bool CanCopyEntry(const EntryCopy& entry, bool with_device_backup) {
-    return PcPathFits(entry.PcPath().size()) &&
+    return IsPcFolderNamed(entry.pc_folder) && PcPathFits(entry.PcPath().size()) &&
            DevicePathFits(entry.DevicePath().size(), with_device_backup) &&
            (entry.to_device || IsSafePcRelativePath(entry.name));
 }

@@ -19,10 +19,17 @@ class PcSearch {
 
     bool FoundAnything() const { return static_cast<bool>(find_); }
 
+    // Whether the search went on to its regular end.
+    bool ReachedEnd() const { return reached_end_; }
+
     // Steps to the next entry, the first one at the first call. Null after the last.
     const WIN32_FIND_DATAW* Next() {
         do {
-            if (!find_ || (started_ && !FindNextFileW(find_.Get(), &data_))) {
+            if (!find_) {
+                return nullptr;
+            }
+            if (started_ && !FindNextFileW(find_.Get(), &data_)) {
+                reached_end_ = GetLastError() == ERROR_NO_MORE_FILES;
                 return nullptr;
             }
             started_ = true;
@@ -34,6 +41,7 @@ class PcSearch {
     WIN32_FIND_DATAW data_{};
     UniqueFind find_;
     bool started_ = false;
+    bool reached_end_ = false;
 };
 
 void FillNode(const WIN32_FIND_DATAW& data, FileNode& node) {
@@ -56,6 +64,9 @@ DeviceResult ListPcFolder(const std::wstring& pattern, bool recurse, FileNode& n
     while (counting.Next() != nullptr) {
         ++capacity;
     }
+    if (!counting.ReachedEnd()) {
+        return DeviceResult::kFailed;
+    }
     if (capacity == 0) {
         return DeviceResult::kDone;
     }
@@ -68,7 +79,7 @@ DeviceResult ListPcFolder(const std::wstring& pattern, bool recurse, FileNode& n
     while (node.child_count < capacity) {
         const WIN32_FIND_DATAW* data = filling.Next();
         if (data == nullptr) {
-            break;
+            return filling.ReachedEnd() ? DeviceResult::kDone : DeviceResult::kFailed;
         }
         FileNode& child = node.children[static_cast<std::size_t>(node.child_count++)];
         FillNode(*data, child);

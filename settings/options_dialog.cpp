@@ -13,7 +13,6 @@ namespace orvane {
 namespace {
 
 using S = SyncSettings;
-using B = SyncSettingsBlock;
 
 struct Box {
     int id;
@@ -35,24 +34,23 @@ constexpr unsigned kNoHandler = 0;
 // box, is meant.
 struct TypeBox {
     Box box;
-    std::wstring B::*text;
     Type own;
     unsigned required;
 };
 
 constexpr std::array<TypeBox, kTypeCount> kTypeBoxes = {{
-    {{IDC_OPTIONS_QVJ, &S::sync_qvj_files}, &B::sync_qvj_files, kQvj, kEveryType},
-    {{IDC_OPTIONS_TN3, &S::sync_tn3_files}, &B::sync_tn3_files, kTn3, kEveryType},
-    {{IDC_OPTIONS_RD3, &S::sync_rd3_files}, &B::sync_rd3_files, kRd3, kEveryType},
-    {{IDC_OPTIONS_PT3, &S::sync_pt3_files}, &B::sync_pt3_files, kPt3, kEveryType},
-    {{IDC_OPTIONS_LN3, &S::sync_ln3_files}, &B::sync_ln3_files, kLn3, kEveryType},
-    {{IDC_OPTIONS_JPG, &S::sync_jpg_files}, &B::sync_jpg_files, kJpg, kEveryType},
-    {{IDC_OPTIONS_BMP, &S::sync_bmp_files}, &B::sync_bmp_files, kBmp, kNoHandler},
-    {{IDC_OPTIONS_IMG, &S::sync_img_files}, &B::sync_img_files, kImg, kEveryType & ~Bit(kBmp)},
-    {{IDC_OPTIONS_XML, &S::sync_xml_files}, &B::sync_xml_files, kXml, kEveryType & ~Bit(kBmp)},
-    {{IDC_OPTIONS_TP3, &S::sync_tp3_files}, &B::sync_tp3_files, kTp3, kEveryType & ~Bit(kBmp)},
-    {{IDC_OPTIONS_WKF, &S::sync_wkf_files}, &B::sync_wkf_files, kWkf, kEveryType & ~Bit(kBmp)},
-    {{IDC_OPTIONS_TXT, &S::sync_txt_files}, &B::sync_txt_files, kWkf, kEveryType & ~(Bit(kBmp) | Bit(kTxt))},
+    {{IDC_OPTIONS_QVJ, &S::sync_qvj_files}, kQvj, kEveryType},
+    {{IDC_OPTIONS_TN3, &S::sync_tn3_files}, kTn3, kEveryType},
+    {{IDC_OPTIONS_RD3, &S::sync_rd3_files}, kRd3, kEveryType},
+    {{IDC_OPTIONS_PT3, &S::sync_pt3_files}, kPt3, kEveryType},
+    {{IDC_OPTIONS_LN3, &S::sync_ln3_files}, kLn3, kEveryType},
+    {{IDC_OPTIONS_JPG, &S::sync_jpg_files}, kJpg, kEveryType},
+    {{IDC_OPTIONS_BMP, &S::sync_bmp_files}, kBmp, kNoHandler},
+    {{IDC_OPTIONS_IMG, &S::sync_img_files}, kImg, kEveryType & ~Bit(kBmp)},
+    {{IDC_OPTIONS_XML, &S::sync_xml_files}, kXml, kEveryType & ~Bit(kBmp)},
+    {{IDC_OPTIONS_TP3, &S::sync_tp3_files}, kTp3, kEveryType & ~Bit(kBmp)},
+    {{IDC_OPTIONS_WKF, &S::sync_wkf_files}, kWkf, kEveryType & ~Bit(kBmp)},
+    {{IDC_OPTIONS_TXT, &S::sync_txt_files}, kWkf, kEveryType & ~(Bit(kBmp) | Bit(kTxt))},
 }};
 
 constexpr std::array<Box, 5> kOtherBoxes = {{
@@ -66,22 +64,11 @@ constexpr std::array<Box, 5> kOtherBoxes = {{
 // Matches no file, so that only folders are listed.
 constexpr const wchar_t* kNoFilePattern = L"*.asdfdfsasdf";
 
-std::int32_t Flag(const std::wstring& text) {
-    return IsOn(text) ? 1 : 0;
-}
-
 SyncSettings InitialValues(const SyncSettingsBlock& block) {
-    SyncSettings values;
-    values.sync_path_dt = block.sync_path_dt;
-    values.sync_path_ce = block.sync_path_ce;
-    for (const TypeBox& type : kTypeBoxes) {
-        values.*type.box.flag = Flag(block.*type.text);
-    }
-    values.sync_all_files = Flag(block.sync_all_files);
-    values.overwrite_old_files = Flag(block.overwrite_old_files);
-    if (values.overwrite_old_files != 0) {
-        values.overwrite_warn = Flag(block.overwrite_warn);
-        values.overwrite_bkp = Flag(block.overwrite_bkp);
+    SyncSettings values = SettingsOf(block);
+    if (values.overwrite_old_files == 0) {
+        values.overwrite_warn = 0;
+        values.overwrite_bkp = 0;
     }
     values.start_file_view = ReadStartFileView() ? 1 : 0;
     return values;
@@ -131,7 +118,7 @@ bool COptionsDlg::OnCommand(int id, UINT code) {
             OnBrowsePc();
             return true;
         case IDC_OPTIONS_SELECT_ALL:
-            UpdateData(true);
+            UpdateData(true);  // Showing the values must not undo what was typed.
             TickAllTypes(1);
             return true;
         case IDC_OPTIONS_ALL_FILES:
@@ -142,16 +129,15 @@ bool COptionsDlg::OnCommand(int id, UINT code) {
             OnOverwrite();
             return true;
         default:
-            OnTypeBox(id);
-            return false;
+            return OnTypeBox(id);
     }
 }
 
-void COptionsDlg::OnTypeBox(int id) {
+bool COptionsDlg::OnTypeBox(int id) {
     const auto* type = std::find_if(kTypeBoxes.begin(), kTypeBoxes.end(),
                                     [id](const TypeBox& candidate) { return candidate.box.id == id; });
     if (type == kTypeBoxes.end() || type->required == kNoHandler) {
-        return;
+        return false;
     }
     UpdateData(true);
     unsigned ticked = 0;
@@ -164,6 +150,7 @@ void COptionsDlg::OnTypeBox(int id) {
         values_.sync_all_files = 1;
     }
     UpdateData(false);
+    return true;
 }
 
 void COptionsDlg::TickAllTypes(std::int32_t value) {
@@ -216,7 +203,7 @@ std::optional<SyncSettings> RunOptions(HWND owner, const SyncSettingsBlock& bloc
         saved = dialog.Values();
         SaveSettings(*saved);
     }
-    WriteAutoStart(dialog.AutoStart());
+    WriteAutoStart(dialog.AutoStart(), owner);
     return saved;
 }
 

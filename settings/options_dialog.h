@@ -30,7 +30,7 @@ class COptionsDlg : public ui::Dialog {
     void DoDataExchange(ui::DataExchange& exchange) override;
 
   private:
-    void OnTypeBox(int id);
+    bool OnTypeBox(int id);
     void OnOverwrite();
     void TickAllTypes(std::int32_t value);
     void EnableOverwriteBoxes();

@@ -166,6 +166,16 @@ void RefreshSettingsBlock(const SyncSettings& settings, SyncSettingsBlock& block
     }
 }
 
+SyncSettings SettingsOf(const SyncSettingsBlock& block) {
+    SyncSettings settings;
+    settings.sync_path_dt = block.sync_path_dt;
+    settings.sync_path_ce = block.sync_path_ce;
+    for (const FlagSetting& setting : kFlags) {
+        settings.*setting.flag = setting.text != nullptr && IsOn(block.*setting.text) ? 1 : 0;
+    }
+    return settings;
+}
+
 bool ReadStartFileView() {
     std::wstring text;
     return ReadSetting(IDS_START_FILE_VIEW, text) && IsOn(text);
@@ -176,9 +186,11 @@ bool ReadAutoStart() {
     return RegReadString(HKEY_LOCAL_MACHINE, kAutoStartKey, kAutoStartValue, path) && !path.empty();
 }
 
-void WriteAutoStart(bool on) {
+void WriteAutoStart(bool on, HWND owner) {
     std::array<wchar_t, kModuleNameChars> module{};
-    GetWindowModuleFileNameW(GetActiveWindow(), module.data(), static_cast<UINT>(module.size() - 1));
+    const HWND active = GetActiveWindow();
+    GetWindowModuleFileNameW(active != nullptr ? active : owner, module.data(),
+                             static_cast<UINT>(module.size() - 1));
     RegWriteString(HKEY_LOCAL_MACHINE, kAutoStartKey, kAutoStartValue, on ? module.data() : L"");
 }
 

@@ -72,14 +72,17 @@ SyncSettings LoadSettings();
 void SaveSettings(SyncSettings& settings);
 
 void RefreshSettingsBlock(const SyncSettings& settings, SyncSettingsBlock& block);
+// The other way round; Start_File_View, which the block leaves out, is off.
+SyncSettings SettingsOf(const SyncSettingsBlock& block);
 
 // Start_File_View as the registry holds it now.
 bool ReadStartFileView();
 
 // The entry that makes the desktop synchronization service start the program when a device connects. It
 // holds the program's path or nothing; without the right to write to the local machine's registry it stays
-// as it is. The path is that of the module that owns the active window.
+// as it is. The path is that of the module that owns the thread's active window, or `owner` if none is
+// active.
 bool ReadAutoStart();
-void WriteAutoStart(bool on);
+void WriteAutoStart(bool on, HWND owner);
 
 }  // namespace orvane

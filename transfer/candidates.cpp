@@ -4,10 +4,8 @@
 #include <unordered_map>
 
 #include "platform/file_time.h"
-#include "platform/paths.h"
 #include "platform/text_case.h"
 #include "qelutils/text_format.h"
-#include "selection/pc_listing.h"
 
 namespace orvane {
 
@@ -29,18 +27,6 @@ std::wstring DateText(const FILETIME& time) {
 }
 
 }  // namespace
-
-JobTable::JobTable(const FileNode& root) {
-    FlattenTree(table, rows, root, {}, CountEntries(0, root));
-}
-
-JobTable ListPcJobFolder(const std::wstring& folder) {
-    FileNode root;
-    if (!folder.empty()) {
-        ListPcFolder(JoinPath(folder, L"*.*"), true, root);
-    }
-    return JobTable(root);
-}
 
 Comparison NewComparison(const SyncSettingsBlock& settings) {
     Comparison comparison;

@@ -2,14 +2,12 @@
 // version of. No windows, no threads of its own.
 #pragma once
 
-#include <cstdint>
 #include <string>
 #include <vector>
 
 #include "controls/sorted_list_record.h"
-#include "device/file_node.h"
 #include "selection/copy_rules.h"
-#include "selection/file_table.h"
+#include "selection/job_table.h"
 #include "settings/settings_store.h"
 
 namespace orvane {
@@ -17,20 +15,6 @@ namespace orvane {
 // One entry of a list. Its first text is the name below the job folder, without "\" in front
 // ("Job1\pic.jpg"); its second one is the source's last-write time in local time, "dd/mm/yyyy hh:mm:ss".
 using sFileDate = SortedListRecord;
-
-// A job folder with all that lies below it, as a table.
-struct JobTable {
-    JobTable() = default;
-    explicit JobTable(const FileNode& root);
-
-    FileTable table;
-    std::int32_t rows = 0;
-};
-
-// Reads the PC job folder. A folder that cannot be searched, or no folder at all (an empty text, which must
-// not come to mean the root of a drive), gives an empty table; a sub-folder that cannot be searched ends the
-// listing there.
-JobTable ListPcJobFolder(const std::wstring& folder);
 
 // What the two lists are made from.
 struct Comparison {

@@ -70,7 +70,7 @@ class SelectedCopy {
     // A file that the user keeps counts as one that failed: it stays listed.
     DeviceResult CopyOne(const std::wstring& name) const {
         const EntryCopy entry = {pc_folder_, device_folder_, name, to_device_};
-        if (request_.pc_folder.empty() || !CanCopyEntry(entry, /*with_device_backup=*/to_device_)) {
+        if (!CanCopyEntry(entry, /*with_device_backup=*/to_device_)) {
             return DeviceResult::kFailed;
         }
         const HANDLE stop = request_.stop_event;

@@ -149,7 +149,7 @@ TEST_F(SettingsStore, KeepsTheProgramsPathForTheAutoStart) {
     EXPECT_NE(expected[0], L'\0');
     std::wstring stored;
     for (const bool on : {true, false, true}) {
-        WriteAutoStart(on);
+        WriteAutoStart(on, nullptr);
         EXPECT_EQ(ReadAutoStart(), on);
         EXPECT_TRUE(RegReadString(HKEY_LOCAL_MACHINE, kAutoStartKey, L"ORVANE ActiveSync", stored));
         EXPECT_EQ(stored, on ? expected.data() : L"");
