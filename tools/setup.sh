@@ -1,5 +1,6 @@
 #!/usr/bin/env bash
-# Installs what building, running and testing need on Debian 12. Does nothing where all is there.
+# Installs what building, running and testing need on Debian 12, and the packages named as arguments.
+# Does nothing where all is there.
 set -eu
 packages=(
   g++-mingw-w64-x86-64-posix cmake ninja-build gettext    # building
@@ -7,6 +8,7 @@ packages=(
   wine64 fonts-wine fonts-liberation xvfb xauth           # running; the fonts before the first Wine prefix
   imagemagick                                             # screenshots
 )
+packages+=("$@")
 missing=()
 for package in "${packages[@]}"; do
   if ! dpkg-query -W -f '${Status}' "$package" 2>/dev/null | grep -q '^install ok installed$'; then

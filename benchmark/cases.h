@@ -1,0 +1,24 @@
+// The cases that can be measured. Each is one run of the bench program, so that none finds the memory of
+// another, and prints lines of JSON to the standard output. False, with a line on the standard error, when
+// the program does not do what is to be measured; slowness is no failure.
+#pragma once
+
+#include <cstdint>
+#include <string>
+
+namespace orvane::bench {
+
+// Flattening two listings of `count` equal files in folders of `per_folder` and deciding all their rows in
+// both directions. The device's times are `seconds_behind` the PC's.
+bool RunDecision(std::int32_t count, std::int32_t per_folder, int seconds_behind);
+
+// One synchronization by the real dialog, of the PC folder and the device's "\Jobs".
+bool RunSync(const std::wstring& pc_folder);
+
+// Listing the device's "\Jobs" with all that lies below.
+bool RunListing();
+
+// What a user does with the lists of the real manual view.
+bool RunLists(const std::wstring& pc_folder);
+
+}  // namespace orvane::bench

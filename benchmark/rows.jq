@@ -1,0 +1,129 @@
+# From the lines that the cases gave to the rows of the table: an array of
+# {row, name, unit, median, min, max, wanted}. `wanted` is the most that is wanted, null where nothing is.
+# In: all lines as one array. $scale: the divisor of all sizes.
+
+def values($case; $metric): [.[] | select(.case == $case) | .[$metric] | select(. != null)];
+def spread:
+  sort | if length == 0 then null
+         else {median: ((.[((length - 1) / 2 | floor)] + .[(length / 2 | floor)]) / 2), min: .[0], max: .[-1]} end;
+# A row of the values; the row is left out when its case gave none.
+def row($number; $name; $unit; $wanted; $values):
+  ($values | spread) as $spread
+  | if $spread == null then empty else {row: $number, name: $name, unit: $unit, wanted: $wanted} + $spread end;
+# Each value of one case by each of the other.
+def by_each($a; $b): [$a[] as $x | $b[] as $y | select($y != 0) | $x / $y];
+# One metric as a percentage of another, run by run.
+def percent($case; f): [.[] | select(.case == $case) | 100 * f / .ms];
+# What the program itself takes of a synchronization.
+def own($case): [.[] | select(.case == $case) | .ms - .remote_ms - .pc_file_ms - .wait_ms];
+def calls($name): .["ms_" + $name] // 0;
+
+def size($n): $n / $scale | floor | tostring;
+def thousands: if . >= 1000 then "\(. / 1000 | floor),\(. % 1000 + 1000 | tostring | .[1:])" else tostring end;
+def shown($n): $n / $scale | floor | thousands;
+
+def decision($kind; $what):
+  . as $all
+  | (10000, 40000, 160000) as $n
+  | "decision \($kind) \(size($n))" as $case
+  | ($all | row("1"; "decide \(shown($n)) rows a side, \($what)"; "ms"; null; values($case; "ms"))),
+    ($all | row("1"; "  per row"; "us"; 2; values($case; "us_per_row"))),
+    ($all | row("1"; "  growth, linear is 4"; "x"; 4.5;
+        by_each(values($case; "ms"); values("decision \($kind) \(size($n / 4))"; "ms"))));
+
+def nothing:
+  . as $all
+  | (10000, 40000) as $n
+  | "nothing \(size($n))" as $case
+  | ($all | row("2"; "synchronize, nothing to do, \(shown($n)) files a side"; "ms"; null; values($case; "ms"))),
+    ($all | row("2"; "  of that, both listings"; "ms"; null; values($case; "listing_ms"))),
+    ($all | row("2"; "  of that, both passes"; "ms"; null; values($case; "passes_ms"))),
+    ($all | row("2"; "  of that, outside of calls and waits"; "ms"; null; own($case))),
+    ($all | row("2"; "  longest time without an answer"; "ms"; 100; values($case; "no_answer_ms"))),
+    ($all | row("2"; "  bar's last look (100 ms sleep), not in the above"; "ms"; null; values($case; "end_sleep_ms"))),
+    ($all | row("2"; "  growth, linear is 4"; "x"; 4.5;
+        by_each(values($case; "ms"); values("nothing \(size($n / 4))"; "ms")))),
+    ($all | row("2"; "  growth outside of calls and waits"; "x"; 4.5; by_each(own($case); own("nothing \(size($n / 4))")))),
+    ($all | row("2"; "  growth of rsync on the same folders"; "x"; null;
+        by_each(values("\($case) rsync"; "ms"); values("nothing \(size($n / 4)) rsync"; "ms"))));
+# What more rows cost beyond the dialog itself; a side has a row for each file and each folder of 100.
+def memory:
+  (30000 * 2.02 / $scale) as $more
+  | row("2"; "  peak memory per row"; "bytes"; 1024;
+      [values("nothing \(size(40000))"; "peak_bytes")[] as $big
+       | values("nothing \(size(10000))"; "peak_bytes")[] as $small | ($big - $small) / $more]);
+
+# The calls that the steps of a copy need, the mean of both ways: to the device a session with two folders to
+# create and a session with create, the chunks, two time calls and close; from it a session with create, the
+# chunks and close.
+def calls_needed($bytes): ($bytes / 8192 | floor + 1) as $chunks | ((2 + 2) + (2 + 1 + $chunks + 3) + (2 + 1 + $chunks + 1)) / 2;
+# The calls of the listing that comes first are left out.
+def calls_per_file($case; $files):
+  [.[] | select(.case == $case)
+   | (.remote_calls - .calls_CeFindAllFiles - .calls_CeRapiFreeBuffer - 2
+      - (.calls_CeRegOpenKeyEx // 0) - (.calls_CeRegQueryValueEx // 0) - (.calls_CeRegCloseKey // 0))
+     / (2 * $files)];
+def first($case; $files; $bytes; $what):
+  row("3"; "first synchronization, \($what) a side"; "ms"; null; values($case; "ms")),
+  row("3"; "  Remote API calls per file, \(calls_needed($bytes)) needed"; "calls"; calls_needed($bytes);
+      calls_per_file($case; $files)),
+  row("3"; "  in Remote API calls"; "%"; null; percent($case; .remote_ms)),
+  row("3"; "  in PC file calls"; "%"; null; percent($case; .pc_file_ms)),
+  row("3"; "  in waits of the copy's steps"; "%"; null; percent($case; .wait_ms)),
+  row("3"; "  outside of all these"; "%"; 10; percent($case; .ms - .remote_ms - .pc_file_ms - .wait_ms)),
+  row("3"; "  fixed: sessions"; "%"; null;
+      percent($case; calls("CeRapiInitEx") + calls("CeRapiUninit") + calls("MsgWaitForMultipleObjects"))),
+  row("3"; "  fixed: folder creation before each copy"; "%"; null;
+      percent($case; calls("CeCreateDirectory") + calls("CreateDirectoryW"))),
+  row("3"; "  fixed: looking whether cancelled"; "%"; null; percent($case; calls("WaitForSingleObject"))),
+  row("3"; "  fixed: chunks of 8192 bytes"; "%"; null;
+      percent($case; calls("CeReadFile") + calls("CeWriteFile") + calls("ReadFile") + calls("WriteFile"))),
+  row("3"; "  longest time without an answer"; "ms"; 100; values($case; "no_answer_ms"));
+
+def latency:
+  . as $all
+  | ("1", "5") as $ms
+  | "latency \($ms)" as $case
+  | ($all | row("4"; "100 files a side, each call \($ms) ms longer"; "ms"; null; values($case; "ms"))),
+    ($all | row("4"; "  by the time of the calls and waits"; "x"; 1.05;
+        [.[] | select(.case == $case) | .ms / (.remote_ms + .pc_file_ms + .wait_ms)]));
+
+# The start of two Windows programs is taken out of xcopy's time, as ours does not begin with its start.
+def start: row("5"; "start of two Windows programs, taken out of xcopy's times"; "ms"; null; values("start xcopy"; "ms"));
+def instead($ours; $other; $what):
+  . as $all
+  | ("xcopy", "rsync") as $tool
+  | (if $tool == "xcopy" then $all | values("start xcopy"; "ms") | spread.median // 0 else 0 end) as $start
+  | $all | row("5"; "\($tool), \($what), by ours"; "x"; null;
+      by_each([[values("\($other) \($tool)"; "ms")[] - $start, 0] | max]; values($ours; "ms")));
+
+def lists:
+  . as $all
+  | ($all | row("6"; "manual view, \(shown(10000)) entries a list: refresh, with both listings"; "ms"; null; values("lists"; "refresh_ms"))),
+    ( ["fill a list", "fill_ms"], ["tick all", "select_all_ms"], ["untick all", "select_none_ms"],
+      ["one tick", "tick_ms"], ["sort by date", "sort_by_date_ms"], ["sort by name", "sort_by_name_ms"],
+      ["sort backwards", "sort_reverse_ms"], ["to the device's page", "to_device_page_ms"],
+      ["to the PC's page", "to_pc_page_ms"], ["repaint all", "repaint_ms"] ) as [$what, $metric]
+    | $all | row("6"; "  \($what)"; "ms"; 200; values("lists"; $metric));
+
+def listing:
+  row("7"; "device listing of \(shown(2000)) folders, per folder"; "us"; null; values("listing"; "us_per_folder")),
+  row("7"; "  calls per folder"; "calls"; 2; values("listing"; "calls_per_folder")),
+  row("7"; "  outside of the calls"; "%"; null; values("listing"; "outside_percent"));
+
+[
+  decision("folders"; "folders of 100"),
+  decision("one"; "one folder"),
+  row("1"; "decide \(shown(40000)) rows a side 2 s apart, per row"; "us"; 2; values("decision close"; "us_per_row")),
+  nothing,
+  memory,
+  first("first small"; 1000 / $scale; 20480; "\(shown(1000)) files of 20 KB"),
+  first("first big"; 20 / $scale; 8388608; "\(shown(20)) files of 8 MB"),
+  latency,
+  start,
+  instead("first small"; "first small"; "first copy of 20 KB files"),
+  instead("first big"; "first big"; "first copy of 8 MB files"),
+  instead("nothing \(size(10000))"; "nothing \(size(10000))"; "nothing to do"),
+  lists,
+  listing
+]
