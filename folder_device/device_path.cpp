@@ -3,6 +3,7 @@
 #include <algorithm>
 #include <cwchar>
 
+#include "folder_device/owned_handle.h"
 #include "folder_device/text.h"
 
 namespace folder_device {
@@ -55,6 +56,27 @@ DWORD CheckSyntax(std::wstring_view path) {
     return ERROR_SUCCESS;
 }
 
+// Whether what stands at `pc_path` has its last name as its own. The PC also finds files by the shortened
+// names that it gives to long ones; these always hold a "~", so that other names cost nothing here.
+bool HasThatName(const std::wstring& pc_path) {
+    const std::wstring_view name = std::wstring_view(pc_path).substr(pc_path.rfind(L'\\') + 1);
+    if (name.find(L'~') == std::wstring_view::npos) {
+        return true;
+    }
+    WIN32_FIND_DATAW entry;
+    const auto search = Own<OwnedFind>(
+        FindFirstFileExW(pc_path.c_str(), FindExInfoBasic, &entry, FindExSearchNameMatch, nullptr, 0));
+    return search != nullptr && EqualNoCase(entry.cFileName, name);
+}
+
+// What is refused of an existing place: a link, and one that only a shortened name leads to.
+DWORD CheckExisting(const std::wstring& pc_path, DWORD attributes) {
+    if ((attributes & FILE_ATTRIBUTE_REPARSE_POINT) != 0) {
+        return ERROR_ACCESS_DENIED;
+    }
+    return HasThatName(pc_path) ? ERROR_SUCCESS : ERROR_INVALID_NAME;
+}
+
 }  // namespace
 
 bool IsDeviceName(std::wstring_view name) {
@@ -88,14 +110,13 @@ DWORD Locate(const std::wstring& root, const wchar_t* path, Location& location) 
         if (attributes == INVALID_FILE_ATTRIBUTES || (attributes & FILE_ATTRIBUTE_DIRECTORY) == 0) {
             return ERROR_PATH_NOT_FOUND;
         }
-        if ((attributes & FILE_ATTRIBUTE_REPARSE_POINT) != 0) {
-            return ERROR_ACCESS_DENIED;
+        if (const DWORD error = CheckExisting(folder, attributes); error != ERROR_SUCCESS) {
+            return error;
         }
     }
     location.attributes = GetFileAttributesW(location.pc_path.c_str());
     if (location.Exists()) {
-        return (location.attributes & FILE_ATTRIBUTE_REPARSE_POINT) != 0 ? ERROR_ACCESS_DENIED
-                                                                         : ERROR_SUCCESS;
+        return CheckExisting(location.pc_path, location.attributes);
     }
     const DWORD error = GetLastError();
     return error == ERROR_FILE_NOT_FOUND ? ERROR_SUCCESS : error;

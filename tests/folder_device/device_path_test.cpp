@@ -74,6 +74,37 @@ TEST_F(DevicePath, RefusedOnesTouchNothing) {
     DeleteFileW(outside.c_str());
 }
 
+TEST_F(DevicePath, AShortNameReachesNothing) {
+    const auto alias_of = [this](const wchar_t* path) {
+        wchar_t name[MAX_PATH] = L"";
+        GetShortPathNameW(device_.PcPath(path).c_str(), name, MAX_PATH);
+        return std::wstring(name).substr(std::wstring(name).rfind(L'\\') + 1);
+    };
+    ASSERT_TRUE(api_.CeCreateDirectory(L"\\a long folder name", nullptr));
+    ASSERT_TRUE(WriteNew(L"\\a long folder name\\a long file name.qvj", "kept"));
+    const std::wstring folder_alias = alias_of(L"\\a long folder name");
+    const std::wstring file_alias = alias_of(L"\\a long folder name\\a long file name.qvj");
+    if (file_alias.find(L'~') == std::wstring::npos) {
+        GTEST_SKIP() << "no short names to be had here";
+    }
+    for (const std::wstring& path :
+         {L"\\" + folder_alias, L"\\" + folder_alias + L"\\a long file name.qvj",
+          L"\\a long folder name\\" + file_alias, L"\\" + folder_alias + L"\\new.qvj"}) {
+        SCOPED_TRACE(::testing::PrintToString(path));
+        rapi::FindData data;
+        for (const DWORD creation : {CREATE_ALWAYS, OPEN_EXISTING}) {
+            EXPECT_EQ(ErrorOf(Open(path.c_str(), GENERIC_WRITE, creation)), DWORD{ERROR_INVALID_NAME});
+        }
+        EXPECT_EQ(ErrorOf(api_.CeDeleteFile(path.c_str())), DWORD{ERROR_INVALID_NAME});
+        EXPECT_EQ(ErrorOf(api_.CeFindFirstFile(path.c_str(), &data)), DWORD{ERROR_INVALID_NAME});
+    }
+    EXPECT_EQ(ReadTextFile(device_.PcPath(L"\\a long folder name\\a long file name.qvj")), "kept");
+    // A name of its own may look like one.
+    ASSERT_TRUE(WriteNew(L"\\A~1.txt", "own"));
+    EXPECT_TRUE(api_.CeMoveFile(L"\\a~1.TXT", L"\\B~2.txt"));
+    EXPECT_EQ(ReadTextFile(device_.PcPath(L"\\B~2.txt")), "own");
+}
+
 TEST_F(DevicePath, TheLongestOneWorksBelowALongRoot) {
     // The PC's path is then far longer than the PC's own limit.
     std::wstring root = device_.Root();
