@@ -172,18 +172,24 @@ double Ahead(const FILETIME& time) {
     return (static_cast<double>(TicksOf(time)) - static_cast<double>(TicksOf(now))) / 1e7;
 }
 
-TEST_F(DeviceFile, TheDevicesClockMayBeWrong) {
-    for (const double offset : {3600.0, -90000.0}) {
+TEST_F(DeviceFile, NewAndEmptiedFilesHaveTheDevicesTime) {
+    for (const double offset : {0.0, 3600.0, -90000.0}) {
         SCOPED_TRACE(offset);
+        const FILETIME old = UtcTime(2001, 1, 1);
+        WriteTextFile(device_.PcPath(L"\\a.txt"), "old");
+        const HANDLE aged = Open(L"\\a.txt", GENERIC_WRITE, OPEN_EXISTING);
+        EXPECT_TRUE(api_.CeSetFileTime(aged, &old, &old, &old));
+        EXPECT_TRUE(api_.CeCloseHandle(aged));
         device_.Set(L"CLOCK_OFFSET", std::to_wstring(static_cast<int>(offset)));
         Reconnect();
         const HANDLE file = Open(L"\\a.txt", GENERIC_READ | GENERIC_WRITE, CREATE_ALWAYS, FILE_SHARE_READ);
         FILETIME creation{};
+        FILETIME last_access{};
         FILETIME last_write{};
-        EXPECT_TRUE(api_.CeGetFileTime(file, &creation, nullptr, &last_write));
+        EXPECT_TRUE(api_.CeGetFileTime(file, &creation, &last_access, &last_write));
         EXPECT_NEAR(Ahead(creation), offset, 5);
+        EXPECT_NEAR(Ahead(last_access), offset, 5);
         EXPECT_NEAR(Ahead(last_write), offset, 5);
-        const FILETIME old = UtcTime(2001, 1, 1);
         ASSERT_TRUE(Write(file, "a"));
         EXPECT_TRUE(api_.CeGetFileTime(file, nullptr, nullptr, &last_write));
         EXPECT_NEAR(Ahead(last_write), offset, 5);
