@@ -31,7 +31,7 @@ bool ThreadState::IsConnected() const {
 Device::Device(std::wstring dll_folder, DWORD slot)
     : dll_folder_(std::move(dll_folder)),
       slot_(slot),
-      configuration_(std::make_shared<Configuration>(SettingTexts{}, Settings{})) {}
+      configuration_(std::make_shared<Configuration>(std::nullopt, std::nullopt)) {}
 
 Device::~Device() {
     for (const std::unique_ptr<ThreadState>& thread : threads_) {
@@ -92,10 +92,10 @@ void Device::ReadSettings() {
         return;
     }
     handles.CloseAll();
-    SettingTexts texts = ReadSettingTexts(dll_folder_);
+    std::optional<SettingTexts> texts = ReadSettingTexts(dll_folder_);
     std::shared_ptr<Configuration> configuration = Current();
     if (configuration->settings.root.empty() || configuration->texts != texts) {
-        std::optional<Settings> settings = ParseSettings(texts, dll_folder_);
+        std::optional<Settings> settings = texts ? ParseSettings(*texts, dll_folder_) : std::nullopt;
         configuration = std::make_shared<Configuration>(std::move(texts), std::move(settings));
         configuration_ = configuration;
     }

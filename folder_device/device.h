@@ -24,17 +24,18 @@ namespace folder_device {
 
 // What the settings' texts made: it lives with its counters as long as no text changes.
 struct Configuration {
-    explicit Configuration(SettingTexts setting_texts, std::optional<Settings> parsed)
+    // No texts: they could not be read. Nothing parsed: they could not be understood.
+    explicit Configuration(std::optional<SettingTexts> setting_texts, std::optional<Settings> parsed)
         : texts(std::move(setting_texts)),
           understood(parsed.has_value()),
           settings(std::move(parsed).value_or(Settings{})),
           faults(settings),
           trace(settings.trace_file) {}
 
-    // Whether sessions may open: every text was understood and the trace, if one is wanted, is open.
+    // Whether sessions may open: every text was read and understood and the trace, if one is wanted, is open.
     bool IsUsable() const { return understood && (settings.trace_file.empty() || trace.IsOpen()); }
 
-    const SettingTexts texts;
+    const std::optional<SettingTexts> texts;
     const bool understood;
     const Settings settings;
     Faults faults;

@@ -10,12 +10,18 @@ namespace {
 // Far more than anybody writes by hand; a larger file is not one of ours.
 constexpr DWORD kMaxFileSize = 4 << 20;
 
+// No file is an empty one.
 std::optional<std::string> ReadBytes(const std::wstring& path) {
     const auto file =
         Own<OwnedHandle>(CreateFileW(path.c_str(), GENERIC_READ, FILE_SHARE_READ | FILE_SHARE_WRITE, nullptr,
                                      OPEN_EXISTING, FILE_ATTRIBUTE_NORMAL, nullptr));
+    if (!file) {
+        const DWORD error = GetLastError();
+        const bool absent = error == ERROR_FILE_NOT_FOUND || error == ERROR_PATH_NOT_FOUND;
+        return absent ? std::optional(std::string()) : std::nullopt;
+    }
     LARGE_INTEGER size{};
-    if (!file || !GetFileSizeEx(file.get(), &size) || size.QuadPart > kMaxFileSize) {
+    if (!GetFileSizeEx(file.get(), &size) || size.QuadPart > kMaxFileSize) {
         return std::nullopt;
     }
     std::string bytes(static_cast<std::size_t>(size.QuadPart), '\0');
@@ -27,11 +33,17 @@ std::optional<std::string> ReadBytes(const std::wstring& path) {
     return bytes;
 }
 
+// UTF-16 begins with its mark or, without one, has zeros in every name.
+bool IsUtf16(const std::string& bytes) {
+    return bytes.starts_with("\xFF\xFE") || bytes.starts_with("\xFE\xFF") ||
+           bytes.find('\0') != std::string::npos;
+}
+
 }  // namespace
 
 std::optional<IniText> ReadIniFile(const std::wstring& path) {
     const std::optional<std::string> bytes = ReadBytes(path);
-    if (!bytes) {
+    if (!bytes || IsUtf16(*bytes)) {
         return std::nullopt;
     }
     const std::wstring text = FromUtf8(bytes->starts_with("\xEF\xBB\xBF") ? bytes->substr(3) : *bytes);

@@ -22,8 +22,8 @@ struct IniSection {
 
 using IniText = std::vector<IniSection>;
 
-// The file's sections in their order; nothing when the file cannot be read. Values before the first section
-// belong to a section without a name.
+// The file's sections in their order. Values before the first section belong to a section without a name. No
+// file has no values; nothing when there is one that cannot be read: locked, over 4 MiB, in UTF-16.
 std::optional<IniText> ReadIniFile(const std::wstring& path);
 // The text of the section's value of that name, null when there is none.
 const std::wstring* FindValue(const IniSection& section, std::wstring_view name);

@@ -190,16 +190,17 @@ std::optional<ExtraEntry> ParseExtraEntry(std::wstring_view piece) {
 
 }  // namespace
 
-SettingTexts ReadSettingTexts(const std::wstring& dll_folder) {
-    SettingTexts texts;
+std::optional<SettingTexts> ReadSettingTexts(const std::wstring& dll_folder) {
     const std::optional<IniText> ini = ReadIniFile(dll_folder + L"\\folder_device.ini");
+    if (!ini) {
+        return std::nullopt;
+    }
+    SettingTexts texts;
     for (std::size_t i = 0; i < kSettingCount; ++i) {
-        if (ini) {
-            for (const IniSection& section : *ini) {
-                const std::wstring* text =
-                    EqualNoCase(section.name, L"folder_device") ? FindValue(section, kNames[i]) : nullptr;
-                texts[i] = text != nullptr ? *text : texts[i];
-            }
+        for (const IniSection& section : *ini) {
+            const std::wstring* text =
+                EqualNoCase(section.name, L"folder_device") ? FindValue(section, kNames[i]) : nullptr;
+            texts[i] = text != nullptr ? *text : texts[i];
         }
         texts[i] = ReadEnvironment(kNames[i]).value_or(texts[i]);
     }

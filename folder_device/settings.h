@@ -54,8 +54,9 @@ struct Settings {
     bool found_null = false;           // CeFindAllFiles gives no buffer.
 };
 
-// Reads all texts: the environment, else the ini file in `dll_folder`.
-SettingTexts ReadSettingTexts(const std::wstring& dll_folder);
+// Reads all texts: the environment, else the ini file in `dll_folder`. Nothing when the file is there and
+// cannot be read: what it would say must not be taken for unsaid.
+std::optional<SettingTexts> ReadSettingTexts(const std::wstring& dll_folder);
 // Takes the texts apart. Relative paths are below `dll_folder`. Nothing when a text cannot be understood.
 std::optional<Settings> ParseSettings(const SettingTexts& texts, const std::wstring& dll_folder);
 

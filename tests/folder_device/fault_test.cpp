@@ -121,13 +121,42 @@ TEST_F(Fault, CallsCanTakeTheirTime) {
     EXPECT_GE(GetTickCount64() - start, 110U);
 }
 
-TEST_F(Fault, TheIniFileCountsWhereTheEnvironmentIsSilent) {
-    wchar_t dll[MAX_PATH];
-    GetModuleFileNameW(api_.library, dll, MAX_PATH);
-    const std::wstring path(dll);
-    const std::wstring ini = path.substr(0, path.rfind(L'\\') + 1) + L"folder_device.ini";
-    ASSERT_FALSE(Exists(ini)) << "this test writes and removes it";
-    WriteTextFile(ini, "[other]\nCAPACITY=1\n[Folder_Device]\ncapacity = 4096\nROOT=nowhere\n");
+// The file beside the DLL, which the test must not find and does not leave behind.
+class IniFile : public Fault {
+  protected:
+    IniFile() {
+        wchar_t dll[MAX_PATH];
+        GetModuleFileNameW(api_.library, dll, MAX_PATH);
+        path_ = dll;
+        path_.replace(path_.rfind(L'\\') + 1, std::wstring::npos, L"folder_device.ini");
+    }
+    void SetUp() override { ASSERT_FALSE(Exists(path_)) << "these tests write and remove it"; }
+    void TearDown() override { DeleteFileW(path_.c_str()); }
+
+    std::wstring path_;
+};
+
+TEST_F(IniFile, OneThatCannotBeReadOpensNoSession) {
+    const std::string texts[] = {
+        std::string("\xFF\xFE[\0]\0", 6),
+        std::string("\xFE\xFF\0[\0]", 6),
+        std::string("[\0]\0", 4),
+        std::string((4 << 20) + 1, '\n'),
+    };
+    device_.CloseSessions();
+    for (const std::string& text : texts) {
+        WriteTextFile(path_, text);
+        EXPECT_EQ(Connect(), HRESULT_FROM_WIN32(ERROR_BAD_CONFIGURATION)) << text.size();
+    }
+    WriteTextFile(path_, "");
+    const HANDLE locked = CreateFileW(path_.c_str(), GENERIC_WRITE, 0, nullptr, OPEN_EXISTING, 0, nullptr);
+    EXPECT_EQ(Connect(), HRESULT_FROM_WIN32(ERROR_BAD_CONFIGURATION));
+    CloseHandle(locked);
+    EXPECT_EQ(Connect(), S_OK);
+}
+
+TEST_F(IniFile, CountsWhereTheEnvironmentIsSilent) {
+    WriteTextFile(path_, "[other]\nCAPACITY=1\n[Folder_Device]\ncapacity = 4096\nROOT=nowhere\n");
     const auto total = [this] {
         ULARGE_INTEGER bytes{};
         EXPECT_TRUE(api_.CeGetDiskFreeSpaceEx(nullptr, nullptr, &bytes, nullptr));
@@ -141,7 +170,6 @@ TEST_F(Fault, TheIniFileCountsWhereTheEnvironmentIsSilent) {
     device_.Set(L"CAPACITY", L"");
     Reconnect();
     EXPECT_GT(total(), 4096U) << "an empty text is the default, no gap for the file to fill";
-    DeleteFileW(ini.c_str());
 }
 
 TEST_F(Fault, TheTraceTellsEveryCall) {
