@@ -86,6 +86,10 @@ void USortedListCtrl::SetItems(std::size_t count,
             static_cast<int>(Direct(LVM_FINDITEMW, static_cast<WPARAM>(-1), reinterpret_cast<LPARAM>(&find)));
         if (row >= 0) {
             SetItemState(row, focused_state, LVIS_SELECTED | LVIS_FOCUSED);
+        } else if (count > 0) {
+            // Its record is gone: the keyboard stays at the same place.
+            SetItemState(std::min(focused, static_cast<int>(count) - 1), focused_state,
+                         LVIS_SELECTED | LVIS_FOCUSED);
         }
     }
     ScrollTo(top);
@@ -205,7 +209,12 @@ bool USortedListCtrl::OnSpace(LPARAM key_data) const {
         return false;
     }
     const bool held_down = (HIWORD(key_data) & KF_REPEAT) != 0;
-    return held_down || FlipTick(NextItem(-1, LVNI_FOCUSED));
+    const int row = NextItem(-1, LVNI_FOCUSED);
+    if (row >= 0) {
+        // The user sees what is ticked, and the owner hears of it when the row is drawn.
+        Direct(LVM_ENSUREVISIBLE, static_cast<WPARAM>(row), FALSE);
+    }
+    return held_down || FlipTick(row);
 }
 
 void USortedListCtrl::OnItemDrawn() {

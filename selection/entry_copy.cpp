@@ -36,7 +36,7 @@ void CopyCompanionFolder(const EntryCopy& entry, HANDLE cancel_event, bool neste
     }
     if (!entry.to_device) {
         CopyDeviceFolderToPc(companion.DevicePath(), companion.PcPath(), cancel_event, nested);
-    } else if (PcEntry(companion.PcPath()) != EntryKind::kNone) {
+    } else if (PcEntry(companion.PcPath()) == EntryKind::kFolder) {
         CopyPcFolderToDevice(companion.PcPath(), companion.DevicePath(), cancel_event);
     }
 }

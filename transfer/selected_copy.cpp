@@ -53,7 +53,8 @@ class SelectedCopy {
     TransferOutcome Run() {
         TransferOutcome outcome;
         const int count = static_cast<int>(request_.names.size());
-        for (int index = 0; index < count && !outcome.disk_full && progress_.MayGoOn(); ++index) {
+        outcome.stopped = !progress_.MayGoOn();
+        for (int index = 0; index < count && !outcome.disk_full && !outcome.stopped; ++index) {
             const std::wstring& name = request_.names[static_cast<std::size_t>(index)];
             progress_.ShowFile(to_device_ ? pc_folder_ : device_folder_,
                                to_device_ ? device_folder_ : pc_folder_, name, index, count);
@@ -62,6 +63,7 @@ class SelectedCopy {
                 outcome.copied.push_back(name);
             }
             outcome.disk_full = result == DeviceResult::kDiskFull;
+            outcome.stopped = index + 1 < count ? !progress_.MayGoOn() : progress_.IsStopped();
         }
         return outcome;
     }

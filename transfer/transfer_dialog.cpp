@@ -6,6 +6,7 @@
 #include "device/clock_check.h"
 #include "device/connect.h"
 #include "platform/paths.h"
+#include "platform/resources.h"
 #include "platform/text_case.h"
 #include "qelutils/xlate.h"
 #include "res/ids.h"
@@ -45,6 +46,15 @@ void InsertTab(HWND tabs, int index, const wchar_t* text) {
     item.mask = TCIF_TEXT;
     item.pszText = title.data();
     SendMessageW(tabs, TCM_INSERTITEMW, static_cast<WPARAM>(index), reinterpret_cast<LPARAM>(&item));
+}
+
+// Forgets clicks and keys that came while the thread was copying: they were meant for what was shown then,
+// and would now press a button once more or tick another entry.
+void DropPendingInput() {
+    MSG message;
+    while (PeekMessageW(&message, nullptr, WM_MOUSEFIRST, WM_MOUSELAST, PM_REMOVE) ||
+           PeekMessageW(&message, nullptr, WM_KEYFIRST, WM_KEYLAST, PM_REMOVE)) {
+    }
 }
 
 bool SameFolder(std::wstring_view a, std::wstring_view b) {
@@ -94,6 +104,9 @@ bool CCeFileTransfDlg::OnInitDialog() {
     pages_[kPcPage].list.SetColumnKind(1, kColumnWithExtra, kExtra);
     ShowFolders();
     SetUpTabs();
+    if (!IsWindowVisible(Parent())) {
+        ShowInTaskBar();
+    }
     ShowWindow(Handle(), SW_SHOW);
     UpdateWindow(Handle());
     if (!date_check_done_ && CheckDeviceDateTimeForFileView(Handle(), device_tree_.StopEvent()) == 0) {
@@ -102,6 +115,14 @@ bool CCeFileTransfDlg::OnInitDialog() {
     }
     OnRefresh();
     return true;
+}
+
+// The dialog is the program's only window, and has the button and icon that its owner would have.
+void CCeFileTransfDlg::ShowInTaskBar() {
+    SetWindowLongPtrW(Handle(), GWL_EXSTYLE, GetWindowLongPtrW(Handle(), GWL_EXSTYLE) | WS_EX_APPWINDOW);
+    HICON icon = LoadIconW(ResourceModule(), MAKEINTRESOURCEW(IDI_APPLICATION_ICON));
+    SendMessageW(Handle(), WM_SETICON, ICON_BIG, reinterpret_cast<LPARAM>(icon));
+    SendMessageW(Handle(), WM_SETICON, ICON_SMALL, reinterpret_cast<LPARAM>(icon));
 }
 
 void CCeFileTransfDlg::SetUpList(Page& page) {
@@ -355,7 +376,9 @@ void CCeFileTransfDlg::OnCopySelected() {
 void CCeFileTransfDlg::OnCopyAll(bool ticked_only) {
     const ui::WaitCursor wait;
     for (const int number : {kPcPage, kDevicePage}) {
-        CopyFiles(number, Names(pages_[static_cast<std::size_t>(number)], ticked_only));
+        if (!CopyFiles(number, Names(pages_[static_cast<std::size_t>(number)], ticked_only))) {
+            break;
+        }
     }
     EnableItem(IDC_TRANSFER_COPY_ALL, AnyCandidates());
     if (!AnyCandidates()) {
@@ -376,14 +399,15 @@ std::vector<std::wstring> CCeFileTransfDlg::Names(const Page& page, bool ticked_
     return names;
 }
 
-// Copies the files of one page to the other side. Without a device nothing happens.
-void CCeFileTransfDlg::CopyFiles(int number, const std::vector<std::wstring>& names) {
+// Copies the files of one page to the other side. Without a device nothing happens. False when the user
+// stopped the copy.
+bool CCeFileTransfDlg::CopyFiles(int number, const std::vector<std::wstring>& names) {
     if (names.empty()) {
-        return;
+        return true;
     }
     DeviceSession session(device_tree_.StopEvent());
     if (!session) {
-        return;
+        return true;
     }
     Page& page = pages_[static_cast<std::size_t>(number)];
     const auto direction = static_cast<CopyDirection>(number);
@@ -396,6 +420,7 @@ void CCeFileTransfDlg::CopyFiles(int number, const std::vector<std::wstring>& na
                            .warn_before_replacing = IsOn(settings_.overwrite_warn),
                            .stop_event = device_tree_.StopEvent()},
                           progress);
+    DropPendingInput();
     // Before anything can paint the list, which shows the entries where they lie.
     RemoveCandidates(page.candidates, outcome.copied);
     page.list.SetItems(page.candidates);
@@ -410,6 +435,7 @@ void CCeFileTransfDlg::CopyFiles(int number, const std::vector<std::wstring>& na
     progress.Close();
     session.Close();
     FinishCopy(page);
+    return !outcome.stopped;
 }
 
 void CCeFileTransfDlg::FinishCopy(Page& page) {

@@ -59,6 +59,7 @@ class CCeFileTransfDlg : public ui::Dialog {
     static constexpr int kDevicePage = 1;
 
     // Initialisation.
+    void ShowInTaskBar();
     void SetUpList(Page& page);
     void SetUpTabs();
     void ShowFolders();
@@ -78,7 +79,7 @@ class CCeFileTransfDlg : public ui::Dialog {
 
     bool ReadListings();
     std::vector<std::wstring> Names(const Page& page, bool ticked_only) const;
-    void CopyFiles(int page, const std::vector<std::wstring>& names);
+    bool CopyFiles(int page, const std::vector<std::wstring>& names);
     void FinishCopy(Page& page);
     bool AnyCandidates() const;
     Page* PageOfList(HWND list);
