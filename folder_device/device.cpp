@@ -94,7 +94,7 @@ void Device::ReadSettings() {
     handles.CloseAll();
     std::optional<SettingTexts> texts = ReadSettingTexts(dll_folder_);
     std::shared_ptr<Configuration> configuration = Current();
-    if (configuration->settings.root.empty() || configuration->texts != texts) {
+    if (!configuration->IsUsable() || configuration->texts != texts) {
         std::optional<Settings> settings = texts ? ParseSettings(*texts, dll_folder_) : std::nullopt;
         configuration = std::make_shared<Configuration>(std::move(texts), std::move(settings));
         configuration_ = configuration;

@@ -22,7 +22,8 @@
 
 namespace folder_device {
 
-// What the settings' texts made: it lives with its counters as long as no text changes.
+// What the settings' texts made: it lives with its counters as long as it is usable and no text
+// changes.
 struct Configuration {
     // No texts: they could not be read. Nothing parsed: they could not be understood.
     explicit Configuration(std::optional<SettingTexts> setting_texts, std::optional<Settings> parsed)

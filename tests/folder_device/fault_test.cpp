@@ -42,6 +42,19 @@ TEST_F(Fault, SettingsThatCannotBeUnderstoodOpenNoSession) {
     EXPECT_EQ(Connect(), S_OK);
 }
 
+TEST_F(Fault, ATraceThatCouldNotBeOpenedIsTriedAgain) {
+    const TempFolder aside;
+    device_.CloseSessions();
+    device_.Set(L"TRACE", aside / L"later\\trace.txt");
+    EXPECT_EQ(Connect(), HRESULT_FROM_WIN32(ERROR_BAD_CONFIGURATION));
+    MakeFolder(aside / L"later");
+    EXPECT_EQ(Connect(), S_OK);
+    EXPECT_TRUE(Exists(aside / L"later\\trace.txt"));
+    device_.CloseSessions();
+    device_.Clear(L"TRACE");
+    EXPECT_EQ(Connect(), S_OK);  // Lets go of the trace.
+}
+
 TEST_F(Fault, TheNamedCallIsRefusedAndNoOther) {
     device_.Set(L"REFUSE",
                 L"CeCreateDirectory#2=5; CeDeleteFile@\\Jobs\\A.qvj=32 ;CeWriteFile@\\w=x.txt=1117;"
