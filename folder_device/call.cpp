@@ -8,8 +8,13 @@ namespace folder_device {
 
 Call::~Call() {
     if (configuration_->trace.IsOpen()) {
-        configuration_->trace.Write(
-            {function_, thread_.sessions.size(), std::move(argument_text_), result_, error_});
+        Guarded(
+            [this] {
+                configuration_->trace.Write(
+                    {function_, thread_.sessions.size(), std::move(argument_text_), result_, error_});
+                return true;
+            },
+            false);  // The line is lost.
     }
 }
 

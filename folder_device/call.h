@@ -37,21 +37,32 @@ struct Argument {
     Kind kind = Kind::kNumber;
 };
 
+// Gives what `body` answers or, when memory or another means of the system has run out, `exhausted`. Nothing
+// but std::exception is thrown in the DLL, and nothing may leave it.
+template <class Body, class Result>
+Result Guarded(Body body, Result exhausted) noexcept {
+    try {
+        return body();
+    } catch (const std::exception&) {
+        return exhausted;
+    }
+}
+
 class Call {
   public:
     static constexpr std::size_t kMaxArguments = 5;
 
     template <class... Arguments>
-    explicit Call(Function function, Arguments... arguments)
+    explicit Call(Function function, Arguments... arguments) noexcept
         : device_(Device::Get()),
-          thread_(device_.Thread()),
+          thread_(*Guarded([this] { return &device_.Thread(); }, &spare_thread_)),
           configuration_(device_.Current()),
           function_(function),
           arguments_{Argument(arguments)...},
           argument_count_(sizeof...(arguments)) {
         static_assert(sizeof...(arguments) <= kMaxArguments);
         if (configuration_->trace.IsOpen()) {
-            argument_text_ = ArgumentText();
+            argument_text_ = Guarded([this] { return ArgumentText(); }, std::wstring(L"?"));
         }
     }
     ~Call();
@@ -66,10 +77,12 @@ class Call {
     // Passes the gate and carries out `body`, which answers a Win32 code. Gives that code or the gate's.
     template <class Body>
     DWORD Run(Body body) {
-        error_ = EnterDevice();
-        if (error_ == ERROR_SUCCESS) {
-            error_ = Guarded(body, static_cast<DWORD>(ERROR_NOT_ENOUGH_MEMORY));
-        }
+        error_ = Guarded(
+            [&]() -> DWORD {
+                const DWORD refusal = EnterDevice();
+                return refusal != ERROR_SUCCESS ? refusal : body();
+            },
+            static_cast<DWORD>(ERROR_NOT_ENOUGH_MEMORY));
         if (error_ != ERROR_SUCCESS) {
             thread_.last_error = error_;
         }
@@ -78,10 +91,12 @@ class Call {
     // The same for a call that stays on the PC and answers an HRESULT.
     template <class Body>
     HRESULT RunLocal(Body body) {
-        HRESULT result = EnterLocal();
-        if (SUCCEEDED(result)) {
-            result = Guarded(body, static_cast<HRESULT>(E_OUTOFMEMORY));
-        }
+        const HRESULT result = Guarded(
+            [&]() -> HRESULT {
+                const HRESULT refusal = EnterLocal();
+                return FAILED(refusal) ? refusal : body();
+            },
+            static_cast<HRESULT>(E_OUTOFMEMORY));
         LeaveLocal(result);
         return result;
     }
@@ -104,14 +119,6 @@ class Call {
     }
 
   private:
-    template <class Body, class Result>
-    static Result Guarded(Body& body, Result out_of_memory) {
-        try {
-            return body();
-        } catch (const std::exception&) {
-            return out_of_memory;  // Nothing else is thrown here, and nothing may leave the DLL.
-        }
-    }
     DWORD EnterDevice();
     HRESULT EnterLocal();
     void LeaveLocal(HRESULT result);
@@ -120,6 +127,7 @@ class Call {
     std::wstring ArgumentText() const;
 
     Device& device_;
+    ThreadState spare_thread_;  // Without a session, for a thread whose state found no memory.
     ThreadState& thread_;
     const std::shared_ptr<Configuration> configuration_;
     const Function function_;

@@ -1,6 +1,7 @@
 #include "folder_device/device.h"
 
 #include <algorithm>
+#include <exception>
 
 namespace folder_device {
 
@@ -47,7 +48,12 @@ bool Device::Start(HMODULE module) {
     if (slot == TLS_OUT_OF_INDEXES) {
         return false;
     }
-    the_device = new Device(FolderOf(module), slot);
+    try {
+        the_device = new Device(FolderOf(module), slot);
+    } catch (const std::exception&) {
+        TlsFree(slot);
+        return false;
+    }
     return true;
 }
 
@@ -97,9 +103,9 @@ void Device::ReadSettings() {
     if (!configuration->IsUsable() || configuration->texts != texts) {
         std::optional<Settings> settings = texts ? ParseSettings(*texts, dll_folder_) : std::nullopt;
         configuration = std::make_shared<Configuration>(std::move(texts), std::move(settings));
-        configuration_ = configuration;
     }
     storage.Recount(configuration->settings.root, configuration->settings.capacity);
+    configuration_ = std::move(configuration);
 }
 
 void Device::OpenSession(std::shared_ptr<Connection> connection) {

@@ -65,7 +65,8 @@ class Device {
     void EndThread();
 
     std::shared_ptr<Configuration> Current() const { return configuration_.load(); }
-    // Reads the settings and counts the storage anew if no session is open in the process.
+    // Reads the settings and counts the storage anew if no session is open in the process. Throws when memory
+    // runs out, and the settings stay what they were.
     void ReadSettings();
     // Adds a session to the calling thread, and takes the last one away: false when it has none.
     void OpenSession(std::shared_ptr<Connection> connection);

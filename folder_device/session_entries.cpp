@@ -66,9 +66,14 @@ DWORD FindDeviceDll(const std::wstring& root, const wchar_t* dll) {
 // the setting INIT_RESULT. Otherwise the record's event tells when the connection has come about or
 // failed; without CONNECT_DELAY it is signalled on return.
 HRESULT WINAPI CeRapiInitEx(rapi::InitRecord* record) {
-    Device::Get().ReadSettings();  // Before the call looks at them.
+    const HRESULT read = Guarded(  // Before the call looks at the settings.
+        [] {
+            Device::Get().ReadSettings();
+            return S_OK;
+        },
+        static_cast<HRESULT>(E_OUTOFMEMORY));
     Call call(Function::kRapiInitEx);
-    return call.RunLocal([&] { return OpenSession(call, record); });
+    return call.RunLocal([&] { return FAILED(read) ? read : OpenSession(call, record); });
 }
 
 // Takes the thread's youngest session away, whatever became of its connection; E_FAIL when it has none.

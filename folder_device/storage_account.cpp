@@ -42,9 +42,10 @@ std::uint64_t CountBytes(const std::wstring& root) {
 }  // namespace
 
 void StorageAccount::Recount(const std::wstring& root, std::optional<std::uint64_t> capacity) {
+    const std::uint64_t used = capacity ? CountBytes(root) : 0;
     const std::scoped_lock lock(mutex_);
     capacity_ = capacity;
-    used_ = capacity ? CountBytes(root) : 0;
+    used_ = used;
 }
 
 std::uint64_t StorageAccount::Free() {
