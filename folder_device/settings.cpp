@@ -235,7 +235,9 @@ std::optional<Settings> ParseSettings(const SettingTexts& texts, const std::wstr
     if (found_count) {
         settings.found_count = static_cast<DWORD>(*found_count);
     }
-    settings.found_null = texts[kFoundNull] == L"1";
+    std::optional<std::uint64_t> found_null;
+    reader.Number(kFoundNull, 1, found_null);
+    settings.found_null = found_null == 1U;
     // A success that is not S_OK would look like a fault that is set and does nothing.
     if (settings.init_result > 0 || settings.connect_result > 0) {
         return std::nullopt;

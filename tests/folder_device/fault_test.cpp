@@ -31,6 +31,8 @@ TEST_F(Fault, SettingsThatCannotBeUnderstoodOpenNoSession) {
         {L"EXTRA_ENTRIES", L"Jobs|a"},
         {L"EXTRA_ENTRIES", L"\\Jobs|a|hidden"},
         {L"FOUND_COUNT", L"0x100000000"},
+        {L"FOUND_NULL", L"yes"},
+        {L"FOUND_NULL", L"2"},
         {L"TRACE", L"Z:\\no\\such\\folder\\trace.txt"},
     };
     device_.CloseSessions();
