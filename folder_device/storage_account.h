@@ -1,6 +1,7 @@
 // The device's storage: how many bytes its files may hold and how many they do. Without a capacity nothing
-// is counted and nobody waits. With one the bytes are counted once, when the settings are read, and then
-// kept up with every change, so that a write costs the same however many files there are.
+// is counted and nobody waits. With one the bytes are counted each time that the settings are read, because
+// the files, or the whole card, may have been changed past the device since; then they are kept up with every
+// change, so that a write costs the same however many files there are.
 #pragma once
 
 #include <cstdint>
