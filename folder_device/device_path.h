@@ -31,8 +31,8 @@ struct Location {
 
 // Fills `location` for `path` below `root`. The last name need not exist, the folders before it must.
 // Returns 0 or the device error: ERROR_INVALID_PARAMETER (null), ERROR_FILENAME_EXCED_RANGE,
-// ERROR_INVALID_NAME (also for the shortened name of something else), ERROR_PATH_NOT_FOUND, or ERROR_ACCESS_DENIED when a link stands on the way or at the
-// end: links could lead out of the root.
+// ERROR_INVALID_NAME (also for the shortened name of something else), ERROR_PATH_NOT_FOUND, or
+// ERROR_ACCESS_DENIED when a link stands on the way or at the end: links could lead out of the root.
 DWORD Locate(const std::wstring& root, const wchar_t* path, Location& location);
 
 }  // namespace folder_device
