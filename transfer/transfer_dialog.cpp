@@ -420,10 +420,10 @@ bool CCeFileTransfDlg::CopyFiles(int number, const std::vector<std::wstring>& na
                            .warn_before_replacing = IsOn(settings_.overwrite_warn),
                            .stop_event = device_tree_.StopEvent()},
                           progress);
-    DropPendingInput();
     // Before anything can paint the list, which shows the entries where they lie.
     RemoveCandidates(page.candidates, outcome.copied);
     page.list.SetItems(page.candidates);
+    DropPendingInput();
     if (outcome.disk_full) {
         // The progress window, which belongs to another thread, would cover the box.
         SetForegroundWindow(Handle());
