@@ -6,13 +6,15 @@
 #include <array>
 
 #include "settings/registry_strings.h"
+#include "tests/support/folder_device.h"
 #include "tests/support/scratch_registry.h"
 
 namespace orvane {
 namespace {
 
+using namespace std::string_literals;
+
 constexpr const wchar_t* kKey = L"Software\\Veltrano\\CE Devices";
-constexpr const wchar_t* kAutoStartKey = L"SOFTWARE\\Microsoft\\Windows CE Services\\AutoStartOnConnect";
 
 struct Flag {
     const wchar_t* name;
@@ -40,11 +42,6 @@ constexpr std::array<Flag, 17> kFlags = {{{L"Sync_qvj_files", &S::sync_qvj_files
 
 class SettingsStore : public ::testing::Test {
   protected:
-    static std::wstring Documents() {
-        std::array<wchar_t, MAX_PATH> path{};
-        EXPECT_EQ(SHGetFolderPathW(nullptr, CSIDL_PERSONAL, nullptr, 0, path.data()), S_OK);
-        return path.data();
-    }
     // What the registry holds, "(none)" for nothing.
     static std::wstring Stored(const wchar_t* name) {
         std::wstring text;
@@ -58,27 +55,25 @@ class SettingsStore : public ::testing::Test {
 };
 
 TEST_F(SettingsStore, WritesTheDefaultsAtTheFirstStart) {
-    const SyncSettings settings = LoadSettings();
-    const std::wstring folder = Documents() + L"\\Ferrow\\Office\\Data";
-    EXPECT_EQ(settings.sync_path_dt, folder);
+    std::array<wchar_t, MAX_PATH> documents{};
+    EXPECT_EQ(SHGetFolderPathW(nullptr, CSIDL_PERSONAL, nullptr, 0, documents.data()), S_OK);
+    const std::wstring folder = documents.data() + std::wstring(L"\\Ferrow\\Office\\Data");
+    EXPECT_EQ(LoadSettings().sync_path_dt, folder);
     EXPECT_EQ(Stored(L"SyncPath_DT"), folder);
-    EXPECT_EQ(settings.sync_path_ce, L"");
     EXPECT_EQ(Stored(L"SyncPath_CE"), L"(none)");
     for (const Flag& flag : kFlags) {
         const bool on = flag.flag == &S::sync_qvj_files || flag.flag == &S::sync_wkf_files;
-        EXPECT_EQ(settings.*flag.flag, on ? 1 : 0) << flag.name;
         EXPECT_EQ(Stored(flag.name), on ? L"1" : L"0") << flag.name;
     }
 }
 
 TEST_F(SettingsStore, KeepsEveryFlagInAValueAndATextOfItsOwn) {
-    SyncSettingsBlock block;
-    ASSERT_EQ(&block.sync_txt_files - &block.sync_path_dt, 17) << "texts behind each other";
     for (const Flag& on : kFlags) {
         SyncSettings saved;
         saved.*on.flag = 1;
         SaveSettings(saved);
         const SyncSettings loaded = LoadSettings();
+        SyncSettingsBlock block;
         RefreshSettingsBlock(loaded, block);
         const std::wstring* text = &block.sync_qvj_files;
         for (const Flag& flag : kFlags) {
@@ -89,72 +84,69 @@ TEST_F(SettingsStore, KeepsEveryFlagInAValueAndATextOfItsOwn) {
                 EXPECT_EQ(*text++, is_on ? L"1" : L"0") << on.name << " " << flag.name;
             }
         }
-        EXPECT_EQ(ReadStartFileView(), on.flag == &S::start_file_view);
     }
 }
 
-TEST_F(SettingsStore, TakesOnlyTheTextOneForOn) {
-    for (const wchar_t* text : {L"true", L"yes", L" 1", L"1 ", L"11", L"01", L"2", L"", L"\uFF11"}) {
+TEST_F(SettingsStore, TakesOnlyTheTextOneForOnAndReplacesWhatCannotBeRead) {
+    for (const wchar_t* text : {L"true", L" 1", L"11", L"2", L""}) {
         Store(L"Sync_qvj_files", text);
         Store(L"Start_File_View", text);
         EXPECT_EQ(LoadSettings().sync_qvj_files, 0) << text;
         EXPECT_FALSE(ReadStartFileView()) << text;
         EXPECT_EQ(Stored(L"Sync_qvj_files"), text) << "not a missing value";
     }
-    const std::wstring too_long(510, L'1');
-    Store(L"Sync_qvj_files", too_long);
-    Store(L"SyncPath_DT", too_long);
+    Store(L"SyncPath_DT", std::wstring(509, L'x'));
+    EXPECT_EQ(LoadSettings().sync_path_dt, std::wstring(509, L'x'));
+    Store(L"Sync_qvj_files", std::wstring(510, L'1'));
     EXPECT_EQ(LoadSettings().sync_qvj_files, 1);
     EXPECT_EQ(Stored(L"Sync_qvj_files"), L"1");
-    EXPECT_EQ(Stored(L"SyncPath_DT"), Documents() + L"\\Ferrow\\Office\\Data");
+}
+
+TEST_F(SettingsStore, SurvivesBytesThatAreNoText) {
+    const struct {
+        DWORD type;
+        const void* data;
+        DWORD bytes;
+        std::wstring expected;
+    } cases[] = {{REG_SZ, L"", 0, L""},
+                 {REG_SZ, L"a\0b", 4 * 2, L"a"},
+                 {REG_SZ, L"abc", 3 * 2, L"abc"},
+                 {REG_EXPAND_SZ, L"%TEMP%", 7 * 2, L"%TEMP%"},
+                 {REG_BINARY, L"ab", 3, {L'a', L'b'}}};
+    Store(L"SyncPath_DT", L"");
+    for (const auto& c : cases) {
+        ASSERT_EQ(RegSetKeyValueW(HKEY_CURRENT_USER, kKey, L"SyncPath_DT", c.type, c.data, c.bytes), 0);
+        EXPECT_EQ(Stored(L"SyncPath_DT"), c.expected) << (&c - cases);
+    }
 }
 
 TEST_F(SettingsStore, LeavesTheDeviceFolderUnreadWithoutADevice) {
     Store(L"SyncPath_CE", L"\\My Jobs\\");
-    Store(L"SyncPath_DT", L"");
     SyncSettings settings = LoadSettings();
     EXPECT_EQ(settings.sync_path_ce, L"");
-    EXPECT_EQ(settings.sync_path_dt, L"") << "an empty text is a value";
     SaveSettings(settings);
-    EXPECT_EQ(settings.sync_path_ce, L"");
     EXPECT_EQ(Stored(L"SyncPath_CE"), L"\\My Jobs\\");
 }
 
-TEST_F(SettingsStore, SavesFoldersWithOneBackslash) {
-    const struct {
-        const wchar_t* folder;
-        const wchar_t* stored;
-    } folders[] = {{L"C:\\Jobs", L"C:\\Jobs\\"},
-                   {L"\\Jobs\\\\\\", L"\\Jobs\\"},
-                   {L"\\", L"\\"},
-                   {L"\\\\pc\\a b\\", L"\\\\pc\\a b\\"}};
-    for (const auto& c : folders) {
-        SyncSettings settings;
-        settings.sync_path_dt = settings.sync_path_ce = c.folder;
-        SaveSettings(settings);
-        for (const std::wstring& folder :
-             {settings.sync_path_dt, settings.sync_path_ce, Stored(L"SyncPath_DT"), Stored(L"SyncPath_CE")}) {
-            EXPECT_EQ(folder, c.stored);
+TEST_F(SettingsStore, TheDeviceFolderGivesWayToTheFirstUsualOneWhenItIsNotOnTheDevice) {
+    const testing::FolderDevice device;
+    testing::MakeFolder(device.PcPath(L"\\My Jobs"));
+    testing::WriteTextFile(device.PcPath(L"\\file"), "");
+    for (const std::wstring& usual :
+         {L""s, L"\\ROMDisk\\PROGRAM\\Ferrow Field\\Jobs"s, L"\\CF Card\\Qel ORVANE\\Jobs"s,
+          L"\\Program Files\\Ferrow Field\\Jobs"s}) {
+        testing::MakeFolder(device.PcPath(usual + L"\\"));
+        for (const std::wstring& gone : {L"\\gone\\"s, L"\\file"s, L""s, L"\\" + std::wstring(300, L'x')}) {
+            Store(L"SyncPath_CE", gone);
+            EXPECT_EQ(LoadSettings().sync_path_ce, usual) << gone;
+            EXPECT_EQ(Stored(L"SyncPath_CE"), usual.empty() ? gone : usual);
+        }
+        for (const wchar_t* there : {L"\\my jobs\\", L"\\My Jobs", L"\\"}) {
+            Store(L"SyncPath_CE", there);
+            EXPECT_EQ(LoadSettings().sync_path_ce, there);
+            EXPECT_EQ(Stored(L"SyncPath_CE"), there);
         }
     }
-}
-
-TEST_F(SettingsStore, KeepsTheProgramsPathForTheAutoStart) {
-    EXPECT_FALSE(ReadAutoStart());
-    HWND window = CreateWindowExW(0, L"STATIC", L"", WS_POPUP | WS_VISIBLE, 0, 0, 9, 9, nullptr, nullptr,
-                                  GetModuleHandleW(nullptr), nullptr);
-    SetActiveWindow(window);
-    std::array<wchar_t, 512> expected{};
-    GetWindowModuleFileNameW(window, expected.data(), 511);
-    EXPECT_NE(expected[0], L'\0');
-    std::wstring stored;
-    for (const bool on : {true, false, true}) {
-        WriteAutoStart(on, nullptr);
-        EXPECT_EQ(ReadAutoStart(), on);
-        EXPECT_TRUE(RegReadString(HKEY_LOCAL_MACHINE, kAutoStartKey, L"ORVANE ActiveSync", stored));
-        EXPECT_EQ(stored, on ? expected.data() : L"");
-    }
-    DestroyWindow(window);
 }
 
 }  // namespace
