@@ -26,9 +26,7 @@ TEST(FolderDialog, AnswersTheFolderThatWasOpened) {
         [&](HWND window) {
             HWND list = GetDlgItem(window, IDC_FOLDER_DIRECTORY_LIST);
             EXPECT_TRUE(testing::WaitUntil([&] { return SendMessageW(list, LB_GETCURSEL, 0, 0) == 0; }));
-            EXPECT_EQ(ui::WindowText(window), L"Select Directory");
             EXPECT_EQ(ItemText(window, IDC_FOLDER_DIRECTORY), folder.Path());
-            EXPECT_EQ(ItemText(window, IDC_FOLDER_FILE_NAME), L"Dummy");
             EXPECT_NE(SendMessageW(list, LB_SELECTSTRING, static_cast<WPARAM>(-1),
                                    reinterpret_cast<LPARAM>(L"[sub]")),
                       LB_ERR);
