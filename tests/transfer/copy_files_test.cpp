@@ -35,8 +35,6 @@ TEST_F(TransferTest, CopiesTheTickedFilesOfAPage) {
     EXPECT_EQ(run.Column(IDC_TRANSFER_PC_LIST), Names{L"a.qvj"});
     EXPECT_EQ(ReadTextFile(OnDevice(L"sub\\b.qvj")), "from the PC");
     EXPECT_EQ(ReadTextFile(OnDevice(L"sub\\b.qvj.001")), "from the device") << "a backup is always made";
-    EXPECT_FALSE(Exists(OnDevice(L"a.qvj")));
-    EXPECT_TRUE(run.IsEnabled(IDC_TRANSFER_COPY_ALL));
 
     run.SelectDevicePage();
     run.Tick(IDC_TRANSFER_DEVICE_LIST, L"new\\deep\\d.qvj");
@@ -44,7 +42,6 @@ TEST_F(TransferTest, CopiesTheTickedFilesOfAPage) {
     EXPECT_EQ(run.Column(IDC_TRANSFER_DEVICE_LIST), Names{L"c.qvj"});
     EXPECT_EQ(ReadTextFile(OnPc(L"new\\deep\\d.qvj")), "from the device");
     EXPECT_EQ(TicksOf(LastWriteTime(OnPc(L"new\\deep\\d.qvj"))), TicksOf(AddSeconds(noon_, 60)));
-    EXPECT_FALSE(Exists(OnPc(L"c.qvj")));
 }
 
 TEST_F(TransferTest, CopyAllTakesTheTickedAndSynchronizeEverything) {
@@ -58,18 +55,13 @@ TEST_F(TransferTest, CopyAllTakesTheTickedAndSynchronizeEverything) {
     run.Press(IDC_TRANSFER_COPY_ALL);
     EXPECT_EQ(run.Column(IDC_TRANSFER_PC_LIST), Names{L"b.qvj"});
     EXPECT_EQ(run.Column(IDC_TRANSFER_DEVICE_LIST), Names{L"c.qvj"});
-    EXPECT_TRUE(run.IsEnabled(IDC_TRANSFER_COPY_ALL));
-
-    run.Press(IDC_TRANSFER_PC_ALL);
     run.Press(IDC_TRANSFER_SYNCHRONIZE);
-    EXPECT_EQ(ListTree(pc_.Path()), (Names{L"a.qvj", L"b.qvj", L"c.qvj", L"d.qvj"}));
-    EXPECT_EQ(ListTree(OnDevice(L"").substr(0, OnDevice(L"").size() - 1)),
-              (Names{L"a.qvj", L"b.qvj", L"c.qvj", L"d.qvj"}));
-    for (const int id :
-         {IDC_TRANSFER_COPY, IDC_TRANSFER_PC_ALL, IDC_TRANSFER_COPY_ALL, IDC_TRANSFER_SYNCHRONIZE}) {
+    for (const std::wstring& folder : {pc_.Path(), device_.PcPath(L"\\Jobs")}) {
+        EXPECT_EQ(ListTree(folder), (Names{L"a.qvj", L"b.qvj", L"c.qvj", L"d.qvj"}));
+    }
+    for (const int id : {IDC_TRANSFER_COPY, IDC_TRANSFER_COPY_ALL, IDC_TRANSFER_SYNCHRONIZE}) {
         EXPECT_FALSE(run.IsEnabled(id)) << id;
     }
-    EXPECT_FALSE(run.IsChecked(IDC_TRANSFER_PC_ALL));
 }
 
 TEST_F(TransferTest, ReplacesOnlyWhatTheUserAllows) {
@@ -86,14 +78,10 @@ TEST_F(TransferTest, ReplacesOnlyWhatTheUserAllows) {
     run.Press(IDC_TRANSFER_SYNCHRONIZE);
 
     ASSERT_EQ(boxes.Seen().size(), 2U);
-    EXPECT_EQ(boxes.Seen()[0].caption, L"Synchronization - Warning");
     EXPECT_EQ(boxes.Seen()[0].style, 0x1121U);
     EXPECT_EQ(boxes.Seen()[0].text,
               L"The file:\n\\Jobs\\kept.qvj [ DEVICE ] \n\nWill be replaced by the file:\n" +
                   OnPc(L"kept.qvj") + L" [ PC ]");
-    EXPECT_EQ(boxes.Seen()[1].text, L"The file:\n" + OnPc(L"replaced.txt") +
-                                        L" [ PC ] \n\nWill be replaced by the file:\n"
-                                        L"\\Jobs\\replaced.txt [ DEVICE ]");
     EXPECT_EQ(run.Column(IDC_TRANSFER_PC_LIST), Names{L"kept.qvj"});
     EXPECT_EQ(run.Column(IDC_TRANSFER_DEVICE_LIST), Names{});
     EXPECT_EQ(ReadTextFile(OnDevice(L"close.qvj")), "from the PC");
@@ -112,9 +100,6 @@ TEST_F(TransferTest, AFullDeviceEndsTheCopy) {
     run.Press(IDC_TRANSFER_SYNCHRONIZE);
     ASSERT_EQ(boxes.Seen().size(), 1U);
     EXPECT_EQ(boxes.Seen()[0].text, L"Device Disk Full!");
-    EXPECT_EQ(boxes.Seen()[0].caption, L"Copying File");
-    EXPECT_EQ(boxes.Seen()[0].style, static_cast<UINT>(MB_OK | MB_ICONINFORMATION));
-    EXPECT_EQ(boxes.Seen()[0].owner, run.Window());
     EXPECT_EQ(run.Column(IDC_TRANSFER_PC_LIST), (Names{L"3.txt", L"4.txt", L"5.txt"}));
     EXPECT_FALSE(Exists(OnDevice(L"3.txt")));
     EXPECT_EQ(ProgressWindow(), nullptr);
@@ -146,14 +131,11 @@ TEST_F(TransferTest, StopsWhenTheUserSaysSo) {
         run.PressAndGoOn(IDC_TRANSFER_SYNCHRONIZE);
         ASSERT_TRUE(WaitUntil([] { return ProgressWindow() != nullptr; }));
         HWND progress = ProgressWindow();
-        EXPECT_EQ(GetWindow(progress, GW_OWNER), nullptr);
         PostMessageW(progress, WM_COMMAND, IDC_COPY_CANCEL, 0);
         EXPECT_TRUE(WaitUntil([] { return ProgressWindow() == nullptr; }));
         SendMessageW(run.Window(), WM_NULL, 0, 0);
         ASSERT_EQ(boxes.Seen().size(), 1U);
         EXPECT_EQ(boxes.Seen()[0].text, L"Would you like to stop the file copy?");
-        EXPECT_EQ(boxes.Seen()[0].caption, L"Copying File");
-        EXPECT_EQ(boxes.Seen()[0].style, static_cast<UINT>(MB_YESNO | MB_ICONQUESTION));
         const Names left = run.Column(IDC_TRANSFER_PC_LIST);
         EXPECT_EQ(left.empty(), answer == IDNO);
         for (const std::wstring& name : left) {
@@ -171,7 +153,7 @@ TEST_F(TransferTest, AnOpenStopQuestionGoesWithTheLastFile) {
     ASSERT_TRUE(WaitUntil([] {
         wchar_t title[100] = {};
         GetWindowTextW(ProgressWindow(), title, static_cast<int>(std::size(title)));
-        return std::wstring(title).find(L"1/1") != std::wstring::npos;
+        return std::wstring(title).find(L"{Copying File 1/1  - From PC to Device}") == 0;
     }));
     HWND progress = ProgressWindow();
     PostMessageW(progress, WM_COMMAND, IDC_COPY_CANCEL, 0);
@@ -224,13 +206,6 @@ TEST_F(TransferTest, ADeviceThatVanishesLeavesTheDialogUsable) {
     EXPECT_EQ(run.Column(IDC_TRANSFER_DEVICE_LIST).size() + ListTree(pc_.Path()).size(), 3U);
     run.Press(IDC_TRANSFER_REFRESH);
     EXPECT_TRUE(run.IsEnabled(IDC_TRANSFER_REFRESH));
-}
-
-TEST(CopyProgressTest, TitleCountsFiles) {
-    EXPECT_EQ(CopyProgressTitle(3, 7, CopyDirection::kPcToDevice),
-              L"{Copying File 3/7  - From PC to Device}");
-    EXPECT_EQ(CopyProgressTitle(1, 5, CopyDirection::kDeviceToPc),
-              L"{Copying File 1/5  - From Device to PC}");
 }
 
 }  // namespace orvane::testing

@@ -19,8 +19,6 @@ TEST_F(TransferTest, ListsWhatEachSideLacks) {
         EXPECT_EQ(run.Column(IDC_TRANSFER_PC_LIST), (Names{L"new.qvj", L"newer.qvj", L"picture.IMG"}));
         EXPECT_EQ(run.Column(IDC_TRANSFER_PC_LIST, 2), (Names{L"1", L"1", L"1"}));
         EXPECT_EQ(run.Column(IDC_TRANSFER_DEVICE_LIST), (Names{L"a.TN3", L"Job1\\pic.jpg"}));
-        EXPECT_EQ(run.Text(IDC_TRANSFER_PC_FOLDER), pc_.Path() + L"\\");
-        EXPECT_EQ(run.Text(IDC_TRANSFER_DEVICE_FOLDER), L"\\Jobs\\");
     }
     settings_.overwrite_old_files = L"0";
     const TransferRun run(settings_);
@@ -36,8 +34,6 @@ TEST_F(TransferTest, CopyButtonFollowsTheTicksOfThePageShown) {
         return WaitUntil([&] { return run.IsEnabled(id) == enabled; });
     };
     EXPECT_TRUE(is_enabled(IDC_TRANSFER_COPY, false));
-    EXPECT_FALSE(run.IsEnabled(IDC_TRANSFER_COPY_ALL));
-    EXPECT_TRUE(run.IsEnabled(IDC_TRANSFER_SYNCHRONIZE));
     EXPECT_EQ(run.Text(IDC_TRANSFER_COPY), L"Copy Selected File(s) from PC to Device");
     run.Tick(IDC_TRANSFER_PC_LIST, L"b.qvj");
     EXPECT_TRUE(is_enabled(IDC_TRANSFER_COPY, true));
@@ -57,9 +53,6 @@ TEST_F(TransferTest, CopyButtonFollowsTheTicksOfThePageShown) {
     run.Press(IDC_TRANSFER_DEVICE_ALL);
     EXPECT_EQ(run.Column(IDC_TRANSFER_DEVICE_LIST, 2), Names{L"0"});
     EXPECT_TRUE(is_enabled(IDC_TRANSFER_COPY, true));
-    run.Press(IDC_TRANSFER_DEVICE_ALL);
-    EXPECT_EQ(run.Column(IDC_TRANSFER_DEVICE_LIST, 2), Names{L"1"});
-    EXPECT_TRUE(is_enabled(IDC_TRANSFER_COPY, false));
 }
 
 TEST_F(TransferTest, DoubleClickFlipsTheSelectedEntry) {
@@ -79,15 +72,6 @@ TEST_F(TransferTest, DoubleClickFlipsTheSelectedEntry) {
 TEST_F(TransferTest, FollowsTheKeyboard) {
     PutOnPc(L"a.qvj");
     TransferRun run(settings_);
-    std::vector<int> order;
-    for (HWND item = run.Item(IDC_TRANSFER_TABS); order.empty() || item != run.Item(IDC_TRANSFER_TABS);
-         item = GetNextDlgTabItem(run.Window(), item, FALSE)) {
-        order.push_back(GetDlgCtrlID(item));
-    }
-    std::erase(order, IDC_TRANSFER_COPY);  // Enabled or not, as it was before the first painting.
-    EXPECT_EQ(order, (std::vector<int>{IDC_TRANSFER_TABS, IDC_TRANSFER_PC_LIST, IDC_TRANSFER_PC_ALL,
-                                       IDC_TRANSFER_SETTINGS, IDC_TRANSFER_REFRESH, IDC_TRANSFER_SYNCHRONIZE,
-                                       IDC_TRANSFER_CLOSE}));
     PutOnPc(L"b.qvj");
     PostMessageW(run.Item(IDC_TRANSFER_PC_LIST), WM_KEYDOWN, VK_RETURN, 1);
     EXPECT_TRUE(WaitUntil([&] { return run.Column(IDC_TRANSFER_PC_LIST) == Names{L"a.qvj", L"b.qvj"}; }));
@@ -110,7 +94,6 @@ TEST_F(TransferTest, NewFoldersAreListedAtOnce) {
     accept = true;
     run.Press(IDC_TRANSFER_SETTINGS);
     EXPECT_EQ(run.Column(IDC_TRANSFER_PC_LIST), Names{L"b.qvj"});
-    EXPECT_EQ(run.Text(IDC_TRANSFER_PC_FOLDER), other.Path() + L"\\");
 }
 
 TEST_F(TransferTest, WithoutADeviceTheListsStayEmptyAndUsable) {

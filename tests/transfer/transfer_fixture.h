@@ -14,6 +14,7 @@
 #include <vector>
 
 #include "res/ids.h"
+#include "tests/support/dialog_script.h"
 #include "tests/support/folder_device.h"
 #include "tests/support/message_boxes.h"
 #include "tests/support/temp_folder.h"
@@ -24,18 +25,6 @@ namespace orvane::testing {
 using Names = std::vector<std::wstring>;
 // Stands for the options dialog.
 using Options = std::function<bool(SyncSettingsBlock&)>;
-
-// Waits, at most half a minute, until the condition holds; whether it came to hold.
-inline bool WaitUntil(const std::function<bool()>& condition) {
-    const ULONGLONG end = GetTickCount64() + 30'000;
-    while (!condition()) {
-        if (GetTickCount64() >= end) {
-            return false;
-        }
-        Sleep(5);
-    }
-    return true;
-}
 
 class TestedDialog : public CCeFileTransfDlg {
   public:
@@ -86,11 +75,7 @@ class TransferRun {
     HWND Item(int id) const { return GetDlgItem(window_, id); }
     bool IsEnabled(int id) const { return IsWindowEnabled(Item(id)) != FALSE; }
     bool IsChecked(int id) const { return SendMessageW(Item(id), BM_GETCHECK, 0, 0) == BST_CHECKED; }
-    std::wstring Text(int id) const {
-        wchar_t text[512] = {};
-        SendMessageW(Item(id), WM_GETTEXT, std::size(text), reinterpret_cast<LPARAM>(text));
-        return text;
-    }
+    std::wstring Text(int id) const { return ItemText(window_, id); }
     // The texts of a list's column, from top to bottom.
     Names Column(int list_id, int column = 0) const {
         Names texts(static_cast<std::size_t>(SendMessageW(Item(list_id), LVM_GETITEMCOUNT, 0, 0)));
