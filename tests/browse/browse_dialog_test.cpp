@@ -4,8 +4,10 @@
 
 #include <algorithm>
 #include <array>
+#include <filesystem>
 
 #include "browse/property_texts.h"
+#include "platform/handles.h"
 #include "res/ids.h"
 #include "tests/support/dialog_script.h"
 #include "tests/support/folder_device.h"
@@ -109,6 +111,7 @@ TEST_F(BrowseDialog, ShowsTheDeviceSortedAndSelectsTheDeepestFolder) {
         EXPECT_EQ(Items(dialog), (std::vector<std::wstring>{L"1*CF Card", L" 1*Jobs", L"  1*A", L"  2*b",
                                                             L"   3 1.txt", L"  3 a.TXT", L"1*Temp"}));
         EXPECT_EQ(ItemText(dialog, IDC_BROWSE_FOLDER), L"\\CF Card\\Jobs\\");
+        EXPECT_EQ(ui::WindowText(dialog), L"Browse");
         // The tree has the place of its placeholder in the tab order.
         HWND folder = GetDlgItem(dialog, IDC_BROWSE_FOLDER);
         EXPECT_EQ(GetNextDlgTabItem(dialog, folder, FALSE), TreeOf(dialog));
@@ -119,40 +122,53 @@ TEST_F(BrowseDialog, ShowsTheDeviceSortedAndSelectsTheDeepestFolder) {
     EXPECT_EQ(result_folder_, L"\\CF Card\\Jobs\\");
 }
 
-TEST_F(BrowseDialog, PicturesFollowTheUserAndWithoutASelectionThereIsNoAnswer) {
+TEST_F(BrowseDialog, AnswersNothingWithoutASelection) {
     const INT_PTR result = Run(kNoFiles, L"\\Tem\\Jobs", [](HWND dialog) {
-        HWND tree = TreeOf(dialog);
         EXPECT_EQ(Items(dialog),
                   (std::vector<std::wstring>{L"2*CF Card", L" 2*Jobs", L"  1*A", L"  1*b", L"1*Temp"}));
-        TreeView_SelectItem(tree, TreeView_GetRoot(tree));
-        // A folder with something in it changes when it opens, not by the click.
-        DoubleClick(dialog);
-        EXPECT_EQ(Items(dialog)[0], L"2*CF Card");
-        SendMessageW(tree, WM_KEYDOWN, VK_RIGHT, 0);
-        EXPECT_EQ(Items(dialog)[0], L"1*CF Card");
-        TreeView_SelectItem(tree, TreeView_GetNextSibling(tree, TreeView_GetRoot(tree)));
-        DoubleClick(dialog);
-        EXPECT_EQ(Items(dialog).back(), L"2*Temp");
-        TreeView_SelectItem(tree, nullptr);
         testing::Press(dialog, IDOK);
     });
     EXPECT_EQ(result, IDOK);
     EXPECT_EQ(result_folder_, L"");
 }
 
+TEST_F(BrowseDialog, PicturesFollowTheUser) {
+    Run(kNoFiles, L"\\Temp", [](HWND dialog) {
+        for (const wchar_t* shown : {L"2*Temp", L"1*Temp"}) {
+            DoubleClick(dialog);
+            EXPECT_EQ(Items(dialog).back(), shown);
+        }
+        TreeView_SelectItem(TreeOf(dialog), TreeView_GetRoot(TreeOf(dialog)));
+        // A folder with something in it changes when it opens, not by the click.
+        DoubleClick(dialog);
+        EXPECT_EQ(Items(dialog)[0], L"2*CF Card");
+        SendMessageW(TreeOf(dialog), WM_KEYDOWN, VK_RIGHT, 0);
+        EXPECT_EQ(Items(dialog)[0], L"1*CF Card");
+        SendMessageW(TreeOf(dialog), WM_KEYDOWN, VK_LEFT, 0);
+        EXPECT_EQ(Items(dialog)[0], L"2*CF Card");
+    });
+}
+
 TEST_F(BrowseDialog, FileNameFieldKeepsTheNameOnlyInItsMode) {
-    testing::WriteTextFile(device_.PcPath(L"\\Temp\\d.job"), "");
     for (const int mode : {0, 1}) {
         Run(
-            L"job", L"\\Temp",
+            L"job", L"\\CF Card\\Jobs",
             [mode](HWND dialog) {
                 HWND tree = TreeOf(dialog);
-                TreeView_SelectItem(tree, TreeView_GetChild(tree, TreeView_GetSelection(tree)));
-                EXPECT_EQ(ItemText(dialog, IDC_BROWSE_FOLDER), L"\\Temp\\");
-                EXPECT_EQ(ItemText(dialog, IDC_BROWSE_FILE_NAME), L"d.job");
-                TreeView_SelectItem(tree, TreeView_GetRoot(tree));
+                HTREEITEM jobs = TreeView_GetSelection(tree);
+                HTREEITEM file = TreeView_GetChild(tree, jobs);
+                while (TreeView_GetNextSibling(tree, file) != nullptr) {
+                    file = TreeView_GetNextSibling(tree, file);
+                }
+                TreeView_SelectItem(tree, file);
+                EXPECT_EQ(ItemText(dialog, IDC_BROWSE_FOLDER), L"\\CF Card\\Jobs\\");
+                EXPECT_EQ(ItemText(dialog, IDC_BROWSE_FILE_NAME), L"c.job");
+                TreeView_SelectItem(tree, TreeView_GetParent(tree, jobs));
                 EXPECT_EQ(ItemText(dialog, IDC_BROWSE_FOLDER), L"\\CF Card\\");
-                EXPECT_EQ(ItemText(dialog, IDC_BROWSE_FILE_NAME), mode != 0 ? L"d.job" : L"");
+                EXPECT_EQ(ItemText(dialog, IDC_BROWSE_FILE_NAME), mode != 0 ? L"c.job" : L"");
+                TreeView_SelectItem(tree, nullptr);
+                EXPECT_EQ(ItemText(dialog, IDC_BROWSE_FOLDER), L"");
+                EXPECT_EQ(ItemText(dialog, IDC_BROWSE_FILE_NAME), L"");
             },
             mode);
     }
@@ -168,6 +184,7 @@ TEST_F(BrowseDialog, RefreshReadsAgainAndShowsItsMessage) {
         AwaitRead(dialog);
         EXPECT_TRUE(WaitUntil([&] { return boxes.Seen().size() == 1 && IsWindowEnabled(dialog); }));
         EXPECT_EQ(boxes.Seen()[0].text, kRefreshed);
+        EXPECT_EQ(boxes.Seen()[0].caption, L"Orvanelink");
         EXPECT_EQ(Items(dialog).back(), L" 1*new");
         EXPECT_EQ(ItemText(dialog, IDC_BROWSE_FOLDER), L"\\Temp\\");
     });
@@ -191,24 +208,33 @@ TEST_F(BrowseDialog, AFolderThatCannotBeReadEmptiesTheTreeAndIsToldOfFirst) {
     });
 }
 
-TEST_F(BrowseDialog, ContextMenuIsForTheItemUnderThePoint) {
+TEST_F(BrowseDialog, ContextMenuIsForTheItemUnderThePointOrTheSelectedOne) {
     Run(kNoFiles, L"", [](HWND dialog) {
         HWND tree = TreeOf(dialog);
         HTREEITEM temp = TreeView_GetNextSibling(tree, TreeView_GetRoot(tree));
         RECT label{};
         TreeView_GetItemRect(tree, temp, &label, TRUE);
-        for (const bool on_item : {false, true}) {
-            const LPARAM point = on_item ? MAKELPARAM(label.left + 2, label.top + 2) : MAKELPARAM(100, 150);
-            SendMessageW(tree, WM_RBUTTONDOWN, MK_RBUTTON, point);
-            PostMessageW(tree, WM_RBUTTONUP, 0, point);
+        const struct {
+            UINT message;
+            LPARAM point;
+            bool has_property;
+        } cases[] = {{WM_RBUTTONUP, MAKELPARAM(100, 150), false},
+                     {WM_RBUTTONUP, MAKELPARAM(label.left + 2, label.top + 2), true},
+                     {WM_CONTEXTMENU, -1, true}};
+        for (const auto& c : cases) {
+            if (c.message == WM_RBUTTONUP) {
+                SendMessageW(tree, WM_RBUTTONDOWN, MK_RBUTTON, c.point);
+            }
+            PostMessageW(tree, c.message, 0, c.point);
             HWND menu_window = nullptr;
             EXPECT_TRUE(WaitUntil([&] {
                 menu_window = FindWindowW(L"#32768", nullptr);
                 return menu_window != nullptr && IsWindowVisible(menu_window);
             }));
             const auto menu = reinterpret_cast<HMENU>(SendMessageW(menu_window, MN_GETHMENU, 0, 0));
-            EXPECT_EQ((GetMenuState(menu, IDM_TREE_PROPERTY, MF_BYCOMMAND) & MF_GRAYED) == 0, on_item);
-            EXPECT_EQ(TreeView_GetSelection(tree) == temp, on_item);
+            EXPECT_EQ(GetMenuItemID(menu, 1), static_cast<UINT>(IDM_TREE_REFRESH));
+            EXPECT_EQ((GetMenuState(menu, IDM_TREE_PROPERTY, MF_BYCOMMAND) & MF_GRAYED) == 0, c.has_property);
+            EXPECT_EQ(TreeView_GetSelection(tree) == temp, c.has_property);
             SendMessageW(tree, WM_CANCELMODE, 0, 0);
             EXPECT_TRUE(WaitUntil([&] { return !IsWindow(menu_window) || !IsWindowVisible(menu_window); }));
         }
@@ -216,21 +242,37 @@ TEST_F(BrowseDialog, ContextMenuIsForTheItemUnderThePoint) {
 }
 
 TEST_F(BrowseDialog, PropertyShowsTheSelectedItem) {
-    const std::wstring file = device_.PcPath(L"\\Temp\\A & B.job");
-    testing::WriteTextFile(file, "", testing::UtcTime(2001, 2, 3, 12));
-    SetFileAttributesW(file.c_str(), FILE_ATTRIBUTE_READONLY);
-    Run(L"job", L"\\Temp", [](HWND dialog) {
-        for (const bool is_file : {false, true}) {
+    const std::wstring big_file = device_.PcPath(L"\\Temp\\A & B.job");
+    testing::WriteTextFile(big_file, "");
+    std::filesystem::resize_file(big_file, 3'000'000'000);
+    const FILETIME written = testing::UtcTime(2001, 2, 3, 12);
+    {
+        const UniqueFile file(
+            CreateFileW(big_file.c_str(), FILE_WRITE_ATTRIBUTES, 0, nullptr, OPEN_EXISTING, 0, nullptr));
+        SetFileTime(file.Get(), nullptr, nullptr, &written);
+    }
+    SetFileAttributesW(big_file.c_str(), FILE_ATTRIBUTE_READONLY);
+    Run(L"job", L"\\Temp", [&written](HWND dialog) {
+        const struct {
+            const wchar_t* path;
+            const wchar_t* type;
+            const wchar_t* date_label;
+            bool is_big_file;
+        } cases[] = {{L"\\Temp", L"Folder", L"Created:", false},
+                     {L"\\Temp\\A & B.job", L"JOB File", L"Modified:", true}};
+        for (const auto& c : cases) {
             PostMessageW(TreeOf(dialog), WM_COMMAND, IDM_TREE_PROPERTY, 0);
             EXPECT_TRUE(WaitUntil([&] { return testing::DialogsBeside(dialog).size() == 2; }));
             HWND property = EnabledDialog(dialog);
-            EXPECT_EQ(ItemText(property, IDC_PROPERTY_PATH), is_file ? L"\\Temp\\A & B.job" : L"\\Temp");
-            EXPECT_EQ(ItemText(property, IDC_PROPERTY_TYPE), is_file ? L"JOB File" : L"Folder");
-            EXPECT_EQ(ItemText(property, IDC_PROPERTY_DATE_LABEL), is_file ? L"Modified:" : L"Created:");
-            EXPECT_EQ(ItemText(property, IDC_PROPERTY_DATE) == DateText(testing::UtcTime(2001, 2, 3, 12)),
-                      is_file);
-            EXPECT_EQ(IsWindowVisible(GetDlgItem(property, IDC_PROPERTY_SIZE)) != FALSE, is_file);
-            EXPECT_EQ(IsDlgButtonChecked(property, IDC_PROPERTY_READ_ONLY) != 0, is_file);
+            EXPECT_EQ(ItemText(property, IDC_PROPERTY_PATH), c.path);
+            EXPECT_EQ(ItemText(property, IDC_PROPERTY_TYPE), c.type);
+            EXPECT_EQ(ItemText(property, IDC_PROPERTY_DATE_LABEL), c.date_label);
+            EXPECT_EQ(ItemText(property, IDC_PROPERTY_DATE) == DateText(written), c.is_big_file);
+            EXPECT_EQ(IsWindowVisible(GetDlgItem(property, IDC_PROPERTY_SIZE)) != FALSE, c.is_big_file);
+            EXPECT_EQ(ItemText(property, IDC_PROPERTY_SIZE),
+                      c.is_big_file ? L"-1294967296 bytes" : L"0 bytes");
+            EXPECT_EQ(IsDlgButtonChecked(property, IDC_PROPERTY_READ_ONLY) != 0, c.is_big_file);
+            EXPECT_EQ(IsDlgButtonChecked(property, IDC_PROPERTY_HIDDEN), 0U);
             testing::Press(property, IDOK);
             EXPECT_TRUE(WaitUntil([&] { return IsWindowEnabled(dialog) != FALSE; }));
             TreeView_SelectItem(TreeOf(dialog),
@@ -255,6 +297,12 @@ TEST_F(BrowseDialog, AVeryDeepTreeEndsWhereItsPathsEnd) {
         EXPECT_GT(folder.size(), 250U);
         EXPECT_LE(folder.size(), 260U);
     });
+}
+
+TEST(DirTree, RefusesAFilterThatIsTooLong) {
+    UCeDirTree tree;
+    EXPECT_TRUE(tree.AddFilter(std::wstring(15, L'x')));
+    EXPECT_FALSE(tree.AddFilter(std::wstring(16, L'x')));
 }
 
 }  // namespace

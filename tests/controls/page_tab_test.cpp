@@ -17,21 +17,28 @@ constexpr int kTabId = 1046;
 struct TabWindow : ParentWindow {
     TabWindow() {
         tabs.Attach(AddControl(WC_TABCONTROLW, 0, kTabId, {0, 0, 400, 30}));
-        for (int tab = 0; tab < 2; ++tab) {
+        for (const wchar_t* text : {L"Mobile Device", L"PC"}) {
             TCITEMW item{};
+            item.mask = TCIF_TEXT;
+            item.pszText = const_cast<wchar_t*>(text);
             SendMessageW(tabs.Handle(), TCM_INSERTITEMW, 0, reinterpret_cast<LPARAM>(&item));
         }
         tabs.SetNotifyWindow(Handle());
-        EXPECT_FALSE(tabs.AttachControlToTab(first, 2));
-        EXPECT_TRUE(IsWindowVisible(first));
-        EXPECT_TRUE(tabs.AttachControlToTab(second, 1));
-        EXPECT_TRUE(tabs.AttachControlToTab(both, 1));
-        EXPECT_TRUE(tabs.AttachControlToTab(first, 0));
-        EXPECT_TRUE(tabs.AttachControlToTab(both, 0));
     }
 
+    void ClickTab(int tab) const {
+        RECT place{};
+        SendMessageW(tabs.Handle(), TCM_GETITEMRECT, static_cast<WPARAM>(tab),
+                     reinterpret_cast<LPARAM>(&place));
+        const LPARAM point = MAKELPARAM((place.left + place.right) / 2, (place.top + place.bottom) / 2);
+        SendMessageW(tabs.Handle(), WM_LBUTTONDOWN, MK_LBUTTON, point);
+        SendMessageW(tabs.Handle(), WM_LBUTTONUP, 0, point);
+    }
     std::vector<bool> Visible() const {
         return {IsWindowVisible(first) != 0, IsWindowVisible(second) != 0, IsWindowVisible(both) != 0};
+    }
+    std::vector<bool> Enabled() const {
+        return {IsWindowEnabled(first) != 0, IsWindowEnabled(second) != 0, IsWindowEnabled(both) != 0};
     }
 
     HWND first = AddControl(L"BUTTON", 0, 1, {0, 40, 50, 60});
@@ -40,27 +47,54 @@ struct TabWindow : ParentWindow {
     CSTabCtrl tabs;
 };
 
-TEST(PageTab, ShowsThePageThatIsSelectedAndTellsOfTheUsersSelection) {
+void AttachAll(TabWindow& window) {
+    EXPECT_TRUE(window.tabs.AttachControlToTab(window.second, 1));
+    EXPECT_TRUE(window.tabs.AttachControlToTab(window.both, 1));
+    EXPECT_TRUE(window.tabs.AttachControlToTab(window.first, 0));
+    EXPECT_TRUE(window.tabs.AttachControlToTab(window.both, 0));
+}
+
+TEST(PageTab, ShowsThePageThatIsSelected) {
     TabWindow window;
+    for (const int no_tab : {2, -1}) {
+        EXPECT_FALSE(window.tabs.AttachControlToTab(window.first, no_tab));
+        EXPECT_THAT(window.Visible(), ElementsAre(true, true, true)) << no_tab;
+    }
+    AttachAll(window);
     EXPECT_THAT(window.Visible(), ElementsAre(false, false, false)) << "whatever tab is selected";
-    window.tabs.SetCurSel(0);
+    EXPECT_EQ(window.tabs.SetCurSel(0), 1) << "what was inserted first was selected and moved on";
     EXPECT_THAT(window.Visible(), ElementsAre(true, false, true));
     EXPECT_EQ(window.tabs.SetCurSel(1), 0);
     EXPECT_THAT(window.Visible(), ElementsAre(false, true, true));
     EXPECT_THAT(window.Pump(), IsEmpty()) << "only the user's selections are told";
-    SendMessageW(window.tabs.Handle(), WM_LBUTTONDOWN, MK_LBUTTON, MAKELPARAM(10, 10));
+}
+
+TEST(PageTab, TellsOfTheUsersSelection) {
+    TabWindow window;
+    AttachAll(window);
+    window.tabs.SetCurSel(0);
+    window.ClickTab(1);
+    EXPECT_THAT(window.Visible(), ElementsAre(false, true, true));
+    EXPECT_THAT(window.Pump(), ElementsAre(ParentWindow::Posted{2021, kTabId, 1}));
+    window.tabs.SetNotifyWindow(nullptr);
+    window.ClickTab(0);
     EXPECT_THAT(window.Visible(), ElementsAre(true, false, true));
-    EXPECT_THAT(window.Pump(), ElementsAre(ParentWindow::Posted{2021, kTabId, 0}));
+    EXPECT_THAT(window.Pump(), IsEmpty());
 }
 
 TEST(PageTab, EnablesAllPagesWithItself) {
     TabWindow window;
-    for (const bool enabled : {false, true}) {
-        EnableWindow(window.tabs.Handle(), enabled);
-        for (HWND control : {window.first, window.second, window.both}) {
-            EXPECT_EQ(IsWindowEnabled(control) != FALSE, enabled);
-        }
-    }
+    AttachAll(window);
+    EXPECT_TRUE(window.tabs.EnableTabControls(0, false));
+    EXPECT_THAT(window.Enabled(), ElementsAre(false, true, false));
+    EXPECT_FALSE(window.tabs.EnableTabControls(2, false));
+    EnableWindow(window.tabs.Handle(), FALSE);
+    EXPECT_THAT(window.Enabled(), ElementsAre(false, false, false));
+    EnableWindow(window.tabs.Handle(), TRUE);
+    EXPECT_THAT(window.Enabled(), ElementsAre(true, true, true));
+    DestroyWindow(window.tabs.Handle());
+    EXPECT_FALSE(window.tabs.ShowTabControls(0, SW_SHOW)) << "the pages end with the window";
+    EXPECT_TRUE(IsWindow(window.first));
 }
 
 }  // namespace

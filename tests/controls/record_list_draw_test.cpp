@@ -1,6 +1,7 @@
 #include <gtest/gtest.h>
 
-#include "platform/handles.h"
+#include "controls/color_swatch.h"
+#include "controls/record_list.h"
 #include "tests/controls/list_window.h"
 
 namespace orvane::testing {
@@ -9,58 +10,130 @@ namespace {
 constexpr COLORREF kBlack = RGB(0, 0, 0);
 constexpr COLORREF kWhite = RGB(255, 255, 255);
 
-// How many pixels of this colour the window paints in the rectangle.
-int Count(HWND window, const RECT& part, COLORREF color) {
-    HDC window_dc = GetDC(window);
-    UniqueBitmap bitmap;
-    UniqueMemoryDc dc;
-    bitmap.Reset(CreateCompatibleBitmap(window_dc, part.right, part.bottom));
-    dc.Reset(CreateCompatibleDC(window_dc));
-    ReleaseDC(window, window_dc);
-    SelectObject(dc.Get(), bitmap.Get());
-    SendMessageW(window, WM_PRINTCLIENT, reinterpret_cast<WPARAM>(dc.Get()), PRF_CLIENT | PRF_ERASEBKGND);
-    int count = 0;
-    for (int y = part.top; y < part.bottom; ++y) {
-        for (int x = part.left; x < part.right; ++x) {
-            count += GetPixel(dc.Get(), x, y) == color ? 1 : 0;
+// The frame of a tick picture in a cell of the tick column, which is 20 pixels wide.
+RECT TickFrame(const RECT& cell) {
+    const int top = (cell.top + cell.bottom - 10) / 2;
+    return {cell.left + 5, top, cell.left + 15, top + 10};
+}
+
+TEST(RecordListDraw, TickedEntriesLookTicked) {
+    ListWindow window(1039, LVS_SHOWSELALWAYS);
+    window.Fill({{L"a", L"", true}, {L"b", L"", false}, {L"c", L"", true}, {L"d", L"", false}});
+    window.list.SelectItem(2);
+    ListView_SetItemState(window.list.Handle(), 3, LVIS_SELECTED, LVIS_SELECTED);
+    SetFocus(window.Handle());
+    const Picture picture(window.list.Handle());
+    const COLORREF highlight = GetSysColor(COLOR_HIGHLIGHT);
+    const struct {
+        COLORREF mark;
+        COLORREF background;
+        bool ticked;
+    } rows[] = {{kBlack, kWhite, true},
+                {kBlack, kWhite, false},
+                {kWhite, highlight, true},
+                {kWhite, highlight, false}};
+    for (int row = 0; row < 4; ++row) {
+        RECT inside = TickFrame(window.Cell(row, 2));
+        InflateRect(&inside, -1, -1);
+        const int marked = picture.Count(inside, rows[row].mark);
+        EXPECT_EQ(marked > 8, rows[row].ticked) << row;
+        EXPECT_EQ(marked + picture.Count(inside, rows[row].background), 64) << row;
+        RECT outside = window.Cell(row, 2);
+        outside.right = outside.left + 5;
+        EXPECT_EQ(picture.Count(outside, rows[row].background), 5 * (outside.bottom - outside.top)) << row;
+    }
+}
+
+TEST(RecordListDraw, SelectionFollowsFocusAndTextFollowsKind) {
+    ListWindow window;
+    window.list.SetColumnKind(0, kColumnText);
+    window.list.SetColumnKind(1, kColumnBlueText1);
+    window.Fill({{L"mmmm", L"MMMM", false}});
+    window.list.SelectItem(0);
+    const COLORREF highlight = GetSysColor(COLOR_HIGHLIGHT);
+    // Letters are smoothed: what is looked for are their darkest pixels.
+    const struct {
+        bool focus;
+        COLORREF background;
+        COLORREF text[2];
+    } cases[] = {{false, kWhite, {kBlack, RGB(0, 0, 255)}}, {true, highlight, {kWhite, kWhite}}};
+    for (const auto& expected : cases) {
+        SetFocus(expected.focus ? window.list.Handle() : window.Handle());
+        const Picture picture(window.list.Handle());
+        for (int column = 0; column < 2; ++column) {
+            RECT cell = window.Cell(0, column);
+            InflateRect(&cell, -1, -1);
+            EXPECT_GT(picture.Count(cell, expected.background), 1000) << column;
+            EXPECT_GT(picture.Count(cell, expected.text[column]), 10) << column;
+            cell.right = cell.left + 8;
+            EXPECT_EQ(picture.Count(cell, expected.background), 8 * (cell.bottom - cell.top)) << "inset";
         }
     }
-    return count;
+    ListView_SetItemState(window.list.Handle(), 0, LVIS_DROPHILITED, LVIS_DROPHILITED);
+    SetFocus(window.Handle());
+    EXPECT_GT(Picture(window.list.Handle()).Count(window.Cell(0, 0), highlight), 1000);
 }
 
-TEST(RecordListDraw, ShowsTicksKindsAndTheSelection) {
-    ListWindow window;
-    HWND list = window.list.Handle();
-    window.list.SetColumnKind(1, kColumnBlueText1);
-    window.Fill({{L"mm", L"MM", true}, {L"mm", L"MM", false}, {L"mm", L"MM", true}, {L"mm", L"MM", false}});
-    window.list.SelectAll();
-    ListView_SetItemState(list, 0, 0, LVIS_SELECTED);
-    ListView_SetItemState(list, 1, 0, LVIS_SELECTED);
-    SetFocus(list);
-    for (int row = 0; row < 4; ++row) {
-        const COLORREF background = row < 2 ? kWhite : GetSysColor(COLOR_HIGHLIGHT);
-        const COLORREF mark = row < 2 ? kBlack : kWhite;
-        const RECT tick = window.Cell(row, 2);
-        const int top = (tick.top + tick.bottom - 10) / 2;
-        const RECT inside = {tick.left + 6, top + 1, tick.left + 14, top + 9};
-        const int marked = Count(list, inside, mark);
-        EXPECT_EQ(marked > 8, window.records[static_cast<std::size_t>(row)].ticked) << row;
-        EXPECT_EQ(marked + Count(list, inside, background), 64) << row;
-        // Letters are smoothed: what is looked for are their darkest pixels.
-        EXPECT_GT(Count(list, window.Cell(row, 1), row < 2 ? RGB(0, 0, 255) : kWhite), 10) << row;
-        EXPECT_GT(Count(list, window.Cell(row, 1), background), 500) << row;
-    }
-}
-
-TEST(RecordListDraw, TheSortMarkIsInTheColumnSorted) {
+TEST(RecordListDraw, SortMark) {
     ListWindow window;
     HWND header = ListView_GetHeader(window.list.Handle());
+    const COLORREF light = GetSysColor(COLOR_3DHILIGHT);
+    const COLORREF dark = GetSysColor(COLOR_3DSHADOW);
+    HDC dc = GetDC(header);
+    HGDIOBJ font = SelectObject(dc, reinterpret_cast<HFONT>(SendMessageW(header, WM_GETFONT, 0, 0)));
+    SIZE blank{};
+    GetTextExtentPoint32W(dc, L" ", 1, &blank);
+    SelectObject(dc, font);
+    ReleaseDC(header, dc);
+    const int unit = 2 * blank.cx;
     RECT item{};
     Header_GetItemRect(header, 0, &item);
-    item.left = item.right - 20;
-    for (const int sorted : {1, 0}) {
-        window.ClickHeader(sorted);
-        EXPECT_EQ(Count(header, item, GetSysColor(COLOR_3DHILIGHT)) > 5, sorted == 0);
+    const int right = item.right - 1;
+    const int bottom = item.bottom - 1;
+    const RECT room{right - 3 * unit, 0, item.right, item.bottom};
+
+    EXPECT_EQ(Picture(header).Count(room, light), 0) << "no mark before the first sort";
+    window.ClickHeader(0);
+    const Picture up(header);
+    // The triangle's base: light below, its ends included but for the pixel after the last.
+    for (int x = right - 5 * unit / 2 - 1; x <= right - 3 * unit / 2; ++x) {
+        EXPECT_EQ(up.At(x, bottom - unit), light) << x;
+    }
+    EXPECT_EQ(up.At(right - 5 * unit / 2 - 1, bottom - unit - 1), dark);
+    window.ClickHeader(0);
+    const Picture down(header);
+    for (int x = right - 5 * unit / 2 - 1; x < right - 3 * unit / 2; ++x) {
+        EXPECT_EQ(down.At(x, unit - 1), dark) << x;
+    }
+    EXPECT_EQ(down.At(right - 3 * unit / 2, unit - 1), light);
+    window.ClickHeader(1);
+    EXPECT_EQ(Picture(header).Count(room, light), 0) << "the mark moves to the other column";
+}
+
+TEST(ColorSwatch, TextStandsOut) {
+    const struct {
+        std::optional<COLORENTRY> entry;
+        COLORREF fill;
+        COLORREF text;
+    } cases[] = {{std::nullopt, kWhite, kBlack},
+                 {COLORENTRY{RGB(255, 127, 1), 3}, RGB(255, 127, 1), kWhite},
+                 {COLORENTRY{RGB(255, 128, 1), 3}, RGB(255, 128, 1), kBlack}};
+    for (const auto& swatch : cases) {
+        ParentWindow window;
+        HDC dc = GetDC(window.Handle());
+        RECT cell{0, 0, 60, 30};
+        FillRect(dc, &cell, static_cast<HBRUSH>(GetStockObject(GRAY_BRUSH)));
+        DrawColorSwatch(dc, cell, swatch.entry ? &*swatch.entry : nullptr);
+        EXPECT_EQ(GetPixel(dc, 1, 1), RGB(128, 128, 128));
+        EXPECT_EQ(GetPixel(dc, 2, 2), swatch.fill);
+        int text_pixels = 0;
+        for (int x = 20; x < 40; ++x) {
+            for (int y = 5; y < 25; ++y) {
+                text_pixels += GetPixel(dc, x, y) == swatch.text ? 1 : 0;
+            }
+        }
+        EXPECT_GT(text_pixels, 3) << swatch.fill;
+        ReleaseDC(window.Handle(), dc);
     }
 }
 

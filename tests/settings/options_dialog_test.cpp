@@ -21,13 +21,18 @@ using testing::Press;
 const std::wstring kKey = L"Software\\Veltrano\\CE Devices";
 const std::wstring kAutoStartKey = L"SOFTWARE\\Microsoft\\Windows CE Services\\AutoStartOnConnect";
 
-// The boxes in the order of the block.
-constexpr std::array kIds = {1021, 1022, 1023, 1024, 1025, 1027, 1029, 1026,
-                             1038, 1039, 1040, 1028, 1030, 1031, 1032, 1033};
+// The boxes in the order of the block, which has all but the last.
+constexpr std::array kIds = {1021, 1022, 1023, 1024, 1025, 1027, 1029, 1026, 1038,
+                             1039, 1040, 1028, 1030, 1031, 1032, 1033, 1041};
 constexpr std::size_t kCount = kIds.size();
 constexpr std::array<const wchar_t*, kCount> kNames = {L"qvj", L"tn3", L"rd3", L"pt3", L"ln3",  L"jpg",
                                                        L"bmp", L"all", L"old", L"bkp", L"warn", L"img",
-                                                       L"xml", L"tp3", L"wkf", L"txt"};
+                                                       L"xml", L"tp3", L"wkf", L"txt", L"view"};
+constexpr std::array<const wchar_t*, kCount> kValues = {
+    L"Sync_qvj_files", L"Sync_tn3_files", L"Sync_rd3_files", L"Sync_pt3_files",      L"Sync_ln3_files",
+    L"Sync_jpg_files", L"Sync_bmp_files", L"Sync_all_files", L"Overwrite_old_files", L"Overwrite_bkp",
+    L"Overwrite_warn", L"Sync_img_files", L"Sync_xml_files", L"Sync_tp3_files",      L"Sync_wkf_files",
+    L"Sync_txt_files", L"Start_File_View"};
 
 using Boxes = std::bitset<kCount>;
 
@@ -47,6 +52,7 @@ Boxes Named(std::wstring_view names) {
 const Boxes kAll = Named(L"all");
 const Boxes kOverwrite = Named(L"old");
 const Boxes kWarn = Named(L"warn");
+const Boxes kDependent = Named(L"warn bkp");
 const Boxes kTypes = Named(L"qvj tn3 rd3 pt3 ln3 jpg bmp img xml tp3 wkf txt");
 
 Boxes Ticked(HWND dialog) {
@@ -101,23 +107,21 @@ class OptionsDialog : public ::testing::Test {
     }
     ~OptionsDialog() override { DestroyWindow(owner_); }
 
-    // What the dialog begins with.
+    // What the dialog begins with. It does not look at the folders that are stored.
     void Set(const Boxes& ticked, const std::wstring& pc_folder = L"C:\\") {
         block_.sync_path_dt = pc_folder;
         block_.sync_path_ce = L"\\Jobs\\";
+        RegWriteString(HKEY_CURRENT_USER, kKey, L"SyncPath_DT", L"C:\\stored");
+        RegWriteString(HKEY_CURRENT_USER, kKey, L"SyncPath_CE", L"\\stored");
         for (std::size_t i = 0; i < kCount; ++i) {
-            (&block_.sync_qvj_files)[i] = ticked[i] ? L"1" : L"0";
+            RegWriteString(HKEY_CURRENT_USER, kKey, kValues[i], ticked[i] ? L"1" : L"0");
+            if (i + 1 < kCount) {
+                (&block_.sync_qvj_files)[i] = ticked[i] ? L"1" : L"0";
+            }
         }
     }
-    // After OK the block is what the user made of it.
-    bool Run(const std::function<void(HWND)>& script) {
-        std::optional<SyncSettings> saved;
-        testing::RunWithScript([&] { return (saved = RunOptions(owner_, block_)) ? IDOK : IDCANCEL; },
-                               script);
-        if (saved) {
-            RefreshSettingsBlock(*saved, block_);
-        }
-        return saved.has_value();
+    void Run(const std::function<void(HWND)>& script) {
+        testing::RunWithScript([&] { return RunOptions(owner_, block_) ? IDOK : IDCANCEL; }, script);
     }
 
     testing::ScratchRegistry registry_;
@@ -128,37 +132,51 @@ class OptionsDialog : public ::testing::Test {
 };
 
 TEST_F(OptionsDialog, TypeBoxesDecideOnAllFiles) {
-    const Boxes some = Named(L"tn3 bmp xml txt");
+    // Boxes with handlers of a kind, the box that these read if not the clicked one, the ones they overlook.
     const struct {
-        int clicked;
-        Boxes before, after;
-    } cases[] = {{IDC_OPTIONS_QVJ, kTypes ^ Named(L"qvj"), kTypes | kAll},
-                 {IDC_OPTIONS_QVJ, kTypes | kAll, kTypes ^ Named(L"qvj")},
-                 {IDC_OPTIONS_QVJ, some | kAll, some | kAll | Named(L"qvj")},
-                 {IDC_OPTIONS_BMP, kTypes ^ Named(L"bmp"), kTypes},
-                 // These overlook that box,
-                 {IDC_OPTIONS_IMG, kTypes ^ Named(L"bmp img"), (kTypes | kAll) ^ Named(L"bmp")},
-                 // and this one itself, too; it goes by its neighbour.
-                 {IDC_OPTIONS_TXT, kTypes, (kTypes | kAll) ^ Named(L"txt")},
-                 {IDC_OPTIONS_TXT, (kTypes | kAll) ^ Named(L"wkf txt"), kTypes ^ Named(L"wkf")},
-                 {IDC_OPTIONS_SELECT_ALL, some | kWarn | kOverwrite, kTypes | kWarn | kOverwrite},
-                 {IDC_OPTIONS_ALL_FILES, some | kOverwrite, kTypes | kAll | kOverwrite},
-                 {IDC_OPTIONS_ALL_FILES, kTypes | kAll, Boxes()}};
+        Boxes clicked, read, overlooked;
+    } handlers[] = {{Named(L"qvj tn3 rd3 pt3 ln3 jpg"), {}, {}},
+                    {Named(L"img xml tp3 wkf"), {}, Named(L"bmp")},
+                    {Named(L"txt"), Named(L"wkf"), Named(L"bmp txt")}};
     COptionsDlg dialog(block_, owner_);
     ASSERT_TRUE(dialog.Create());
-    for (const auto& c : cases) {
-        Tick(dialog.Handle(), c.before);
-        Click(dialog.Handle(), c.clicked);
-        EXPECT_EQ(Ticked(dialog.Handle()), c.after) << (&c - cases);
+    // Every type is clicked with any other one unticked or none, in all combinations with "All files.".
+    for (std::size_t run = 0; run < 4 * kCount * kCount; ++run) {
+        const std::size_t clicked = run / 4 / kCount;
+        const Boxes all_before = (run & 1U) != 0 ? kAll : Boxes();
+        const Boxes types = Boxes(kTypes).reset(run / 4 % kCount).set(clicked, (run & 2U) != 0);
+        Boxes all = all_before;
+        for (const auto& handler : handlers) {
+            if (handler.clicked[clicked]) {
+                const Boxes read = handler.read.any() ? handler.read : Boxes().set(clicked);
+                const bool ticks = (types | handler.overlooked) == kTypes;
+                all = (types & read).none() ? Boxes() : ticks ? kAll : all_before;
+            }
+        }
+        if (kTypes[clicked]) {
+            Tick(dialog.Handle(), (types | all_before).flip(clicked));
+            Click(dialog.Handle(), kIds[clicked]);
+            EXPECT_EQ(Ticked(dialog.Handle()), types | all) << kNames[clicked] << " " << all_before;
+        }
+    }
+}
+
+TEST_F(OptionsDialog, SelectAllAndAllFilesTickEveryType) {
+    Set(Named(L"bmp") | kWarn | kOverwrite);
+    COptionsDlg dialog(block_, owner_);
+    ASSERT_TRUE(dialog.Create());
+    for (const Boxes& expected : {kTypes, kTypes | kAll, Boxes()}) {
+        Click(dialog.Handle(), expected == kTypes ? IDC_OPTIONS_SELECT_ALL : IDC_OPTIONS_ALL_FILES);
+        EXPECT_EQ(Ticked(dialog.Handle()), expected | kWarn | kOverwrite);
     }
 }
 
 TEST_F(OptionsDialog, WarningAndBackupDependOnOverwriting) {
-    for (bool on : {false, true}) {
-        const Boxes at_start = Named(on ? L"old warn bkp" : L"warn bkp");
+    for (const Boxes& at_start : {kDependent, kDependent | kOverwrite}) {
         Set(at_start);
         COptionsDlg dialog(block_, owner_);
         ASSERT_TRUE(dialog.Create());
+        bool on = at_start != kDependent;
         EXPECT_EQ(Ticked(dialog.Handle()), on ? at_start : Boxes());
         for (int clicks = 0; clicks < 2; ++clicks, on = !on) {
             EXPECT_EQ(IsWindowEnabled(GetDlgItem(dialog.Handle(), IDC_OPTIONS_WARN)) != FALSE, on);
@@ -171,45 +189,49 @@ TEST_F(OptionsDialog, WarningAndBackupDependOnOverwriting) {
 }
 
 TEST_F(OptionsDialog, OkStoresAndCancelDoesNot) {
-    for (std::size_t run = 0; run < kCount; ++run) {
-        const Boxes made = Boxes(1) << run;
-        RegWriteString(HKEY_CURRENT_USER, kKey, L"SyncPath_CE", L"\\stored");
-        Set(kTypes);
-        EXPECT_TRUE(Run([&](HWND dialog) {
-            EXPECT_EQ(Ticked(dialog), kTypes);
+    // An empty folder on the device leaves the one that is stored.
+    const std::array<std::array<const wchar_t*, 2>, 3> folders = {
+        {{L"\\typed\\\\", L"\\typed\\"}, {L"", L"\\stored"}, {L"\\", L"\\"}}};
+    for (std::size_t run = 0; run < 2 * kCount; ++run) {
+        const bool ok = run % 2 == 0;
+        const auto& [typed, stored] = folders[run / 2 % folders.size()];
+        const Boxes box = Boxes(1) << run / 2;
+        const Boxes ticked = (box & kDependent).any() ? box | kOverwrite : box;
+        Set(ticked);
+        Run([&](HWND dialog) {
+            EXPECT_EQ(Ticked(dialog), ticked);
             EXPECT_EQ(Folders(dialog), L"C:\\ \\Jobs\\");
-            Type(dialog, L"C:\\typed", run % 2 == 0 ? L"\\typed\\\\" : L"");
-            Tick(dialog, made);
-            CheckDlgButton(dialog, IDC_OPTIONS_START_FILE_VIEW, run % 2 == 0 ? BST_CHECKED : BST_UNCHECKED);
-            Press(dialog, IDOK);
-        }));
-        EXPECT_EQ(ReadStartFileView(), run % 2 == 0);
-        EXPECT_EQ(Those([this](std::size_t i) { return IsOn((&block_.sync_qvj_files)[i]); }), made);
-        EXPECT_EQ(Stored(L"SyncPath_CE"), run % 2 == 0 ? L"\\typed\\" : L"\\stored");
+            Type(dialog, L"C:\\typed", typed);
+            Tick(dialog, ticked ^ kOverwrite);
+            Press(dialog, ok ? IDOK : IDCANCEL);
+        });
+        const Boxes stored_boxes = Those([](std::size_t i) { return Stored(kValues[i]) == L"1"; });
+        EXPECT_EQ(stored_boxes, ok ? ticked ^ kOverwrite : ticked);
+        EXPECT_EQ(Stored(L"SyncPath_DT"), ok ? L"C:\\typed\\" : L"C:\\stored");
+        EXPECT_EQ(Stored(L"SyncPath_CE"), ok ? stored : L"\\stored");
     }
-    EXPECT_FALSE(Run([](HWND dialog) {
-        Type(dialog, L"C:\\cancelled", L"\\cancelled");
-        Press(dialog, IDCANCEL);
-    }));
-    EXPECT_EQ(Stored(L"SyncPath_DT"), L"C:\\typed\\");
-    EXPECT_EQ(Stored(L"SyncPath_CE"), L"\\stored");
 }
 
 TEST_F(OptionsDialog, AutoStartFollowsTheBoxAfterOkOnly) {
     constexpr const wchar_t* kValue = L"ORVANE ActiveSync";
     std::array<wchar_t, MAX_PATH> program{};
     GetModuleFileNameW(nullptr, program.data(), MAX_PATH);
-    for (const bool was_on : {false, true}) {
-        for (const bool ok : {false, true}) {
-            RegWriteString(HKEY_LOCAL_MACHINE, kAutoStartKey, kValue, was_on ? L"C:\\elsewhere.exe" : L"");
-            Run([&](HWND dialog) {
-                EXPECT_EQ(IsDlgButtonChecked(dialog, IDC_OPTIONS_AUTO_START) != 0, was_on);
+    for (const unsigned run : {0U, 1U, 2U, 3U, 4U, 5U, 6U, 7U}) {
+        const bool was_on = (run & 1U) != 0;
+        const bool toggled = (run & 2U) != 0;
+        const bool ok = (run & 4U) != 0;
+        RegWriteString(HKEY_LOCAL_MACHINE, kAutoStartKey, kValue, was_on ? L"C:\\elsewhere.exe" : L"");
+        Run([&](HWND dialog) {
+            EXPECT_EQ(IsDlgButtonChecked(dialog, IDC_OPTIONS_AUTO_START) != 0, was_on);
+            if (toggled) {
                 Click(dialog, IDC_OPTIONS_AUTO_START);
                 Click(dialog, IDC_OPTIONS_SELECT_ALL);  // Takes the values of all boxes.
-                Press(dialog, ok ? IDOK : IDCANCEL);
-            });
-            EXPECT_EQ(Stored(kValue, HKEY_LOCAL_MACHINE, kAutoStartKey), was_on != ok ? program.data() : L"");
-        }
+            }
+            Press(dialog, ok ? IDOK : IDCANCEL);
+        });
+        EXPECT_EQ(Stored(kValue, HKEY_LOCAL_MACHINE, kAutoStartKey),
+                  was_on != (toggled && ok) ? program.data() : L"")
+            << run;
     }
 }
 
@@ -221,13 +243,21 @@ TEST_F(OptionsDialog, OnlyAChosenPcFolderDropsWhatWasTyped) {
         const struct {
             int browse, button;
             std::wstring start, folders;
-        } runs[] = {{IDC_OPTIONS_PC_BROWSE, IDCANCEL, pc_folder.Path(), L"C:\\a \\jobs\\north\\b"},
-                    {IDC_OPTIONS_PC_BROWSE, IDOK, pc_folder.Path(), pc_folder.Path() + L" \\Jobs\\"},
-                    {IDC_OPTIONS_DEVICE_BROWSE, IDOK, L"\\Jobs\\North\\", L"C:\\a \\Jobs\\North\\"}};
+            Boxes ticked;
+        } runs[] = {
+            {IDC_OPTIONS_PC_BROWSE, IDCANCEL, pc_folder.Path(), L"C:\\a \\jobs\\north\\b",
+             kWarn | kOverwrite},
+            {IDC_OPTIONS_PC_BROWSE, IDOK, pc_folder.Path(), pc_folder.Path() + L" \\Jobs\\", kOverwrite},
+            {IDC_OPTIONS_DEVICE_BROWSE, IDCANCEL, L"\\Jobs\\North\\", L"C:\\a \\jobs\\north\\b",
+             kWarn | kOverwrite},
+            {IDC_OPTIONS_DEVICE_BROWSE, IDOK, L"\\Jobs\\North\\", L"C:\\a \\Jobs\\North\\",
+             kWarn | kOverwrite}};
         for (const auto& run : runs) {
             Type(dialog, L"C:\\a", L"\\jobs\\north\\b");
+            Tick(dialog, kWarn | kOverwrite);
             Browse(dialog, run.browse, run.button, run.start);
             EXPECT_EQ(Folders(dialog), run.folders);
+            EXPECT_EQ(Ticked(dialog), run.ticked);
         }
     });
 }

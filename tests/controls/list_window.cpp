@@ -1,0 +1,144 @@
+#include "tests/controls/list_window.h"
+
+#include "platform/resources.h"
+
+namespace orvane::testing {
+
+namespace {
+
+constexpr wchar_t kClassName[] = L"orvane_controls_test";
+
+LRESULT CALLBACK ParentProcedure(HWND window, UINT message, WPARAM wparam, LPARAM lparam) {
+    if (const auto reflected = ui::Control::Reflect(window, message, wparam, lparam)) {
+        return *reflected;
+    }
+    return DefWindowProcW(window, message, wparam, lparam);
+}
+
+}  // namespace
+
+ParentWindow::ParentWindow() {
+    WNDCLASSW window_class{};
+    window_class.lpfnWndProc = ParentProcedure;
+    window_class.hInstance = ResourceModule();
+    window_class.lpszClassName = kClassName;
+    RegisterClassW(&window_class);
+    window_ = CreateWindowExW(0, kClassName, L"", WS_POPUP | WS_VISIBLE | WS_CLIPCHILDREN, 0, 0, 500, 300,
+                              nullptr, nullptr, ResourceModule(), nullptr);
+}
+
+HWND ParentWindow::AddControl(const wchar_t* class_name, DWORD style, int id, const RECT& place) const {
+    return CreateWindowExW(0, class_name, L"", WS_CHILD | WS_VISIBLE | style, place.left, place.top,
+                           place.right - place.left, place.bottom - place.top, window_,
+                           reinterpret_cast<HMENU>(static_cast<INT_PTR>(id)), ResourceModule(), nullptr);
+}
+
+std::vector<ParentWindow::Posted> ParentWindow::Pump() {
+    MSG message{};
+    while (PeekMessageW(&message, nullptr, 0, 0, PM_REMOVE)) {
+        if (message.hwnd == window_ && message.message >= WM_USER && message.message < WM_APP) {
+            posted_.push_back({message.message, message.wParam, message.lParam});
+        }
+        DispatchMessageW(&message);
+    }
+    return std::exchange(posted_, {});
+}
+
+ListWindow::ListWindow(int control_id, DWORD extra_style) {
+    HWND window =
+        AddControl(WC_LISTVIEWW, LVS_REPORT | LVS_OWNERDRAWFIXED | extra_style, control_id, {0, 0, 480, 280});
+    list.Attach(window);
+    list.SetNotifyWindow(Handle());
+    list.SetSortEnabled(true);
+    list.SetColumnCount(3);
+    list.SetColumnKind(2, kColumnCheckBox);
+    const std::pair<const wchar_t*, int> columns[] = {{L"File Name", 300}, {L"Date", 130}, {L" ", 20}};
+    for (int index = 0; index < 3; ++index) {
+        LVCOLUMNW column{};
+        column.mask = LVCF_TEXT | LVCF_WIDTH | LVCF_FMT;
+        column.pszText = const_cast<wchar_t*>(columns[index].first);
+        column.cx = columns[index].second;
+        SendMessageW(window, LVM_INSERTCOLUMNW, static_cast<WPARAM>(index),
+                     reinterpret_cast<LPARAM>(&column));
+    }
+}
+
+void ListWindow::Fill(std::vector<SortedListRecord> new_records) {
+    records = std::move(new_records);
+    list.SetItems(records);
+}
+
+void ListWindow::ClickHeader(int column) const {
+    NMLISTVIEW click{};
+    click.hdr.hwndFrom = list.Handle();
+    click.hdr.idFrom = static_cast<UINT_PTR>(GetDlgCtrlID(list.Handle()));
+    click.hdr.code = LVN_COLUMNCLICK;
+    click.iItem = -1;
+    click.iSubItem = column;
+    SendMessageW(Handle(), WM_NOTIFY, click.hdr.idFrom, reinterpret_cast<LPARAM>(&click));
+}
+
+RECT ListWindow::Cell(int row, int column) const {
+    RECT cell{};
+    cell.left = LVIR_BOUNDS;
+    cell.top = column;
+    SendMessageW(list.Handle(), LVM_GETSUBITEMRECT, static_cast<WPARAM>(row),
+                 reinterpret_cast<LPARAM>(&cell));
+    return cell;
+}
+
+void ListWindow::Mouse(UINT message, int row, int column) const {
+    const RECT cell = Cell(row, column);
+    const int x = column == 0 ? cell.left + 20 : (cell.left + cell.right) / 2;
+    SendMessageW(list.Handle(), message, MK_LBUTTON, MAKELPARAM(x, (cell.top + cell.bottom) / 2));
+}
+
+std::vector<std::wstring> ListWindow::FirstTexts() const {
+    std::vector<std::wstring> texts;
+    for (int row = 0; row < list.ItemCount(); ++row) {
+        texts.push_back(Text(row, 0));
+    }
+    return texts;
+}
+
+std::wstring ListWindow::Text(int row, int column) const {
+    wchar_t text[300] = L"";
+    LVITEMW item{};
+    item.iSubItem = column;
+    item.pszText = text;
+    item.cchTextMax = 300;
+    SendMessageW(list.Handle(), LVM_GETITEMTEXTW, static_cast<WPARAM>(row), reinterpret_cast<LPARAM>(&item));
+    return text;
+}
+
+std::vector<SortedListRecord> ManyRecords(int count) {
+    std::vector<SortedListRecord> records;
+    for (int number = 0; number < count; ++number) {
+        // 7919 is prime to the counts in use: every name once, out of order.
+        records.push_back({L"Job" + std::to_wstring(number * 7919 % count) + L".qvj", L"01/02/2012", false});
+    }
+    return records;
+}
+
+Picture::Picture(HWND window) {
+    RECT client{};
+    GetClientRect(window, &client);
+    HDC window_dc = GetDC(window);
+    bitmap_.Reset(CreateCompatibleBitmap(window_dc, client.right, client.bottom));
+    dc_.Reset(CreateCompatibleDC(window_dc));
+    ReleaseDC(window, window_dc);
+    SelectObject(dc_.Get(), bitmap_.Get());
+    SendMessageW(window, WM_PRINTCLIENT, reinterpret_cast<WPARAM>(dc_.Get()), PRF_CLIENT | PRF_ERASEBKGND);
+}
+
+int Picture::Count(const RECT& part, COLORREF color) const {
+    int count = 0;
+    for (int y = part.top; y < part.bottom; ++y) {
+        for (int x = part.left; x < part.right; ++x) {
+            count += At(x, y) == color ? 1 : 0;
+        }
+    }
+    return count;
+}
+
+}  // namespace orvane::testing
