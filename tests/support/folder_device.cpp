@@ -2,7 +2,7 @@
 
 #include <gtest/gtest.h>
 
-#include <algorithm>
+#include <filesystem>
 #include <sstream>
 
 namespace orvane::testing {
@@ -11,43 +11,29 @@ namespace {
 
 constexpr std::wstring_view kPrefix = L"FOLDER_DEVICE_";
 
-std::wstring Widen(const std::string& bytes) {
-    const int size = static_cast<int>(bytes.size());
-    std::wstring text(
-        static_cast<std::size_t>(MultiByteToWideChar(CP_UTF8, 0, bytes.data(), size, nullptr, 0)), L'\0');
-    MultiByteToWideChar(CP_UTF8, 0, bytes.data(), size, text.data(), static_cast<int>(text.size()));
-    return text;
-}
-
 std::vector<std::wstring> SplitAt(const std::wstring& text, const std::wstring& separator) {
     std::vector<std::wstring> pieces;
     std::size_t begin = 0;
-    for (std::size_t end = text.find(separator); end != std::wstring::npos;
-         end = text.find(separator, begin)) {
+    for (std::size_t end = 0; end != std::wstring::npos; begin = end + separator.size()) {
+        end = text.find(separator, begin);
         pieces.push_back(text.substr(begin, end - begin));
-        begin = end + separator.size();
     }
-    pieces.push_back(text.substr(begin));
     return pieces;
 }
 
 TraceLine ParseTraceLine(const std::wstring& text) {
     const std::vector<std::wstring> columns = SplitAt(text, L"\t");
-    TraceLine line;
     if (columns.size() != 7) {
         ADD_FAILURE() << "not a line of the trace: " << columns.size() << " columns";
-        return line;
+        return {};
     }
-    line.number = std::stoull(columns[0]);
-    line.thread = std::stoul(columns[1]);
-    line.sessions = std::stoul(columns[2]);
-    line.function = columns[3];
-    if (!columns[4].empty()) {
-        line.arguments = SplitAt(columns[4], L" | ");
-    }
-    line.result = std::stoull(columns[5], nullptr, 0);
-    line.error = std::stoul(columns[6], nullptr, 0);
-    return line;
+    return {.number = std::stoull(columns[0]),
+            .thread = std::stoul(columns[1]),
+            .sessions = std::stoul(columns[2]),
+            .function = columns[3],
+            .arguments = columns[4].empty() ? std::vector<std::wstring>() : SplitAt(columns[4], L" | "),
+            .result = std::stoull(columns[5], nullptr, 0),
+            .error = std::stoul(columns[6], nullptr, 0)};
 }
 
 }  // namespace
@@ -57,7 +43,7 @@ FolderDevice::FolderDevice() : library_(LoadLibraryW(L"RAPI.DLL")) {
         reinterpret_cast<void*>(GetProcAddress(library_, "CeRapiInitEx")));
     uninit_ = reinterpret_cast<rapi::CeRapiUninit*>(
         reinterpret_cast<void*>(GetProcAddress(library_, "CeRapiUninit")));
-    if (init_ == nullptr || uninit_ == nullptr) {
+    if (init_ == nullptr) {
         ADD_FAILURE() << "RAPI.DLL of the folder device is not on the PATH";
         return;
     }
@@ -68,7 +54,7 @@ FolderDevice::FolderDevice() : library_(LoadLibraryW(L"RAPI.DLL")) {
 
 FolderDevice::~FolderDevice() {
     ClearAll();
-    if (init_ != nullptr && uninit_ != nullptr) {
+    if (init_ != nullptr) {
         HaveSettingsRead();
     }
     FreeLibrary(library_);
@@ -76,17 +62,14 @@ FolderDevice::~FolderDevice() {
 
 void FolderDevice::ClearAll() {
     wchar_t* const block = GetEnvironmentStringsW();
-    std::vector<std::wstring> names;
-    for (const wchar_t* entry = block; *entry != L'\0'; entry += std::wcslen(entry) + 1) {
-        const std::wstring text = entry;
+    std::wstring_view text;
+    for (const wchar_t* entry = block; *entry != L'\0'; entry += text.size() + 1) {
+        text = entry;
         if (text.starts_with(kPrefix)) {
-            names.push_back(text.substr(0, text.find(L'=')));
+            SetEnvironmentVariableW(std::wstring(text.substr(0, text.find(L'='))).c_str(), nullptr);
         }
     }
     FreeEnvironmentStringsW(block);
-    for (const std::wstring& name : names) {
-        SetEnvironmentVariableW(name.c_str(), nullptr);
-    }
 }
 
 void FolderDevice::HaveSettingsRead() {
@@ -125,18 +108,18 @@ void FolderDevice::StartTrace() {
 }
 
 std::vector<TraceLine> FolderDevice::Trace() const {
-    std::istringstream bytes(ReadTextFile(aside_ / L"trace.txt").value_or(""));
+    const std::string utf8 = ReadTextFile(aside_ / L"trace.txt").value_or("");
+    std::wistringstream text(std::filesystem::path(std::u8string(utf8.begin(), utf8.end())).wstring());
     std::vector<TraceLine> lines;
-    for (std::string line; std::getline(bytes, line);) {
-        lines.push_back(ParseTraceLine(Widen(line)));
+    for (std::wstring line; std::getline(text, line);) {
+        lines.push_back(ParseTraceLine(line));
     }
     return lines;
 }
 
 std::size_t FolderDevice::CallsOf(std::wstring_view function) const {
-    const std::vector<TraceLine> lines = Trace();
-    return static_cast<std::size_t>(std::count_if(
-        lines.begin(), lines.end(), [function](const TraceLine& line) { return line.function == function; }));
+    std::vector<TraceLine> lines = Trace();
+    return std::erase_if(lines, [function](const TraceLine& line) { return line.function == function; });
 }
 
 std::wstring FolderDevice::PcPath(std::wstring_view device_path) const {

@@ -13,31 +13,25 @@ namespace {
 
 class Watchdog : public ::testing::EmptyTestEventListener {
   public:
-    explicit Watchdog(int seconds) : limit_ms_(static_cast<ULONGLONG>(seconds) * 1000) {
-        // The thread ends with the process, which is why it is never joined.
-        std::thread([this] { Watch(); }).detach();
-    }
+    // The thread ends with the process, which is why it is never joined.
+    Watchdog() { std::thread(&Watchdog::Watch, this).detach(); }
 
     void OnTestStart(const ::testing::TestInfo& test) override {
         name_ = std::string(test.test_suite_name()) + "." + test.name();
-        deadline_ = GetTickCount64() + limit_ms_;
+        deadline_ = GetTickCount64() + 60'000;
     }
     void OnTestEnd(const ::testing::TestInfo&) override { deadline_ = 0; }
 
   private:
     void Watch() {
-        for (;;) {
+        for (ULONGLONG deadline = 0; deadline == 0 || GetTickCount64() <= deadline; deadline = deadline_) {
             Sleep(200);
-            const ULONGLONG deadline = deadline_;
-            if (deadline != 0 && GetTickCount64() > deadline) {
-                std::fprintf(stderr, "%s hangs: ending the test program\n", name_.c_str());
-                std::fflush(stderr);
-                TerminateProcess(GetCurrentProcess(), 3);
-            }
         }
+        std::fprintf(stderr, "%s hangs: ending the test program\n", name_.c_str());
+        std::fflush(stderr);
+        TerminateProcess(GetCurrentProcess(), 3);
     }
 
-    ULONGLONG limit_ms_;
     std::string name_;
     std::atomic<ULONGLONG> deadline_{0};
 };
@@ -46,6 +40,6 @@ class Watchdog : public ::testing::EmptyTestEventListener {
 
 int main(int argc, char** argv) {
     ::testing::InitGoogleTest(&argc, argv);
-    ::testing::UnitTest::GetInstance()->listeners().Append(new Watchdog(60));
+    ::testing::UnitTest::GetInstance()->listeners().Append(new Watchdog);
     return RUN_ALL_TESTS();
 }

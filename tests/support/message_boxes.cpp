@@ -1,22 +1,19 @@
 #include "tests/support/message_boxes.h"
 
 #include <array>
+#include <string_view>
 #include <utility>
+
+#include "ui/data_exchange.h"
 
 namespace orvane::testing {
 
 namespace {
 
-std::wstring TextOf(HWND window) {
-    std::wstring text(static_cast<std::size_t>(GetWindowTextLengthW(window)), L'\0');
-    GetWindowTextW(window, text.data(), static_cast<int>(text.size()) + 1);
-    return text;
-}
-
-std::wstring ClassOf(HWND window) {
+bool IsOfClass(HWND window, std::wstring_view class_name) {
     std::array<wchar_t, 64> name{};
     GetClassNameW(window, name.data(), static_cast<int>(name.size()));
-    return name.data();
+    return name.data() == class_name;
 }
 
 // A dialog whose procedure lies in the system's own library is a message box.
@@ -32,7 +29,7 @@ bool IsMessageBox(HWND window) {
 BOOL CALLBACK FindBox(HWND window, LPARAM found) {
     DWORD process = 0;
     GetWindowThreadProcessId(window, &process);
-    if (process != GetCurrentProcessId() || !IsWindowVisible(window) || ClassOf(window) != L"#32770" ||
+    if (process != GetCurrentProcessId() || !IsWindowVisible(window) || !IsOfClass(window, L"#32770") ||
         !IsMessageBox(window)) {
         return TRUE;
     }
@@ -41,37 +38,26 @@ BOOL CALLBACK FindBox(HWND window, LPARAM found) {
 }
 
 UINT ButtonsOf(HWND box) {
-    const bool has_cancel = GetDlgItem(box, IDCANCEL) != nullptr;
     if (GetDlgItem(box, IDYES) != nullptr) {
-        return has_cancel ? MB_YESNOCANCEL : MB_YESNO;
-    }
-    if (GetDlgItem(box, IDRETRY) != nullptr) {
-        return has_cancel ? MB_RETRYCANCEL : MB_ABORTRETRYIGNORE;
+        return MB_YESNO;
     }
     // A box with nothing but OK may use Cancel's id for it.
-    return GetDlgItem(box, IDOK) != nullptr && has_cancel ? MB_OKCANCEL : MB_OK;
+    return GetDlgItem(box, IDOK) != nullptr && GetDlgItem(box, IDCANCEL) != nullptr ? MB_OKCANCEL : MB_OK;
 }
 
+// The system's icons of message boxes have consecutive numbers in the order of their styles.
 UINT StyleOfIcon(HICON icon) {
-    const std::array<std::pair<LPCWSTR, UINT>, 4> icons = {{{IDI_ERROR, MB_ICONERROR},
-                                                            {IDI_QUESTION, MB_ICONQUESTION},
-                                                            {IDI_WARNING, MB_ICONWARNING},
-                                                            {IDI_INFORMATION, MB_ICONINFORMATION}}};
-    for (const auto& [name, style] : icons) {
-        if (icon == LoadIconW(nullptr, name)) {
-            return style;
+    for (UINT kind = 1; kind <= 4; ++kind) {
+        if (icon == LoadIconW(nullptr, MAKEINTRESOURCEW(32512U + kind))) {
+            return kind * MB_ICONERROR;
         }
     }
     return 0;
 }
 
-bool IsDefault(HWND button) {
-    return (GetWindowLongPtrW(button, GWL_STYLE) & BS_TYPEMASK) == BS_DEFPUSHBUTTON;
-}
-
 SeenMessageBox Describe(HWND box) {
     SeenMessageBox seen;
-    seen.caption = TextOf(box);
+    seen.caption = ui::WindowText(box);
     seen.owner = GetWindow(box, GW_OWNER);
     seen.style = ButtonsOf(box);
     if ((GetWindowLongPtrW(box, GWL_EXSTYLE) & WS_EX_TOPMOST) != 0) {
@@ -79,18 +65,17 @@ SeenMessageBox Describe(HWND box) {
     }
     UINT button_count = 0;
     for (HWND child = GetWindow(box, GW_CHILD); child != nullptr; child = GetWindow(child, GW_HWNDNEXT)) {
-        if (!(GetWindowLongPtrW(child, GWL_STYLE) & WS_VISIBLE)) {
+        const LONG_PTR style = GetWindowLongPtrW(child, GWL_STYLE);
+        if ((style & WS_VISIBLE) == 0) {
             continue;
         }
-        if (ClassOf(child) == L"Button") {
-            if (IsDefault(child)) {
-                seen.style |= button_count * MB_DEFBUTTON2;
-            }
+        if (IsOfClass(child, L"Button")) {
+            seen.style |= (style & BS_TYPEMASK) == BS_DEFPUSHBUTTON ? button_count * MB_DEFBUTTON2 : 0;
             ++button_count;
-        } else if ((GetWindowLongPtrW(child, GWL_STYLE) & SS_TYPEMASK) == SS_ICON) {
+        } else if ((style & SS_TYPEMASK) == SS_ICON) {
             seen.style |= StyleOfIcon(reinterpret_cast<HICON>(SendMessageW(child, STM_GETICON, 0, 0)));
         } else {
-            seen.text += TextOf(child);
+            seen.text += ui::WindowText(child);
         }
     }
     return seen;

@@ -11,8 +11,8 @@
 
 namespace orvane::testing {
 
-// What a message box looked like. `style` is told from its buttons, its icon, its default button and
-// whether it is system-modal, as MessageBoxW takes it.
+// What a message box looked like. `style` is told from its buttons (OK, OK and Cancel, Yes and No),
+// its icon, its default button and whether it is system-modal, as MessageBoxW takes it.
 struct SeenMessageBox {
     std::wstring caption;
     std::wstring text;

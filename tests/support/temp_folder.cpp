@@ -4,9 +4,12 @@
 
 #include <algorithm>
 #include <atomic>
+#include <chrono>
 #include <filesystem>
 #include <fstream>
 #include <iterator>
+
+#include "platform/handles.h"
 
 namespace orvane::testing {
 
@@ -38,12 +41,6 @@ void RemoveTree(const std::wstring& folder) {
     RemoveDirectoryW(folder.c_str());
 }
 
-ULONGLONG NowTicks() {
-    FILETIME now{};
-    GetSystemTimeAsFileTime(&now);
-    return TicksOf(now);
-}
-
 }  // namespace
 
 TempFolder::TempFolder() {
@@ -51,7 +48,8 @@ TempFolder::TempFolder() {
     // away. Process ids come again, the time does not.
     static std::atomic<int> count{0};
     static const std::wstring run =
-        std::to_wstring(GetCurrentProcessId()) + L"_" + std::to_wstring(NowTicks()) + L"_";
+        std::to_wstring(GetCurrentProcessId()) + L"_" +
+        std::to_wstring(std::chrono::system_clock::now().time_since_epoch().count()) + L"_";
     const fs::path folder = fs::temp_directory_path() / (L"orvane_test_" + run + std::to_wstring(++count));
     EXPECT_TRUE(fs::create_directories(folder));
     path_ = folder.wstring();
@@ -71,15 +69,11 @@ void MakeFolder(const std::wstring& path) {
 
 void WriteTextFile(const std::wstring& path, std::string_view content, std::optional<FILETIME> last_write) {
     fs::create_directories(fs::path(path).parent_path());
-    HANDLE file =
-        CreateFileW(path.c_str(), GENERIC_WRITE, 0, nullptr, CREATE_ALWAYS, FILE_ATTRIBUTE_NORMAL, nullptr);
-    ASSERT_NE(file, INVALID_HANDLE_VALUE) << GetLastError();
+    const UniqueFile file(
+        CreateFileW(path.c_str(), GENERIC_WRITE, 0, nullptr, CREATE_ALWAYS, FILE_ATTRIBUTE_NORMAL, nullptr));
     DWORD written = 0;
-    EXPECT_TRUE(WriteFile(file, content.data(), static_cast<DWORD>(content.size()), &written, nullptr));
-    if (last_write) {
-        EXPECT_TRUE(SetFileTime(file, nullptr, nullptr, &*last_write));
-    }
-    CloseHandle(file);
+    EXPECT_TRUE(WriteFile(file.Get(), content.data(), static_cast<DWORD>(content.size()), &written, nullptr));
+    EXPECT_TRUE(!last_write || SetFileTime(file.Get(), nullptr, nullptr, &*last_write));
 }
 
 std::optional<std::string> ReadTextFile(const std::wstring& path) {
@@ -120,13 +114,8 @@ ULONGLONG TicksOf(const FILETIME& time) {
 }
 
 FILETIME UtcTime(int year, int month, int day, int hour, int minute, int second) {
-    SYSTEMTIME fields{};
-    fields.wYear = static_cast<WORD>(year);
-    fields.wMonth = static_cast<WORD>(month);
-    fields.wDay = static_cast<WORD>(day);
-    fields.wHour = static_cast<WORD>(hour);
-    fields.wMinute = static_cast<WORD>(minute);
-    fields.wSecond = static_cast<WORD>(second);
+    const auto word = [](int value) { return static_cast<WORD>(value); };
+    const SYSTEMTIME fields{word(year), word(month), 0, word(day), word(hour), word(minute), word(second), 0};
     FILETIME time{};
     EXPECT_TRUE(SystemTimeToFileTime(&fields, &time));
     return time;
