@@ -61,6 +61,32 @@ TEST_F(SyncTest, CopiesBothWaysAndTellsSo) {
     EXPECT_EQ(log[9], L"Synchronization complete.");
 }
 
+TEST_F(SyncTest, EmptyFoldersAreSoonInStep) {
+    const DialogRun dialog;
+    dialog.Synchronize();
+    EXPECT_EQ(dialog.Log(), (Lines{L"Checking files...", L"Synchronization complete."}));
+    EXPECT_EQ(dialog.BarMaximum(), 0);
+}
+
+TEST_F(SyncTest, StartsAsAFileViewerOnRequest) {
+    Setting(L"Start_File_View", L"1");
+    const DialogRun dialog;
+    ASSERT_NE(FileView(), nullptr);
+    const ULONGLONG shown = GetTickCount64();
+    bool closing = false;
+    bool came_into_view = false;
+    EXPECT_TRUE(DialogRun::WaitUntil([&] {
+        came_into_view = came_into_view || IsWindowVisible(dialog.Window());
+        if (!closing && GetTickCount64() >= shown + 200) {
+            EXPECT_NE(FileView(), nullptr);
+            PostMessageW(FileView(), WM_CLOSE, 0, 0);
+            closing = true;
+        }
+        return dialog.HasEnded();
+    }));
+    EXPECT_FALSE(came_into_view);
+}
+
 TEST_F(SyncTest, TakesCompanionFoldersAlongAndKeepsBackups) {
     Setting(L"Overwrite_bkp", L"1");
     PutOnPc(L"bridge.wkf", "job", noon_);
@@ -133,6 +159,12 @@ TEST_F(SyncTest, CancelStopsAndTheNextPressStartsAfresh) {
 
     dialog.Press(IDC_SYNC_CANCEL_EXIT);
     EXPECT_EQ(dialog.Text(IDC_SYNC_CANCEL_EXIT), L"Exit");
+    Sleep(300);  // For the file under way to end.
+    const std::size_t copied = ListTree(OnDevice(L"")).size();
+    EXPECT_LT(copied, 60U);
+    Sleep(300);
+    EXPECT_EQ(ListTree(OnDevice(L"")).size(), copied);
+    EXPECT_EQ(dialog.Completions(), 0);
     EXPECT_EQ(dialog.Text(IDC_SYNC_STATUS), L"Sychronization cancelled");
     EXPECT_TRUE(dialog.IsBarVisible());
 
@@ -143,6 +175,40 @@ TEST_F(SyncTest, CancelStopsAndTheNextPressStartsAfresh) {
     for (int i = 0; i < 60; ++i) {
         EXPECT_EQ(ReadTextFile(OnDevice(L"new_" + std::to_wstring(i) + L".qvj")), "content") << i;
     }
+}
+
+TEST_F(SyncTest, CancelledInItsLastFileARunStaysCancelled) {
+    for (const bool to_device : {true, false}) {
+        const std::wstring large = to_device ? L"large.qvj" : L"large.txt";
+        WriteTextFile(to_device ? OnPc(large) : OnDevice(large), std::string(4'000'000, 'l'), noon_);
+        if (to_device) {
+            PutOnDevice(L"later.txt", "for the second pass", noon_);
+        }
+        device_.Set(L"CALL_DELAY", L"10");
+        const DialogRun dialog;
+        dialog.Press(IDC_SYNC_START);
+        EXPECT_TRUE(DialogRun::WaitUntil([&] { return dialog.Log().size() == 2; }));
+        Sleep(100);
+        dialog.Press(IDC_SYNC_CANCEL_EXIT);
+        Sleep(300);
+        EXPECT_EQ(dialog.Text(IDC_SYNC_STATUS), L"Sychronization cancelled");
+        EXPECT_EQ(dialog.Log().size(), 2U);
+        EXPECT_FALSE(Exists(to_device ? OnDevice(large) : OnPc(large)));
+        EXPECT_FALSE(Exists(OnPc(L"later.txt")));
+        DeleteFileW(OnPc(L"large.qvj").c_str());
+        DeleteFileW(OnDevice(L"later.txt").c_str());
+    }
+}
+
+TEST_F(SyncTest, LeavingRemovesTheFileThatIsCopiedInPart) {
+    PutOnPc(L"large.qvj", std::string(4'000'000, 'l'), noon_);
+    device_.Set(L"CALL_DELAY", L"10");
+    const DialogRun dialog;
+    dialog.Press(IDC_SYNC_START);
+    EXPECT_TRUE(DialogRun::WaitUntil([&] { return Exists(OnDevice(L"large.qvj")); }));
+    PostMessageW(dialog.Window(), WM_COMMAND, IDCANCEL, 0);
+    EXPECT_TRUE(DialogRun::WaitUntil([&] { return dialog.HasEnded(); }));
+    EXPECT_FALSE(Exists(OnDevice(L"large.qvj")));
 }
 
 TEST_F(SyncTest, AnOpenQuestionHoldsUpTheNextStart) {
@@ -183,7 +249,9 @@ TEST_F(SyncTest, TwentyRunsLeaveNoHandlesBehind) {
     GetProcessHandleCount(GetCurrentProcess(), &before);
     for (int i = 0; i < 20; ++i) {
         DeleteFileW(OnDevice(L"new_0.qvj").c_str());
+        DeleteFileW(OnPc(L"a.txt").c_str());
         dialog.Synchronize();
+        EXPECT_TRUE(Exists(OnDevice(L"new_0.qvj")) && Exists(OnPc(L"a.txt"))) << i;
     }
     GetProcessHandleCount(GetCurrentProcess(), &after);
     // Each run keeps the two cancel events of its passes.

@@ -57,38 +57,55 @@ TEST_F(SyncTest, AnUnreadableDeviceLeavesTheDialogIdle) {
 }
 
 TEST_F(SyncTest, ADeviceThatVanishesCostsNoFile) {
-    for (const wchar_t* name : {L"a.qvj", L"b.qvj", L"c.qvj"}) {
-        PutOnPc(name, "older", noon_);
-        PutOnDevice(name, "newer", AddSeconds(noon_, 60));
-    }
-    // A copy that is cut off must not be taken for a newer file by the next run.
-    const std::string whole(50'000, 'w');
-    PutOnPc(L"big.qvj", whole, noon_);
-    PutOnDevice(L"big.txt", whole, noon_);
+    const std::string whole(10'000, 'w');
+    const Lines small = {L"a.qvj", L"b.qvj", L"c.qvj"};
     const DialogRun dialog;
-    // Places all over the run where the device may be lost, up to its regular end.
-    for (int call = 2; call < 100; call += 3) {
+    // At each call of the run that follows the listing.
+    bool all_copied = false;
+    for (int call = 3; call <= 23; ++call) {
+        SCOPED_TRACE(call);
+        for (const std::wstring& name : small) {
+            PutOnPc(name, "older", noon_);
+            PutOnDevice(name, "newer", AddSeconds(noon_, 60));
+        }
+        PutOnPc(L"big.qvj", whole, noon_);
+        PutOnDevice(L"big.txt", whole, noon_);
+        DeleteFileW(OnDevice(L"big.qvj").c_str());
+        DeleteFileW(OnPc(L"big.txt").c_str());
+
         device_.Set(L"VANISH", std::to_wstring(call));
         const MessageBoxAnswerer answers({IDOK});
         dialog.Press(IDC_SYNC_START);
         EXPECT_TRUE(DialogRun::WaitUntil([&] { return dialog.Text(IDC_SYNC_CANCEL_EXIT) == L"Exit"; }));
         device_.Set(L"VANISH", L"");
-        for (const wchar_t* name : {L"a.qvj", L"b.qvj", L"c.qvj"}) {
-            EXPECT_EQ(ReadTextFile(OnDevice(name)), "newer") << call;
+        int missing = 0;
+        all_copied = ReadTextFile(OnDevice(L"big.qvj")) == whole && ReadTextFile(OnPc(L"big.txt")) == whole;
+        for (const std::wstring& name : small) {
+            EXPECT_EQ(ReadTextFile(OnDevice(name)), "newer");
             const auto on_pc = ReadTextFile(OnPc(name));
-            EXPECT_TRUE(!on_pc || on_pc == "older" || on_pc == "newer") << call;
+            missing += on_pc ? 0 : 1;
+            all_copied = all_copied && on_pc == "newer";
+            EXPECT_TRUE(!on_pc || on_pc == "older" || on_pc == "newer") << *on_pc;
         }
+        EXPECT_LE(missing, 1);  // The file under way.
+        EXPECT_TRUE(ReadTextFile(OnPc(L"big.qvj")) == whole);
+        EXPECT_TRUE(ReadTextFile(OnDevice(L"big.txt")) == whole);
         // Lost between the calls that create and date the file: the one moment that cannot be covered.
         if (ReadTextFile(OnDevice(L"big.qvj")) == "") {
             DeleteFileW(OnDevice(L"big.qvj").c_str());
         }
-        EXPECT_TRUE(ReadTextFile(OnPc(L"big.qvj")) == whole) << call;
-        EXPECT_TRUE(ReadTextFile(OnDevice(L"big.txt")) == whole) << call;
+
+        // A copy that was cut off must not be taken for a newer file.
+        dialog.Synchronize();
+        for (const std::wstring& name : small) {
+            EXPECT_EQ(ReadTextFile(OnDevice(name)), "newer");
+            EXPECT_EQ(ReadTextFile(OnPc(name)), "newer");
+        }
+        for (const std::wstring& name : {OnPc(L"big.qvj"), OnDevice(L"big.qvj"), OnPc(L"big.txt")}) {
+            EXPECT_TRUE(ReadTextFile(name) == whole) << name.substr(name.size() - 7).c_str();
+        }
     }
-    dialog.Synchronize();
-    EXPECT_TRUE(ReadTextFile(OnDevice(L"big.qvj")) == whole);
-    EXPECT_TRUE(ReadTextFile(OnPc(L"big.txt")) == whole);
-    EXPECT_EQ(ReadTextFile(OnPc(L"c.qvj")), "newer");
+    EXPECT_TRUE(all_copied);  // The last loss came too late to matter.
 }
 
 TEST_F(SyncTest, AFailedFileDoesNotStopTheNext) {
@@ -143,31 +160,90 @@ TEST_F(SyncTest, MissingPcFolderIsMadeWithWhatTheDeviceHas) {
     EXPECT_EQ(ReadTextFile(OnPc(L"not\\there\\a.qvj")), "device");
 }
 
-TEST_F(SyncTest, HostileNamesReachNoFileOutsideTheJobFolder) {
-    device_.Set(
-        L"EXTRA_ENTRIES",
-        L"\\Jobs|..\\evil.qvj;\\Jobs|..|folder;\\Jobs|.|folder;\\Jobs|;\\Jobs|c:evil.qvj;\\Jobs|a/evil.qvj;"
-        L"\\Jobs|long.qvj|unterminated;\\Jobs|nul.qvj;\\Jobs|com1.txt;\\Jobs|evil.qvj.");
-    PutOnDevice(L"good.qvj", "device", noon_);
-    const DialogRun dialog;
-    dialog.Synchronize();
-    EXPECT_EQ(ListTree(pc_.Path()), (Lines{L"good.qvj"}));
-    EXPECT_FALSE(Exists(pc_.Path() + L"\\..\\evil.qvj"));
+TEST_F(SyncTest, WithoutAPcFolderNothingIsCopied) {
+    // The root of the current drive must not take its place.
+    std::wstring current(MAX_PATH, L'\0');
+    current.resize(GetCurrentDirectoryW(MAX_PATH, current.data()));
+    ASSERT_TRUE(SetCurrentDirectoryW(pc_.Path().c_str()));
+    PutOnDevice(L"orvane_test.txt", "device", noon_);
+    for (const wchar_t* folder : {L"\\", L""}) {
+        Setting(L"SyncPath_DT", folder);
+        const DialogRun dialog;
+        dialog.Synchronize();
+        EXPECT_EQ(dialog.BarMaximum(), 1);  // Nothing was listed on the PC.
+        EXPECT_EQ(dialog.Log().size(), 3U);
+        EXPECT_FALSE(Exists(L"\\orvane_test.txt"));
+        EXPECT_TRUE(ListTree(pc_.Path()).empty());
+    }
+    SetCurrentDirectoryW(current.c_str());
 }
 
-TEST_F(SyncTest, RowsWithTooLongPathsFailLikeOthers) {
-    Setting(L"Overwrite_bkp", L"1");
-    // "\Jobs" and these make device paths of 255 and 256 characters; a backup's name has four more.
-    const std::wstring fits = std::wstring(245, L'f') + L".qvj";
-    const std::wstring too_long = std::wstring(246, L't') + L".qvj";
-    const TempFolder& short_folder = pc_;
-    WriteTextFile(L"\\\\?\\" + short_folder / fits, "content", noon_);
-    WriteTextFile(L"\\\\?\\" + short_folder / too_long, "content", noon_);
-    PutOnPc(L"z.qvj", "content", noon_);
+TEST_F(SyncTest, HostileNamesReachNoFileOutsideTheJobFolder) {
+    device_.Set(L"EXTRA_ENTRIES",
+                L"\\Jobs|..\\evil.qvj;\\Jobs|..|folder;\\Jobs|.|folder;\\Jobs|;\\Jobs|c:evil.qvj;"
+                L"\\Jobs|a/evil.qvj;\\Jobs|long.qvj|unterminated;\\Jobs|nul.qvj;\\Jobs|com1.txt;"
+                L"\\Jobs|evil.qvj.;\\Jobs|evil.qvj ;\\Jobs|...wkf");
+    PutOnDevice(L"good.qvj", "device", noon_);
+    device_.StartTrace();
+    DialogRun().Synchronize();
+    EXPECT_EQ(ListTree(pc_.Path()), (Lines{L"good.qvj"}));
+    // The device would refuse most of these names, so it must not even be asked.
+    Lines opened;
+    for (const TraceLine& call : device_.Trace()) {
+        if (call.function == L"CeCreateFile" && call.arguments[0] != L"\\CompareDateTime.txt") {
+            opened.push_back(call.arguments[0]);
+        }
+        EXPECT_TRUE(call.function != L"CeFindAllFiles" || call.arguments[0] == L"\\Jobs\\*") << call.number;
+    }
+    std::sort(opened.begin(), opened.end());
+    // "...wkf" is an ordinary name; that of the folder which would go with it is not.
+    EXPECT_EQ(opened, (Lines{L"\\Jobs\\...wkf", L"\\Jobs\\good.qvj"}));
+}
+
+// A name that brings `folder` to that many characters.
+std::wstring NameFor(std::size_t characters, const std::wstring& folder, const wchar_t* extension) {
+    return std::wstring(characters - folder.size() - 4, L'n') + extension;
+}
+
+TEST_F(SyncTest, RowsWithPathsTooLongForTheDeviceFailLikeOthers) {
+    const std::wstring folder = L"\\" + std::wstring(200, L'd') + L"\\";
+    Setting(L"SyncPath_CE", folder);
+    const auto on_device = [&](const std::wstring& name) {
+        return L"\\\\?\\" + device_.Root() + folder + name;
+    };
+    ASSERT_TRUE(CreateDirectoryW(on_device(L"").c_str(), nullptr));
+    // A backup's name has four characters more, and must fit too.
+    for (const auto& [backups, limit] : {std::pair{L"1", 255U}, std::pair{L"0", 259U}}) {
+        SCOPED_TRACE(limit);
+        Setting(L"Overwrite_bkp", backups);
+        const std::wstring fits = NameFor(limit, folder, L".qvj");
+        const std::wstring too_long = NameFor(limit + 1, folder, L".jpg");
+        for (const std::wstring& name : {fits, too_long, std::wstring(L"z.xml")}) {
+            PutOnPc(name, "content", noon_);
+        }
+        ASSERT_LT(OnPc(too_long).size(), 250U);
+        const DialogRun dialog;
+        dialog.Synchronize();
+        EXPECT_TRUE(Exists(on_device(fits)));
+        EXPECT_FALSE(Exists(on_device(too_long)));
+        EXPECT_TRUE(Exists(on_device(L"z.xml")));
+        EXPECT_EQ(dialog.Log().size(), 5U);
+        for (const std::wstring& name : {fits, too_long, std::wstring(L"z.xml")}) {
+            DeleteFileW(OnPc(name).c_str());
+            DeleteFileW(on_device(name).c_str());
+        }
+    }
+}
+
+TEST_F(SyncTest, RowsWithPathsTooLongForThePcFailLikeOthers) {
+    const std::wstring fits = NameFor(259, OnPc(L""), L".qvj");
+    const std::wstring too_long = NameFor(260, OnPc(L""), L".jpg");
+    for (const std::wstring& name : {fits, too_long, std::wstring(L"z.xml")}) {
+        WriteTextFile(L"\\\\?\\" + OnDevice(name), "content", noon_);
+    }
     const DialogRun dialog;
     dialog.Synchronize();
-    EXPECT_FALSE(Exists(L"\\\\?\\" + OnDevice(too_long)));
-    EXPECT_TRUE(Exists(OnDevice(L"z.qvj")));
+    EXPECT_EQ(ListTree(pc_.Path()), (Lines{fits, L"z.xml"}));
     EXPECT_EQ(dialog.Log().size(), 5U);
 }
 

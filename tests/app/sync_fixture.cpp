@@ -2,6 +2,8 @@
 
 #include <commctrl.h>
 
+#include <algorithm>
+
 #include "app/application.h"
 #include "app/sync_dialog.h"
 #include "res/ids.h"
@@ -12,6 +14,7 @@ namespace orvane::testing {
 namespace {
 
 constexpr const wchar_t* kKey = L"Software\\Veltrano\\CE Devices";
+constexpr const wchar_t* kComplete = L"Synchronization complete.";
 constexpr ULONGLONG kPatienceMs = 30'000;
 
 std::wstring ListLine(HWND list, LRESULT line) {
@@ -26,7 +29,7 @@ std::wstring ListLine(HWND list, LRESULT line) {
 
 DialogRun::DialogRun() : thread_([this] { Run(); }) {
     WaitUntil([this] {
-        return HasEnded() ||
+        return HasEnded() || FileView() != nullptr ||
                (window_ != nullptr && IsWindowVisible(window_) && !Text(IDC_SYNC_CANCEL_EXIT).empty());
     });
 }
@@ -90,10 +93,17 @@ LRESULT DialogRun::BarMaximum() const {
     return SendMessageW(GetDlgItem(window_, IDC_SYNC_PROGRESS), PBM_GETRANGE, FALSE, 0);
 }
 
+std::ptrdiff_t DialogRun::Completions() const {
+    const std::vector<std::wstring> log = Log();
+    return std::count(log.begin(), log.end(), kComplete);
+}
+
 void DialogRun::Synchronize() const {
+    const std::ptrdiff_t before = Completions();
     Press(IDC_SYNC_START);
-    ASSERT_TRUE(WaitForText(IDC_SYNC_STATUS, L"Synchronization complete."));
+    ASSERT_TRUE(WaitForText(IDC_SYNC_STATUS, kComplete));
     ASSERT_TRUE(WaitUntil([this] { return !IsBarVisible(); }));
+    ASSERT_EQ(Completions(), before + 1);
 }
 
 bool DialogRun::WaitUntil(const std::function<bool()>& condition) {
@@ -109,6 +119,11 @@ bool DialogRun::WaitUntil(const std::function<bool()>& condition) {
 
 bool DialogRun::WaitForText(int id, const std::wstring& text) const {
     return WaitUntil([&] { return Text(id) == text; });
+}
+
+HWND FileView() {
+    HWND view = FindWindowW(L"#32770", L"File Transfer - Copy From");
+    return view != nullptr && IsWindowVisible(view) ? view : nullptr;
 }
 
 void SyncTest::SetUp() {

@@ -21,7 +21,7 @@ namespace orvane::testing {
 // thread, as a user would.
 class DialogRun {
   public:
-    // Starts the dialog; returns when it is shown or has ended.
+    // Starts the dialog; returns when it, or the file view in its place, is shown or it has ended.
     DialogRun();
     // Closes the dialog if that has not happened, and waits for its workers.
     ~DialogRun();
@@ -33,11 +33,13 @@ class DialogRun {
     void Press(int id) const;
     std::wstring Text(int id) const;
     std::vector<std::wstring> Log() const;
+    // How often the log tells that a run is complete.
+    std::ptrdiff_t Completions() const;
     bool IsBarVisible() const;
     LRESULT BarPosition() const;
     LRESULT BarMaximum() const;
 
-    // Presses "Synchronize" and waits until the run is complete.
+    // Presses "Synchronize" and waits until the run is complete. A press that is ignored fails the test.
     void Synchronize() const;
     // Waits, at most half a minute, until the condition holds; whether it came to hold.
     static bool WaitUntil(const std::function<bool()>& condition);
@@ -50,6 +52,9 @@ class DialogRun {
     std::atomic<bool> ended_{false};
     std::thread thread_;
 };
+
+// The window of the file view; null when there is none.
+HWND FileView();
 
 // Job folders on both sides and settings that let every type take part and overwrite older files.
 class SyncTest : public ::testing::Test {
