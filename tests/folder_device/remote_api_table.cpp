@@ -4,55 +4,6 @@
 
 namespace orvane::testing {
 
-namespace {
-
-template <class Function>
-void Bind(HMODULE library, const char* name, Function*& function) {
-    function = reinterpret_cast<Function*>(reinterpret_cast<void*>(GetProcAddress(library, name)));
-    EXPECT_NE(function, nullptr) << name;
-}
-
-}  // namespace
-
-#define BIND(name) Bind(library, #name, name)
-
-RemoteApiTable::RemoteApiTable() : library(LoadLibraryW(L"RAPI.DLL")) {
-    BIND(CeCloseHandle);
-    BIND(CeCopyFile);
-    BIND(CeCreateDirectory);
-    BIND(CeCreateFile);
-    BIND(CeDeleteFile);
-    BIND(CeFindAllFiles);
-    BIND(CeFindClose);
-    BIND(CeFindFirstFile);
-    BIND(CeFindNextFile);
-    BIND(CeRapiFreeBuffer);
-    BIND(CeGetDiskFreeSpaceEx);
-    BIND(CeRapiGetError);
-    BIND(CeGetFileSize);
-    BIND(CeGetFileTime);
-    BIND(CeGetLastError);
-    BIND(CeGetVersionEx);
-    BIND(CeRapiInitEx);
-    BIND(CeRapiInvoke);
-    BIND(CeMoveFile);
-    BIND(CeReadFile);
-    BIND(CeRegCloseKey);
-    BIND(CeRegOpenKeyEx);
-    BIND(CeRegQueryValueEx);
-    BIND(CeRemoveDirectory);
-    BIND(CeSetFilePointer);
-    BIND(CeSetFileTime);
-    BIND(CeRapiUninit);
-    BIND(CeWriteFile);
-}
-
-#undef BIND
-
-RemoteApiTable::~RemoteApiTable() {
-    FreeLibrary(library);
-}
-
 HRESULT FolderDeviceTest::Connect() {
     rapi::InitRecord record{sizeof(rapi::InitRecord), nullptr, E_FAIL};
     const HRESULT result = api_.CeRapiInitEx(&record);

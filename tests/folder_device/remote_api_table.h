@@ -14,42 +14,53 @@
 
 namespace orvane::testing {
 
+// One entry point, as the pointer it is assigned to.
+struct Entry {
+    HMODULE library;
+    const char* name;
+
+    template <class Function>
+    operator Function*() const {
+        return reinterpret_cast<Function*>(reinterpret_cast<void*>(GetProcAddress(library, name)));
+    }
+};
+
 // Loads the DLL; all pointers are null when it or an entry point is not there.
 struct RemoteApiTable {
-    RemoteApiTable();
-    ~RemoteApiTable();
+    RemoteApiTable() = default;
+    ~RemoteApiTable() { FreeLibrary(library); }
     RemoteApiTable(const RemoteApiTable&) = delete;
     RemoteApiTable& operator=(const RemoteApiTable&) = delete;
 
-    HMODULE library;
-    rapi::CeCloseHandle* CeCloseHandle;
-    rapi::CeCopyFile* CeCopyFile;
-    rapi::CeCreateDirectory* CeCreateDirectory;
-    rapi::CeCreateFile* CeCreateFile;
-    rapi::CeDeleteFile* CeDeleteFile;
-    rapi::CeFindAllFiles* CeFindAllFiles;
-    rapi::CeFindClose* CeFindClose;
-    rapi::CeFindFirstFile* CeFindFirstFile;
-    rapi::CeFindNextFile* CeFindNextFile;
-    rapi::CeRapiFreeBuffer* CeRapiFreeBuffer;
-    rapi::CeGetDiskFreeSpaceEx* CeGetDiskFreeSpaceEx;
-    rapi::CeRapiGetError* CeRapiGetError;
-    rapi::CeGetFileSize* CeGetFileSize;
-    rapi::CeGetFileTime* CeGetFileTime;
-    rapi::CeGetLastError* CeGetLastError;
-    rapi::CeGetVersionEx* CeGetVersionEx;
-    rapi::CeRapiInitEx* CeRapiInitEx;
-    rapi::CeRapiInvoke* CeRapiInvoke;
-    rapi::CeMoveFile* CeMoveFile;
-    rapi::CeReadFile* CeReadFile;
-    rapi::CeRegCloseKey* CeRegCloseKey;
-    rapi::CeRegOpenKeyEx* CeRegOpenKeyEx;
-    rapi::CeRegQueryValueEx* CeRegQueryValueEx;
-    rapi::CeRemoveDirectory* CeRemoveDirectory;
-    rapi::CeSetFilePointer* CeSetFilePointer;
-    rapi::CeSetFileTime* CeSetFileTime;
-    rapi::CeRapiUninit* CeRapiUninit;
-    rapi::CeWriteFile* CeWriteFile;
+    HMODULE library = LoadLibraryW(L"RAPI.DLL");
+    rapi::CeCloseHandle* CeCloseHandle = Entry{library, "CeCloseHandle"};
+    rapi::CeCopyFile* CeCopyFile = Entry{library, "CeCopyFile"};
+    rapi::CeCreateDirectory* CeCreateDirectory = Entry{library, "CeCreateDirectory"};
+    rapi::CeCreateFile* CeCreateFile = Entry{library, "CeCreateFile"};
+    rapi::CeDeleteFile* CeDeleteFile = Entry{library, "CeDeleteFile"};
+    rapi::CeFindAllFiles* CeFindAllFiles = Entry{library, "CeFindAllFiles"};
+    rapi::CeFindClose* CeFindClose = Entry{library, "CeFindClose"};
+    rapi::CeFindFirstFile* CeFindFirstFile = Entry{library, "CeFindFirstFile"};
+    rapi::CeFindNextFile* CeFindNextFile = Entry{library, "CeFindNextFile"};
+    rapi::CeRapiFreeBuffer* CeRapiFreeBuffer = Entry{library, "CeRapiFreeBuffer"};
+    rapi::CeGetDiskFreeSpaceEx* CeGetDiskFreeSpaceEx = Entry{library, "CeGetDiskFreeSpaceEx"};
+    rapi::CeRapiGetError* CeRapiGetError = Entry{library, "CeRapiGetError"};
+    rapi::CeGetFileSize* CeGetFileSize = Entry{library, "CeGetFileSize"};
+    rapi::CeGetFileTime* CeGetFileTime = Entry{library, "CeGetFileTime"};
+    rapi::CeGetLastError* CeGetLastError = Entry{library, "CeGetLastError"};
+    rapi::CeGetVersionEx* CeGetVersionEx = Entry{library, "CeGetVersionEx"};
+    rapi::CeRapiInitEx* CeRapiInitEx = Entry{library, "CeRapiInitEx"};
+    rapi::CeRapiInvoke* CeRapiInvoke = Entry{library, "CeRapiInvoke"};
+    rapi::CeMoveFile* CeMoveFile = Entry{library, "CeMoveFile"};
+    rapi::CeReadFile* CeReadFile = Entry{library, "CeReadFile"};
+    rapi::CeRegCloseKey* CeRegCloseKey = Entry{library, "CeRegCloseKey"};
+    rapi::CeRegOpenKeyEx* CeRegOpenKeyEx = Entry{library, "CeRegOpenKeyEx"};
+    rapi::CeRegQueryValueEx* CeRegQueryValueEx = Entry{library, "CeRegQueryValueEx"};
+    rapi::CeRemoveDirectory* CeRemoveDirectory = Entry{library, "CeRemoveDirectory"};
+    rapi::CeSetFilePointer* CeSetFilePointer = Entry{library, "CeSetFilePointer"};
+    rapi::CeSetFileTime* CeSetFileTime = Entry{library, "CeSetFileTime"};
+    rapi::CeRapiUninit* CeRapiUninit = Entry{library, "CeRapiUninit"};
+    rapi::CeWriteFile* CeWriteFile = Entry{library, "CeWriteFile"};
 };
 
 // A device with one session open on the test's thread.
