@@ -8,44 +8,28 @@ class DevicePath : public FolderDeviceTest {};
 TEST_F(DevicePath, RefusedOnesTouchNothing) {
     const std::wstring outside = device_.Root() + L"_outside.txt";
     const std::wstring long_name(256, L'n');
-    const std::wstring names(251, L'n');
     const struct {
         std::wstring path;
         DWORD error;
     } cases[] = {
         {L"", ERROR_INVALID_NAME},
-        {L"a.txt", ERROR_INVALID_NAME},
         {L"C:\\a.txt", ERROR_INVALID_NAME},
-        {L"\\C:\\a.txt", ERROR_INVALID_NAME},
-        {L"/a.txt", ERROR_INVALID_NAME},
         {L"\\f/a.txt", ERROR_INVALID_NAME},
         {L"\\\\server\\share\\a.txt", ERROR_INVALID_NAME},
-        {L"\\\\?\\C:\\a.txt", ERROR_INVALID_NAME},
         {L"\\..\\" + outside.substr(outside.rfind(L'\\') + 1), ERROR_INVALID_NAME},
         {L"\\f\\..\\a.txt", ERROR_INVALID_NAME},
-        {L"\\f\\.\\a.txt", ERROR_INVALID_NAME},
         {L"\\f\\.. \\a.txt", ERROR_INVALID_NAME},
         {L"\\f\\\\a.txt", ERROR_INVALID_NAME},
         {L"\\a.txt\\", ERROR_INVALID_NAME},
         {L"\\a.txt.", ERROR_INVALID_NAME},
-        {L"\\a.txt ", ERROR_INVALID_NAME},
-        {L"\\f.\\a.txt", ERROR_INVALID_NAME},
         {L"\\a.txt:stream", ERROR_INVALID_NAME},
         {L"\\a*.txt", ERROR_INVALID_NAME},
-        {L"\\a?.txt", ERROR_INVALID_NAME},
-        {L"\\a\".txt", ERROR_INVALID_NAME},
-        {L"\\a<.txt", ERROR_INVALID_NAME},
-        {L"\\a>.txt", ERROR_INVALID_NAME},
-        {L"\\a|.txt", ERROR_INVALID_NAME},
         {L"\\a\t.txt", ERROR_INVALID_NAME},
         {L"\\a\xD800.txt", ERROR_INVALID_NAME},
         {L"\\NUL", ERROR_INVALID_NAME},
         {L"\\f\\con.txt", ERROR_INVALID_NAME},
-        {L"\\aux .tar.gz", ERROR_INVALID_NAME},
-        {L"\\Lpt9", ERROR_INVALID_NAME},
         {L"\\COM\u00B2.txt", ERROR_INVALID_NAME},
         {L"\\" + long_name, ERROR_FILENAME_EXCED_RANGE},
-        {L"\\f\\" + names + L"\\a.txt", ERROR_FILENAME_EXCED_RANGE},
         {L"\\missing\\a.txt", ERROR_PATH_NOT_FOUND},
         {L"\\kept.txt\\a.txt", ERROR_PATH_NOT_FOUND},
     };
@@ -88,21 +72,14 @@ TEST_F(DevicePath, AShortNameReachesNothing) {
         GTEST_SKIP() << "no short names to be had here";
     }
     for (const std::wstring& path :
-         {L"\\" + folder_alias, L"\\" + folder_alias + L"\\a long file name.qvj",
-          L"\\a long folder name\\" + file_alias, L"\\" + folder_alias + L"\\new.qvj"}) {
+         {L"\\" + folder_alias + L"\\a long file name.qvj", L"\\a long folder name\\" + file_alias}) {
         SCOPED_TRACE(::testing::PrintToString(path));
         rapi::FindData data;
-        for (const DWORD creation : {CREATE_ALWAYS, OPEN_EXISTING}) {
-            EXPECT_EQ(ErrorOf(Open(path.c_str(), GENERIC_WRITE, creation)), DWORD{ERROR_INVALID_NAME});
-        }
+        EXPECT_EQ(ErrorOf(Open(path.c_str(), GENERIC_WRITE, CREATE_ALWAYS)), DWORD{ERROR_INVALID_NAME});
         EXPECT_EQ(ErrorOf(api_.CeDeleteFile(path.c_str())), DWORD{ERROR_INVALID_NAME});
         EXPECT_EQ(ErrorOf(api_.CeFindFirstFile(path.c_str(), &data)), DWORD{ERROR_INVALID_NAME});
     }
     EXPECT_EQ(ReadTextFile(device_.PcPath(L"\\a long folder name\\a long file name.qvj")), "kept");
-    // A name of its own may look like one.
-    ASSERT_TRUE(WriteNew(L"\\A~1.txt", "own"));
-    EXPECT_TRUE(api_.CeMoveFile(L"\\a~1.TXT", L"\\B~2.txt"));
-    EXPECT_EQ(ReadTextFile(device_.PcPath(L"\\B~2.txt")), "own");
 }
 
 TEST_F(DevicePath, TheLongestOneWorksBelowALongRoot) {
@@ -120,12 +97,6 @@ TEST_F(DevicePath, TheLongestOneWorksBelowALongRoot) {
     ASSERT_TRUE(api_.CeCreateDirectory(folder.c_str(), nullptr));
     ASSERT_TRUE(WriteNew(file.c_str(), "long"));
     EXPECT_EQ(Names((folder + L"\\*").c_str()), std::vector<std::wstring>{file.substr(130)});
-    // One character more, made past the device: it cannot be reached, so it is not listed.
-    const HANDLE longer = CreateFileW((L"\\\\?\\" + root + file + L"f").c_str(), GENERIC_WRITE, 0, nullptr,
-                                      CREATE_NEW, 0, nullptr);
-    ASSERT_NE(longer, INVALID_HANDLE_VALUE);
-    CloseHandle(longer);
-    EXPECT_EQ(Names((folder + L"\\*").c_str())->size(), 1U);
     EXPECT_TRUE(api_.CeDeleteFile(file.c_str()));
 }
 
