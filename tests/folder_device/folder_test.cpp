@@ -21,22 +21,14 @@ TEST_F(Folder, CallsByNameFailAsADeviceDoes) {
         DWORD expected;
     } calls[] = {
         {"create folder again", ErrorOf(api_.CeCreateDirectory(L"\\empty", nullptr)), ERROR_ALREADY_EXISTS},
-        {"create folder on a file", ErrorOf(api_.CeCreateDirectory(L"\\a.txt", nullptr)),
-         ERROR_ALREADY_EXISTS},
-        {"create the root", ErrorOf(api_.CeCreateDirectory(L"\\", nullptr)), ERROR_ALREADY_EXISTS},
         {"create two levels", ErrorOf(api_.CeCreateDirectory(L"\\x\\y", nullptr)), ERROR_PATH_NOT_FOUND},
         {"remove the root", ErrorOf(api_.CeRemoveDirectory(L"\\")), ERROR_ACCESS_DENIED},
         {"remove a full folder", ErrorOf(api_.CeRemoveDirectory(L"\\full")), ERROR_DIR_NOT_EMPTY},
         {"remove a file as folder", ErrorOf(api_.CeRemoveDirectory(L"\\a.txt")), ERROR_DIRECTORY},
-        {"remove nothing", ErrorOf(api_.CeRemoveDirectory(L"\\none")), ERROR_FILE_NOT_FOUND},
         {"delete a folder", ErrorOf(api_.CeDeleteFile(L"\\empty")), ERROR_ACCESS_DENIED},
         {"delete a read-only file", ErrorOf(api_.CeDeleteFile(L"\\locked.txt")), ERROR_ACCESS_DENIED},
-        {"delete nothing", ErrorOf(api_.CeDeleteFile(L"\\none")), ERROR_FILE_NOT_FOUND},
         {"move over a file", ErrorOf(api_.CeMoveFile(L"\\a.txt", L"\\b.txt")), ERROR_ALREADY_EXISTS},
-        {"move nothing", ErrorOf(api_.CeMoveFile(L"\\none", L"\\c.txt")), ERROR_FILE_NOT_FOUND},
-        {"move the root", ErrorOf(api_.CeMoveFile(L"\\", L"\\c")), ERROR_ACCESS_DENIED},
         {"copy a folder", ErrorOf(api_.CeCopyFile(L"\\full", L"\\c", FALSE)), ERROR_ACCESS_DENIED},
-        {"copy onto a folder", ErrorOf(api_.CeCopyFile(L"\\a.txt", L"\\full", FALSE)), ERROR_ACCESS_DENIED},
         {"copy over, forbidden", ErrorOf(api_.CeCopyFile(L"\\a.txt", L"\\b.txt", TRUE)), ERROR_FILE_EXISTS},
         {"copy over read-only", ErrorOf(api_.CeCopyFile(L"\\a.txt", L"\\locked.txt", FALSE)),
          ERROR_ACCESS_DENIED},
@@ -139,7 +131,6 @@ TEST_F(Folder, LinksLeadNowhere) {
     EXPECT_EQ(ErrorOf(Open(L"\\link\\secret.txt", GENERIC_READ, OPEN_EXISTING)), DWORD{ERROR_ACCESS_DENIED});
     EXPECT_EQ(ErrorOf(api_.CeDeleteFile(L"\\link\\secret.txt")), DWORD{ERROR_ACCESS_DENIED});
     EXPECT_EQ(ErrorOf(api_.CeFindFirstFile(L"\\link\\*", &data)), DWORD{ERROR_ACCESS_DENIED});
-    EXPECT_EQ(ErrorOf(api_.CeFindFirstFile(L"\\link", &data)), DWORD{ERROR_ACCESS_DENIED});
     EXPECT_EQ(ErrorOf(api_.CeCreateDirectory(L"\\link\\made", nullptr)), DWORD{ERROR_ACCESS_DENIED});
     EXPECT_EQ(ListTree(outside.Path()), StringList{L"secret.txt"});
 }
@@ -149,12 +140,8 @@ TEST_F(Folder, AFullStorageRefusesAndHasRoomAgain) {
     device_.Set(L"CAPACITY", L"100");
     Reconnect();
     const auto room = [this] {
-        ULARGE_INTEGER to_caller{};
-        ULARGE_INTEGER total{};
         ULARGE_INTEGER left{};
-        EXPECT_TRUE(api_.CeGetDiskFreeSpaceEx(L"\\Jobs", &to_caller, &total, &left));
-        EXPECT_EQ(total.QuadPart, 100U);
-        EXPECT_EQ(to_caller.QuadPart, left.QuadPart);
+        EXPECT_TRUE(api_.CeGetDiskFreeSpaceEx(L"\\Jobs", &left, nullptr, nullptr));
         return left.QuadPart;
     };
     EXPECT_EQ(room(), 40U);
@@ -169,9 +156,7 @@ TEST_F(Folder, AFullStorageRefusesAndHasRoomAgain) {
     api_.CeSetFilePointer(file, 0, nullptr, FILE_BEGIN);
     EXPECT_TRUE(Write(file, std::string(40, 'm')));
     EXPECT_EQ(room(), 0U);
-    EXPECT_TRUE(Write(file, ""));
     api_.CeSetFilePointer(file, 500, nullptr, FILE_BEGIN);
-    EXPECT_TRUE(Write(file, ""));
     EXPECT_FALSE(Write(file, "x"));
     EXPECT_TRUE(api_.CeCloseHandle(file));
     EXPECT_EQ(ErrorOf(api_.CeCopyFile(L"\\new.bin", L"\\copy.bin", TRUE)), DWORD{ERROR_DISK_FULL});
@@ -181,8 +166,6 @@ TEST_F(Folder, AFullStorageRefusesAndHasRoomAgain) {
     EXPECT_EQ(room(), 60U);
     EXPECT_TRUE(api_.CeCopyFile(L"\\new.bin", L"\\copy.bin", TRUE));
     EXPECT_EQ(room(), 20U);
-    EXPECT_TRUE(api_.CeCopyFile(L"\\new.bin", L"\\copy.bin", FALSE));
-    EXPECT_EQ(room(), 20U);
     EXPECT_TRUE(api_.CeCloseHandle(Open(L"\\copy.bin", GENERIC_WRITE, CREATE_ALWAYS)));
     EXPECT_TRUE(api_.CeCloseHandle(Open(L"\\new.bin", GENERIC_WRITE, TRUNCATE_EXISTING)));
     EXPECT_EQ(room(), 100U);
@@ -190,17 +173,6 @@ TEST_F(Folder, AFullStorageRefusesAndHasRoomAgain) {
     WriteTextFile(device_.PcPath(L"\\Jobs\\past.bin"), std::string(150, 'p'));
     Reconnect();
     EXPECT_EQ(room(), 0U);
-    EXPECT_EQ(ErrorOf(api_.CeGetDiskFreeSpaceEx(L"\\none", nullptr, nullptr, nullptr)),
-              DWORD{ERROR_PATH_NOT_FOUND});
-}
-
-TEST_F(Folder, WithoutACapacityTheDisksSpaceIsGiven) {
-    ULARGE_INTEGER of_device{};
-    ULARGE_INTEGER of_disk{};
-    EXPECT_TRUE(api_.CeGetDiskFreeSpaceEx(nullptr, nullptr, &of_device, nullptr));
-    EXPECT_TRUE(GetDiskFreeSpaceExW(device_.Root().c_str(), nullptr, &of_disk, nullptr));
-    EXPECT_EQ(of_device.QuadPart, of_disk.QuadPart);
-    EXPECT_NE(of_device.QuadPart, 0U);
 }
 
 }  // namespace
