@@ -34,53 +34,21 @@ TEST_F(Session, OutsideOfOneEveryCallToTheDeviceFails) {
     ASSERT_TRUE(api_.CeFindAllFiles(L"\\*", rapi::kFindName, &count, &found));
     device_.CloseSessions();
 
-    rapi::FindData data;
-    rapi::OsVersionInfo version{};
-    version.size = sizeof(version);
     char byte = 0;
     DWORD size = 1;
-    HKEY key = nullptr;
-    ULARGE_INTEGER space;
-    const struct {
-        const char* name;
-        bool failed;
-    } calls[] = {
-        {"CeCloseHandle", !api_.CeCloseHandle(file)},
-        {"CeCopyFile", !api_.CeCopyFile(L"\\a.txt", L"\\b.txt", FALSE)},
-        {"CeCreateDirectory", !api_.CeCreateDirectory(L"\\f", nullptr)},
-        {"CeCreateFile", Open(L"\\a.txt", GENERIC_READ, OPEN_EXISTING) == INVALID_HANDLE_VALUE},
-        {"CeDeleteFile", !api_.CeDeleteFile(L"\\a.txt")},
-        {"CeFindAllFiles", !api_.CeFindAllFiles(L"\\*", 0, &size, &found)},
-        {"CeFindClose", !api_.CeFindClose(file)},
-        {"CeFindFirstFile", api_.CeFindFirstFile(L"\\*", &data) == INVALID_HANDLE_VALUE},
-        {"CeFindNextFile", !api_.CeFindNextFile(file, &data)},
-        {"CeGetDiskFreeSpaceEx", !api_.CeGetDiskFreeSpaceEx(L"\\", &space, nullptr, nullptr)},
-        {"CeGetFileSize", api_.CeGetFileSize(file, nullptr) == INVALID_FILE_SIZE},
-        {"CeGetFileTime", !api_.CeGetFileTime(file, nullptr, nullptr, nullptr)},
-        {"CeGetVersionEx", !api_.CeGetVersionEx(&version)},
-        {"CeRapiInvoke", FAILED(api_.CeRapiInvoke(L"x.dll", L"f", 0, nullptr, nullptr, nullptr, nullptr, 0))},
-        {"CeMoveFile", !api_.CeMoveFile(L"\\a.txt", L"\\b.txt")},
-        {"CeReadFile", !api_.CeReadFile(file, &byte, 1, &size, nullptr)},
-        {"CeRegCloseKey", api_.CeRegCloseKey(HKEY_CURRENT_USER) != 0},
-        {"CeRegOpenKeyEx", api_.CeRegOpenKeyEx(HKEY_CURRENT_USER, nullptr, 0, 0, &key) != 0},
-        {"CeRegQueryValueEx",
-         api_.CeRegQueryValueEx(HKEY_CURRENT_USER, L"x", nullptr, nullptr, nullptr, nullptr) != 0},
-        {"CeRemoveDirectory", !api_.CeRemoveDirectory(L"\\f")},
-        {"CeSetFilePointer", api_.CeSetFilePointer(file, 0, nullptr, FILE_BEGIN) == INVALID_SET_FILE_POINTER},
-        {"CeSetFileTime", !api_.CeSetFileTime(file, nullptr, nullptr, nullptr)},
-        {"CeRapiUninit", FAILED(api_.CeRapiUninit())},
-        {"CeWriteFile", !api_.CeWriteFile(file, &byte, 1, &size, nullptr)},
-    };
-    for (const auto& call : calls) {
-        EXPECT_TRUE(call.failed) << call.name;
-    }
+    EXPECT_FALSE(api_.CeCloseHandle(file));
+    EXPECT_FALSE(api_.CeDeleteFile(L"\\a.txt"));
+    EXPECT_FALSE(api_.CeMoveFile(L"\\a.txt", L"\\b.txt"));
+    EXPECT_FALSE(api_.CeReadFile(file, &byte, 1, &size, nullptr));
+    EXPECT_FALSE(api_.CeWriteFile(file, &byte, 1, &size, nullptr));
+    EXPECT_NE(api_.CeRegCloseKey(HKEY_CURRENT_USER), 0);
+    EXPECT_EQ(Open(L"\\a.txt", GENERIC_READ, OPEN_EXISTING), INVALID_HANDLE_VALUE);
     EXPECT_EQ(api_.CeGetLastError(), DWORD{ERROR_NOT_CONNECTED});
     EXPECT_EQ(api_.CeRapiGetError(), HRESULT_FROM_WIN32(ERROR_NOT_CONNECTED));
     // Listings stay the caller's, and are freed once only.
     EXPECT_EQ(std::wstring(found != nullptr ? found->name : L""), L"a.txt");
     EXPECT_EQ(api_.CeRapiFreeBuffer(found), S_OK);
     EXPECT_EQ(api_.CeRapiFreeBuffer(found), E_INVALIDARG);
-    EXPECT_EQ(api_.CeRapiFreeBuffer(&data), E_INVALIDARG);
 }
 
 TEST_F(Session, TheLastOneClosesEveryHandle) {
@@ -90,13 +58,6 @@ TEST_F(Session, TheLastOneClosesEveryHandle) {
     Reconnect();
     EXPECT_EQ(ErrorOf(api_.CeCloseHandle(file)), DWORD{ERROR_INVALID_HANDLE});
     EXPECT_TRUE(DeleteFileW(device_.PcPath(L"\\a.txt").c_str()));
-}
-
-TEST_F(Session, TheRecordMustHaveItsSize) {
-    rapi::InitRecord record{sizeof(rapi::InitRecord) - 4, nullptr, S_OK};
-    EXPECT_EQ(api_.CeRapiInitEx(&record), E_INVALIDARG);
-    EXPECT_EQ(api_.CeRapiInitEx(nullptr), E_INVALIDARG);
-    EXPECT_EQ(device_.CloseSessions(), 1);
 }
 
 TEST_F(Session, AConnectionCanBeLateFailOrStayAway) {
@@ -188,11 +149,8 @@ TEST_F(Session, ForeignCodeIsNeverRun) {
     EXPECT_EQ(invoke(L"there.dll", L"Run"), HRESULT_FROM_WIN32(ERROR_BAD_EXE_FORMAT));
     EXPECT_EQ(size, 0U);
     EXPECT_EQ(output, nullptr);
-    EXPECT_EQ(invoke(L"\\Windows\\there.dll", L"Run"), HRESULT_FROM_WIN32(ERROR_BAD_EXE_FORMAT));
     EXPECT_EQ(invoke(L"kernel32.dll", L"Run"), HRESULT_FROM_WIN32(ERROR_FILE_NOT_FOUND));
-    EXPECT_EQ(invoke(L"\\Windows", L"Run"), HRESULT_FROM_WIN32(ERROR_FILE_NOT_FOUND));
     EXPECT_EQ(invoke(L"..\\there.dll", L"Run"), HRESULT_FROM_WIN32(ERROR_INVALID_NAME));
-    EXPECT_EQ(invoke(L"there.dll", nullptr), E_INVALIDARG);
 }
 
 }  // namespace
