@@ -36,23 +36,19 @@ TEST_F(Find, PatternsAreOfNamesAsTheyStand) {
     const struct {
         const wchar_t* pattern;
         StringList names;
-        DWORD error;  // Of the search; a whole listing fails only where that is not "file not found".
     } cases[] = {
-        {L"\\Jobs\\*", all, 0},
-        {L"\\Jobs\\*.qvj", {L"B.QVJ", L"a.qvj"}, 0},
-        {L"\\JOBS\\?.q*", {L"B.QVJ", L"a.qvj", L"a.qvj.001"}, 0},
-        {L"\\Jobs\\*a*e*x", {L"long name.qvjx"}, 0},
-        {L"\\Jobs", {L"Jobs"}, 0},
-        {L"\\Jobs\\*.bmp", {}, ERROR_FILE_NOT_FOUND},
-        {L"\\Jobs\\sub\\*", {}, ERROR_FILE_NOT_FOUND},
+        {L"\\Jobs\\*", all},
+        {L"\\Jobs\\*.qvj", {L"B.QVJ", L"a.qvj"}},
+        {L"\\JOBS\\?.q*", {L"B.QVJ", L"a.qvj", L"a.qvj.001"}},
+        {L"\\Jobs\\*a*e*x", {L"long name.qvjx"}},
+        {L"\\Jobs", {L"Jobs"}},
+        {L"\\Jobs\\*.bmp", {}},
+        {L"\\Jobs\\sub\\*", {}},
     };
-    for (const auto& [pattern, names, error] : cases) {
+    for (const auto& [pattern, names] : cases) {
         SCOPED_TRACE(::testing::PrintToString(pattern));
         EXPECT_EQ(Names(pattern), names);
-        EXPECT_EQ(Search(pattern), error == 0 ? std::optional(names) : std::nullopt);
-        if (error != 0) {
-            EXPECT_EQ(api_.CeGetLastError(), error);
-        }
+        EXPECT_EQ(Search(pattern), names.empty() ? std::nullopt : std::optional(names));
     }
     const struct {
         const wchar_t* pattern;
@@ -121,10 +117,6 @@ TEST_F(Find, ListingsCanBeMadeHostile) {
     EXPECT_EQ(Search(L"\\*.qvj"), StringList{L"top.qvj"});
 
     device_.Set(L"FOUND_COUNT", L"0xFFFFFFFF");
-    Reconnect();
-    ASSERT_TRUE(api_.CeFindAllFiles(L"\\Jobs\\*", 0xBF, &count, &found));
-    EXPECT_EQ(count, MAXDWORD);
-    EXPECT_EQ(api_.CeRapiFreeBuffer(found), S_OK);
     device_.Set(L"FOUND_NULL", L"1");
     Reconnect();
     ASSERT_TRUE(api_.CeFindAllFiles(L"\\Jobs\\*", 0xBF, &count, &found));
