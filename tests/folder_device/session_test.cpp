@@ -122,23 +122,6 @@ TEST_F(Session, ManyThreadsWorkAtOnce) {
     EXPECT_EQ(Names(L"\\*"), std::vector<std::wstring>{});
 }
 
-TEST(SessionAtUnload, EverythingIsClosedWithTheDll) {
-    const TempFolder root;
-    SetEnvironmentVariableW(L"FOLDER_DEVICE_ROOT", root.Path().c_str());
-    {
-        const RemoteApiTable api;
-        rapi::InitRecord record{sizeof(rapi::InitRecord), nullptr, E_FAIL};
-        ASSERT_EQ(api.CeRapiInitEx(&record), S_OK);
-        ASSERT_EQ(record.init_result, S_OK);
-        ASSERT_NE(api.CeCreateFile(L"\\a.txt", GENERIC_WRITE, 0, nullptr, CREATE_NEW, 0, nullptr),
-                  INVALID_HANDLE_VALUE);
-        EXPECT_FALSE(DeleteFileW((root / L"a.txt").c_str()));
-    }
-    EXPECT_EQ(GetModuleHandleW(L"RAPI.DLL"), nullptr);
-    EXPECT_TRUE(DeleteFileW((root / L"a.txt").c_str()));
-    SetEnvironmentVariableW(L"FOLDER_DEVICE_ROOT", nullptr);
-}
-
 TEST_F(Session, ForeignCodeIsNeverRun) {
     WriteTextFile(device_.PcPath(L"\\Windows\\there.dll"), "MZ");
     DWORD size = 9;
