@@ -1,4 +1,4 @@
-#include "tests/folder_device/remote_api_table.h"
+#include "tests/folder_device/fixture.h"
 
 namespace orvane::testing {
 namespace {
@@ -33,7 +33,7 @@ TEST_F(DevicePath, RefusedOnesTouchNothing) {
         {L"\\missing\\a.txt", ERROR_PATH_NOT_FOUND},
         {L"\\kept.txt\\a.txt", ERROR_PATH_NOT_FOUND},
     };
-    ASSERT_TRUE(api_.CeCreateDirectory(L"\\f", nullptr));
+    ASSERT_TRUE(CeCreateDirectory(L"\\f", nullptr));
     ASSERT_TRUE(WriteNew(L"\\kept.txt", "kept"));
     WriteTextFile(outside, "outside");
     rapi::FindData data;
@@ -41,18 +41,18 @@ TEST_F(DevicePath, RefusedOnesTouchNothing) {
         SCOPED_TRACE(::testing::PrintToString(path));
         const wchar_t* const text = path.c_str();
         EXPECT_EQ(ErrorOf(Open(text, GENERIC_WRITE, OPEN_ALWAYS)), error);
-        EXPECT_EQ(ErrorOf(api_.CeDeleteFile(text)), error);
-        EXPECT_EQ(ErrorOf(api_.CeCreateDirectory(text, nullptr)), error);
-        EXPECT_EQ(ErrorOf(api_.CeRemoveDirectory(text)), error);
-        EXPECT_EQ(ErrorOf(api_.CeMoveFile(L"\\kept.txt", text)), error);
-        EXPECT_EQ(ErrorOf(api_.CeCopyFile(L"\\kept.txt", text, TRUE)), error);
-        EXPECT_EQ(ErrorOf(api_.CeCopyFile(text, L"\\copy.txt", TRUE)), error);
+        EXPECT_EQ(ErrorOf(CeDeleteFile(text)), error);
+        EXPECT_EQ(ErrorOf(CeCreateDirectory(text, nullptr)), error);
+        EXPECT_EQ(ErrorOf(CeRemoveDirectory(text)), error);
+        EXPECT_EQ(ErrorOf(CeMoveFile(L"\\kept.txt", text)), error);
+        EXPECT_EQ(ErrorOf(CeCopyFile(L"\\kept.txt", text, TRUE)), error);
+        EXPECT_EQ(ErrorOf(CeCopyFile(text, L"\\copy.txt", TRUE)), error);
         // A pattern may hold wildcards, and one that ends in "\" finds nothing.
         if (path.find_first_of(L"*?") == std::wstring::npos && !path.ends_with(L'\\')) {
-            EXPECT_EQ(ErrorOf(api_.CeFindFirstFile(text, &data)), error);
+            EXPECT_EQ(ErrorOf(CeFindFirstFile(text, &data)), error);
         }
     }
-    EXPECT_EQ(ErrorOf(api_.CeDeleteFile(nullptr)), DWORD{ERROR_INVALID_PARAMETER});
+    EXPECT_EQ(ErrorOf(CeDeleteFile(nullptr)), DWORD{ERROR_INVALID_PARAMETER});
     EXPECT_EQ(ListTree(device_.Root()), (std::vector<std::wstring>{L"f\\", L"kept.txt"}));
     EXPECT_EQ(ReadTextFile(outside), "outside");
     DeleteFileW(outside.c_str());
@@ -64,7 +64,7 @@ TEST_F(DevicePath, AShortNameReachesNothing) {
         GetShortPathNameW(device_.PcPath(path).c_str(), name, MAX_PATH);
         return std::wstring(name).substr(std::wstring(name).rfind(L'\\') + 1);
     };
-    ASSERT_TRUE(api_.CeCreateDirectory(L"\\a long folder name", nullptr));
+    ASSERT_TRUE(CeCreateDirectory(L"\\a long folder name", nullptr));
     ASSERT_TRUE(WriteNew(L"\\a long folder name\\a long file name.qvj", "kept"));
     const std::wstring folder_alias = alias_of(L"\\a long folder name");
     const std::wstring file_alias = alias_of(L"\\a long folder name\\a long file name.qvj");
@@ -76,8 +76,8 @@ TEST_F(DevicePath, AShortNameReachesNothing) {
         SCOPED_TRACE(::testing::PrintToString(path));
         rapi::FindData data;
         EXPECT_EQ(ErrorOf(Open(path.c_str(), GENERIC_WRITE, CREATE_ALWAYS)), DWORD{ERROR_INVALID_NAME});
-        EXPECT_EQ(ErrorOf(api_.CeDeleteFile(path.c_str())), DWORD{ERROR_INVALID_NAME});
-        EXPECT_EQ(ErrorOf(api_.CeFindFirstFile(path.c_str(), &data)), DWORD{ERROR_INVALID_NAME});
+        EXPECT_EQ(ErrorOf(CeDeleteFile(path.c_str())), DWORD{ERROR_INVALID_NAME});
+        EXPECT_EQ(ErrorOf(CeFindFirstFile(path.c_str(), &data)), DWORD{ERROR_INVALID_NAME});
     }
     EXPECT_EQ(ReadTextFile(device_.PcPath(L"\\a long folder name\\a long file name.qvj")), "kept");
 }
@@ -94,10 +94,10 @@ TEST_F(DevicePath, TheLongestOneWorksBelowALongRoot) {
     const std::wstring folder = L"\\" + std::wstring(128, L'd');
     const std::wstring file = folder + L"\\" + std::wstring(129, L'f');
     ASSERT_EQ(file.size(), 259U);
-    ASSERT_TRUE(api_.CeCreateDirectory(folder.c_str(), nullptr));
+    ASSERT_TRUE(CeCreateDirectory(folder.c_str(), nullptr));
     ASSERT_TRUE(WriteNew(file.c_str(), "long"));
     EXPECT_EQ(Names((folder + L"\\*").c_str()), std::vector<std::wstring>{file.substr(130)});
-    EXPECT_TRUE(api_.CeDeleteFile(file.c_str()));
+    EXPECT_TRUE(CeDeleteFile(file.c_str()));
 }
 
 TEST_F(DevicePath, NamesThatADeviceCannotHoldAreLeftOut) {

@@ -1,7 +1,7 @@
 #include <cwchar>
 #include <thread>
 
-#include "tests/folder_device/remote_api_table.h"
+#include "tests/folder_device/fixture.h"
 
 namespace orvane::testing {
 namespace {
@@ -34,29 +34,29 @@ TEST_F(Fault, TheNamedCallIsRefusedAndNoOther) {
                 L"CeCreateDirectory#2=5; CeDeleteFile@\\Jobs\\A.qvj=32 ;CeWriteFile@\\w=x.txt=1117;"
                 L"CeReadFile#2@\\r.txt=23;CeRapiInvoke=0x80070490;*@\\cursed=1392");
     Reconnect();
-    EXPECT_TRUE(api_.CeCreateDirectory(L"\\Jobs", nullptr));
-    EXPECT_EQ(ErrorOf(api_.CeCreateDirectory(L"\\2", nullptr)), DWORD{ERROR_ACCESS_DENIED});
-    EXPECT_EQ(api_.CeRapiGetError(), S_OK) << "the device was reached";
-    EXPECT_TRUE(api_.CeCreateDirectory(L"\\2", nullptr));
+    EXPECT_TRUE(CeCreateDirectory(L"\\Jobs", nullptr));
+    EXPECT_EQ(ErrorOf(CeCreateDirectory(L"\\2", nullptr)), DWORD{ERROR_ACCESS_DENIED});
+    EXPECT_EQ(CeRapiGetError(), S_OK) << "the device was reached";
+    EXPECT_TRUE(CeCreateDirectory(L"\\2", nullptr));
     for (const wchar_t* path : {L"\\Jobs\\a.qvj", L"\\Jobs\\b.qvj", L"\\r.txt"}) {
         ASSERT_TRUE(WriteNew(path, "content"));
     }
-    EXPECT_EQ(ErrorOf(api_.CeDeleteFile(L"\\jobs\\a.QVJ")), DWORD{ERROR_SHARING_VIOLATION});
-    EXPECT_TRUE(api_.CeDeleteFile(L"\\Jobs\\b.qvj"));
+    EXPECT_EQ(ErrorOf(CeDeleteFile(L"\\jobs\\a.QVJ")), DWORD{ERROR_SHARING_VIOLATION});
+    EXPECT_TRUE(CeDeleteFile(L"\\Jobs\\b.qvj"));
     EXPECT_FALSE(WriteNew(L"\\w=x.txt", "content"));
-    EXPECT_EQ(api_.CeGetLastError(), DWORD{ERROR_IO_DEVICE});
+    EXPECT_EQ(CeGetLastError(), DWORD{ERROR_IO_DEVICE});
     const HANDLE file = Open(L"\\r.txt", GENERIC_READ, OPEN_EXISTING);
     const HANDLE other = Open(L"\\Jobs\\a.qvj", GENERIC_READ, OPEN_EXISTING);
     char byte = 0;
     DWORD read = 0;
-    EXPECT_TRUE(api_.CeReadFile(file, &byte, 1, &read, nullptr));
-    EXPECT_TRUE(api_.CeReadFile(other, &byte, 1, &read, nullptr));
-    EXPECT_EQ(ErrorOf(api_.CeReadFile(file, &byte, 1, &read, nullptr)), DWORD{ERROR_CRC});
-    EXPECT_TRUE(api_.CeReadFile(file, &byte, 1, &read, nullptr));
+    EXPECT_TRUE(CeReadFile(file, &byte, 1, &read, nullptr));
+    EXPECT_TRUE(CeReadFile(other, &byte, 1, &read, nullptr));
+    EXPECT_EQ(ErrorOf(CeReadFile(file, &byte, 1, &read, nullptr)), DWORD{ERROR_CRC});
+    EXPECT_TRUE(CeReadFile(file, &byte, 1, &read, nullptr));
     EXPECT_EQ(byte, 'o');
-    EXPECT_EQ(api_.CeRapiInvoke(L"a.dll", L"f", 0, nullptr, nullptr, nullptr, nullptr, 0),
+    EXPECT_EQ(CeRapiInvoke(L"a.dll", L"f", 0, nullptr, nullptr, nullptr, nullptr, 0),
               static_cast<HRESULT>(0x80070490));
-    EXPECT_EQ(ErrorOf(api_.CeCreateDirectory(L"\\cursed", nullptr)), DWORD{ERROR_FILE_CORRUPT});
+    EXPECT_EQ(ErrorOf(CeCreateDirectory(L"\\cursed", nullptr)), DWORD{ERROR_FILE_CORRUPT});
 }
 
 TEST_F(Fault, AVanishedDeviceStaysAway) {
@@ -66,25 +66,25 @@ TEST_F(Fault, AVanishedDeviceStaysAway) {
     const HANDLE file = Open(L"\\a.txt", GENERIC_READ, OPEN_EXISTING);
     char byte = 0;
     DWORD read = 0;
-    EXPECT_TRUE(api_.CeReadFile(file, &byte, 1, &read, nullptr));
-    EXPECT_EQ(ErrorOf(api_.CeReadFile(file, &byte, 1, &read, nullptr)), DWORD{ERROR_DEVICE_NOT_CONNECTED});
-    EXPECT_EQ(api_.CeRapiGetError(), HRESULT_FROM_WIN32(ERROR_DEVICE_NOT_CONNECTED));
-    EXPECT_FALSE(api_.CeCloseHandle(file));
+    EXPECT_TRUE(CeReadFile(file, &byte, 1, &read, nullptr));
+    EXPECT_EQ(ErrorOf(CeReadFile(file, &byte, 1, &read, nullptr)), DWORD{ERROR_DEVICE_NOT_CONNECTED});
+    EXPECT_EQ(CeRapiGetError(), HRESULT_FROM_WIN32(ERROR_DEVICE_NOT_CONNECTED));
+    EXPECT_FALSE(CeCloseHandle(file));
     EXPECT_EQ(Names(L"\\*"), std::nullopt);
     device_.CloseSessions();
     EXPECT_EQ(Connect(), HRESULT_FROM_WIN32(ERROR_DEVICE_NOT_CONNECTED));
     EXPECT_EQ(device_.CloseSessions(), 1);
     device_.Clear(L"VANISH");
     EXPECT_EQ(Connect(), S_OK);
-    EXPECT_TRUE(api_.CeDeleteFile(L"\\a.txt"));
+    EXPECT_TRUE(CeDeleteFile(L"\\a.txt"));
 }
 
 TEST_F(Fault, CallsCanTakeTheirTime) {
     device_.Set(L"CALL_DELAY", L"60");
     Reconnect();
     const ULONGLONG start = GetTickCount64();
-    EXPECT_TRUE(api_.CeCreateDirectory(L"\\a", nullptr));
-    EXPECT_TRUE(api_.CeRemoveDirectory(L"\\a"));
+    EXPECT_TRUE(CeCreateDirectory(L"\\a", nullptr));
+    EXPECT_TRUE(CeRemoveDirectory(L"\\a"));
     EXPECT_GE(GetTickCount64() - start, 110U);
 }
 
@@ -93,7 +93,7 @@ class IniFile : public Fault {
   protected:
     IniFile() {
         wchar_t dll[MAX_PATH];
-        GetModuleFileNameW(api_.library, dll, MAX_PATH);
+        GetModuleFileNameW(GetModuleHandleW(L"RAPI.DLL"), dll, MAX_PATH);
         path_ = dll;
         path_.replace(path_.rfind(L'\\') + 1, std::wstring::npos, L"folder_device.ini");
     }
@@ -115,7 +115,7 @@ TEST_F(IniFile, CountsWhereTheEnvironmentIsSilent) {
     WriteTextFile(path_, "[other]\nCAPACITY=1\n[Folder_Device]\ncapacity = 4096\nROOT=nowhere\n");
     const auto total = [this] {
         ULARGE_INTEGER bytes{};
-        EXPECT_TRUE(api_.CeGetDiskFreeSpaceEx(nullptr, nullptr, &bytes, nullptr));
+        EXPECT_TRUE(CeGetDiskFreeSpaceEx(nullptr, nullptr, &bytes, nullptr));
         return bytes.QuadPart;
     };
     Reconnect();  // ROOT is in the environment.
@@ -135,8 +135,8 @@ TEST_F(Fault, TheTraceTellsEveryCall) {
     ASSERT_EQ(file, INVALID_HANDLE_VALUE);
     const HANDLE made = Open(L"\\J\u00F6b.txt", GENERIC_WRITE, CREATE_NEW);
     EXPECT_TRUE(Write(made, "12345"));
-    EXPECT_TRUE(api_.CeCloseHandle(made));
-    std::thread([this] { api_.CeMoveFile(L"\\a", nullptr); }).join();
+    EXPECT_TRUE(CeCloseHandle(made));
+    std::thread([this] { CeMoveFile(L"\\a", nullptr); }).join();
     device_.CloseSessions();
 
     const std::vector<TraceLine> lines = device_.Trace();

@@ -1,4 +1,4 @@
-#include "tests/folder_device/remote_api_table.h"
+#include "tests/folder_device/fixture.h"
 
 namespace orvane::testing {
 namespace {
@@ -14,7 +14,7 @@ TEST_F(DeviceFile, OpensAsThePcDoes) {
     ASSERT_TRUE(WriteNew(L"\\old.txt", "old"));
     ASSERT_TRUE(WriteNew(L"\\locked.txt", "locked"));
     ASSERT_TRUE(SetFileAttributesW(device_.PcPath(L"\\locked.txt").c_str(), FILE_ATTRIBUTE_READONLY));
-    ASSERT_TRUE(api_.CeCreateDirectory(L"\\folder", nullptr));
+    ASSERT_TRUE(CeCreateDirectory(L"\\folder", nullptr));
     const struct {
         const wchar_t* path;
         DWORD access;
@@ -34,7 +34,7 @@ TEST_F(DeviceFile, OpensAsThePcDoes) {
         const HANDLE file = Open(path, access, creation);
         EXPECT_EQ(ErrorOf(file), error);
         if (file != INVALID_HANDLE_VALUE) {
-            EXPECT_TRUE(api_.CeCloseHandle(file));
+            EXPECT_TRUE(CeCloseHandle(file));
         }
     }
     EXPECT_EQ(ReadTextFile(device_.PcPath(L"\\locked.txt")), "locked");
@@ -45,33 +45,33 @@ TEST_F(DeviceFile, SharesAsItWasOpened) {
     const HANDLE alone = Open(L"\\a.txt", GENERIC_READ, OPEN_EXISTING);
     EXPECT_EQ(ErrorOf(Open(L"\\a.txt", GENERIC_READ, OPEN_EXISTING, FILE_SHARE_READ)),
               DWORD{ERROR_SHARING_VIOLATION});
-    EXPECT_TRUE(api_.CeCloseHandle(alone));
+    EXPECT_TRUE(CeCloseHandle(alone));
     const HANDLE open =
         Open(L"\\a.txt", GENERIC_READ, OPEN_EXISTING, FILE_SHARE_READ | FILE_SHARE_WRITE | FILE_SHARE_DELETE);
-    EXPECT_EQ(ErrorOf(api_.CeDeleteFile(L"\\a.txt")), DWORD{ERROR_SHARING_VIOLATION});
-    EXPECT_EQ(ErrorOf(api_.CeMoveFile(L"\\a.txt", L"\\b.txt")), DWORD{ERROR_SHARING_VIOLATION});
-    EXPECT_TRUE(api_.CeCloseHandle(open));
-    EXPECT_TRUE(api_.CeMoveFile(L"\\a.txt", L"\\b.txt"));
+    EXPECT_EQ(ErrorOf(CeDeleteFile(L"\\a.txt")), DWORD{ERROR_SHARING_VIOLATION});
+    EXPECT_EQ(ErrorOf(CeMoveFile(L"\\a.txt", L"\\b.txt")), DWORD{ERROR_SHARING_VIOLATION});
+    EXPECT_TRUE(CeCloseHandle(open));
+    EXPECT_TRUE(CeMoveFile(L"\\a.txt", L"\\b.txt"));
 }
 
 TEST_F(DeviceFile, ReadsWritesAndMovesItsPosition) {
     const HANDLE file = Open(L"\\a.bin", GENERIC_READ | GENERIC_WRITE, CREATE_NEW);
     ASSERT_TRUE(Write(file, "0123456789"));
     LONG high = -1;
-    EXPECT_EQ(api_.CeSetFilePointer(file, -4, &high, FILE_CURRENT), 6U);
+    EXPECT_EQ(CeSetFilePointer(file, -4, &high, FILE_CURRENT), 6U);
     char bytes[8] = {};
     DWORD read = 99;
-    EXPECT_TRUE(api_.CeReadFile(file, bytes, sizeof(bytes), &read, nullptr));
+    EXPECT_TRUE(CeReadFile(file, bytes, sizeof(bytes), &read, nullptr));
     EXPECT_EQ(std::string(bytes, read), "6789");
-    EXPECT_TRUE(api_.CeReadFile(file, bytes, sizeof(bytes), &read, nullptr));
+    EXPECT_TRUE(CeReadFile(file, bytes, sizeof(bytes), &read, nullptr));
     EXPECT_EQ(read, 0U);
-    EXPECT_EQ(api_.CeGetFileSize(file, nullptr), 10U);
-    EXPECT_EQ(api_.CeSetFilePointer(file, -11, nullptr, FILE_END), INVALID_SET_FILE_POINTER);
-    EXPECT_EQ(api_.CeGetLastError(), DWORD{ERROR_NEGATIVE_SEEK});
-    EXPECT_TRUE(api_.CeCloseHandle(file));
+    EXPECT_EQ(CeGetFileSize(file, nullptr), 10U);
+    EXPECT_EQ(CeSetFilePointer(file, -11, nullptr, FILE_END), INVALID_SET_FILE_POINTER);
+    EXPECT_EQ(CeGetLastError(), DWORD{ERROR_NEGATIVE_SEEK});
+    EXPECT_TRUE(CeCloseHandle(file));
     const HANDLE read_only = Open(L"\\a.bin", GENERIC_READ, OPEN_EXISTING);
     EXPECT_FALSE(Write(read_only, "x"));
-    EXPECT_EQ(api_.CeGetLastError(), DWORD{ERROR_ACCESS_DENIED});
+    EXPECT_EQ(CeGetLastError(), DWORD{ERROR_ACCESS_DENIED});
 }
 
 TEST_F(DeviceFile, HandlesAreClosedOnceAndByTheirOwnCloser) {
@@ -81,16 +81,16 @@ TEST_F(DeviceFile, HandlesAreClosedOnceAndByTheirOwnCloser) {
     device_.SetRegistry("[HKCU\\Key]");
     Reconnect();
     const HANDLE file = Open(L"\\a.txt", GENERIC_READ, OPEN_EXISTING);
-    const HANDLE search = api_.CeFindFirstFile(L"\\*", &data);
-    ASSERT_EQ(api_.CeRegOpenKeyEx(HKEY_CURRENT_USER, L"Key", 0, 0, &key), 0);
-    EXPECT_EQ(ErrorOf(api_.CeCloseHandle(search)), DWORD{ERROR_INVALID_HANDLE});
-    EXPECT_EQ(ErrorOf(api_.CeFindClose(file)), DWORD{ERROR_INVALID_HANDLE});
-    EXPECT_TRUE(api_.CeCloseHandle(file));
-    EXPECT_TRUE(api_.CeFindClose(search));
-    EXPECT_EQ(api_.CeRegCloseKey(key), 0);
-    EXPECT_EQ(ErrorOf(api_.CeCloseHandle(file)), DWORD{ERROR_INVALID_HANDLE});
-    EXPECT_EQ(ErrorOf(api_.CeFindClose(search)), DWORD{ERROR_INVALID_HANDLE});
-    EXPECT_EQ(api_.CeRegCloseKey(key), ERROR_INVALID_HANDLE);
+    const HANDLE search = CeFindFirstFile(L"\\*", &data);
+    ASSERT_EQ(CeRegOpenKeyEx(HKEY_CURRENT_USER, L"Key", 0, 0, &key), 0);
+    EXPECT_EQ(ErrorOf(CeCloseHandle(search)), DWORD{ERROR_INVALID_HANDLE});
+    EXPECT_EQ(ErrorOf(CeFindClose(file)), DWORD{ERROR_INVALID_HANDLE});
+    EXPECT_TRUE(CeCloseHandle(file));
+    EXPECT_TRUE(CeFindClose(search));
+    EXPECT_EQ(CeRegCloseKey(key), 0);
+    EXPECT_EQ(ErrorOf(CeCloseHandle(file)), DWORD{ERROR_INVALID_HANDLE});
+    EXPECT_EQ(ErrorOf(CeFindClose(search)), DWORD{ERROR_INVALID_HANDLE});
+    EXPECT_EQ(CeRegCloseKey(key), ERROR_INVALID_HANDLE);
 }
 
 // How many seconds the time lies after now.
@@ -106,29 +106,29 @@ TEST_F(DeviceFile, NewAndEmptiedFilesHaveTheDevicesTime) {
         const FILETIME old = UtcTime(2001, 1, 1);
         WriteTextFile(device_.PcPath(L"\\a.txt"), "old");
         const HANDLE aged = Open(L"\\a.txt", GENERIC_WRITE, OPEN_EXISTING);
-        EXPECT_TRUE(api_.CeSetFileTime(aged, &old, &old, &old));
-        EXPECT_TRUE(api_.CeCloseHandle(aged));
+        EXPECT_TRUE(CeSetFileTime(aged, &old, &old, &old));
+        EXPECT_TRUE(CeCloseHandle(aged));
         device_.Set(L"CLOCK_OFFSET", std::to_wstring(static_cast<int>(offset)));
         Reconnect();
         const HANDLE file = Open(L"\\a.txt", GENERIC_READ | GENERIC_WRITE, CREATE_ALWAYS, FILE_SHARE_READ);
         FILETIME creation{};
         FILETIME last_access{};
         FILETIME last_write{};
-        EXPECT_TRUE(api_.CeGetFileTime(file, &creation, &last_access, &last_write));
+        EXPECT_TRUE(CeGetFileTime(file, &creation, &last_access, &last_write));
         EXPECT_NEAR(Ahead(creation), offset, 5);
         EXPECT_NEAR(Ahead(last_access), offset, 5);
         EXPECT_NEAR(Ahead(last_write), offset, 5);
         ASSERT_TRUE(Write(file, "a"));
-        EXPECT_TRUE(api_.CeGetFileTime(file, nullptr, nullptr, &last_write));
+        EXPECT_TRUE(CeGetFileTime(file, nullptr, nullptr, &last_write));
         EXPECT_NEAR(Ahead(last_write), offset, 5);
-        EXPECT_TRUE(api_.CeCloseHandle(file));
+        EXPECT_TRUE(CeCloseHandle(file));
         // A time that is set is a time, whatever the clock shows; later writes change nothing.
         const HANDLE stamped = Open(L"\\a.txt", GENERIC_WRITE, OPEN_EXISTING);
-        EXPECT_TRUE(api_.CeSetFileTime(stamped, nullptr, nullptr, &old));
+        EXPECT_TRUE(CeSetFileTime(stamped, nullptr, nullptr, &old));
         EXPECT_TRUE(Write(stamped, "b"));
-        EXPECT_TRUE(api_.CeCloseHandle(stamped));
+        EXPECT_TRUE(CeCloseHandle(stamped));
         EXPECT_EQ(TicksOf(LastWriteTime(device_.PcPath(L"\\a.txt"))), TicksOf(old));
-        EXPECT_TRUE(api_.CeDeleteFile(L"\\a.txt"));
+        EXPECT_TRUE(CeDeleteFile(L"\\a.txt"));
     }
 }
 

@@ -1,6 +1,6 @@
 #include <algorithm>
 
-#include "tests/folder_device/remote_api_table.h"
+#include "tests/folder_device/fixture.h"
 
 namespace orvane::testing {
 namespace {
@@ -12,16 +12,16 @@ class Find : public FolderDeviceTest {
     // The names that a search gives one by one; nothing when it finds none.
     std::optional<StringList> Search(const wchar_t* pattern) {
         rapi::FindData data;
-        const HANDLE search = api_.CeFindFirstFile(pattern, &data);
+        const HANDLE search = CeFindFirstFile(pattern, &data);
         if (search == INVALID_HANDLE_VALUE) {
             return std::nullopt;
         }
         StringList names;
         do {
             names.emplace_back(data.name);
-        } while (api_.CeFindNextFile(search, &data));
-        EXPECT_EQ(api_.CeGetLastError(), DWORD{ERROR_NO_MORE_FILES});
-        EXPECT_TRUE(api_.CeFindClose(search));
+        } while (CeFindNextFile(search, &data));
+        EXPECT_EQ(CeGetLastError(), DWORD{ERROR_NO_MORE_FILES});
+        EXPECT_TRUE(CeFindClose(search));
         std::sort(names.begin(), names.end());
         return names;
     }
@@ -60,9 +60,9 @@ TEST_F(Find, PatternsAreOfNamesAsTheyStand) {
     };
     for (const auto& [pattern, error] : refused) {
         EXPECT_EQ(Search(pattern), std::nullopt);
-        EXPECT_EQ(api_.CeGetLastError(), error);
+        EXPECT_EQ(CeGetLastError(), error);
         EXPECT_EQ(Names(pattern), std::nullopt);
-        EXPECT_EQ(api_.CeGetLastError(), error);
+        EXPECT_EQ(CeGetLastError(), error);
     }
 }
 
@@ -72,10 +72,10 @@ TEST_F(Find, OnlyTheFieldsAskedForAreFilled) {
     const auto find = [&](DWORD flags) {
         DWORD count = 0;
         rapi::FindData* found = nullptr;
-        EXPECT_TRUE(api_.CeFindAllFiles(L"\\a.txt", flags, &count, &found));
+        EXPECT_TRUE(CeFindAllFiles(L"\\a.txt", flags, &count, &found));
         EXPECT_EQ(count, 1U);
         const rapi::FindData data = count == 1 ? *found : rapi::FindData{};
-        EXPECT_EQ(api_.CeRapiFreeBuffer(found), S_OK);
+        EXPECT_EQ(CeRapiFreeBuffer(found), S_OK);
         return data;
     };
     const rapi::FindData all = find(0xFF);
@@ -101,7 +101,7 @@ TEST_F(Find, ListingsCanBeMadeHostile) {
     Reconnect();
     DWORD count = 0;
     rapi::FindData* found = nullptr;
-    ASSERT_TRUE(api_.CeFindAllFiles(L"\\Jobs\\*", 0xBF, &count, &found));
+    ASSERT_TRUE(CeFindAllFiles(L"\\Jobs\\*", 0xBF, &count, &found));
     ASSERT_EQ(count, 6U);
     EXPECT_STREQ(found[0].name, L"real.qvj");
     EXPECT_STREQ(found[1].name, L"..\\evil.qvj");
@@ -113,13 +113,13 @@ TEST_F(Find, ListingsCanBeMadeHostile) {
     EXPECT_EQ(std::wstring_view(found[5].name, 7), L"full.fu");
     EXPECT_EQ(found[5].size_high, 1U);
     EXPECT_EQ(found[5].size_low, 705032704U);
-    EXPECT_EQ(api_.CeRapiFreeBuffer(found), S_OK);
+    EXPECT_EQ(CeRapiFreeBuffer(found), S_OK);
     EXPECT_EQ(Search(L"\\*.qvj"), StringList{L"top.qvj"});
 
     device_.Set(L"FOUND_COUNT", L"0xFFFFFFFF");
     device_.Set(L"FOUND_NULL", L"1");
     Reconnect();
-    ASSERT_TRUE(api_.CeFindAllFiles(L"\\Jobs\\*", 0xBF, &count, &found));
+    ASSERT_TRUE(CeFindAllFiles(L"\\Jobs\\*", 0xBF, &count, &found));
     EXPECT_EQ(count, MAXDWORD);
     EXPECT_EQ(found, nullptr);
 }

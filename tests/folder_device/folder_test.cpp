@@ -1,4 +1,4 @@
-#include "tests/folder_device/remote_api_table.h"
+#include "tests/folder_device/fixture.h"
 
 namespace orvane::testing {
 namespace {
@@ -20,25 +20,23 @@ TEST_F(Folder, CallsByNameFailAsADeviceDoes) {
         DWORD error;
         DWORD expected;
     } calls[] = {
-        {"create folder again", ErrorOf(api_.CeCreateDirectory(L"\\empty", nullptr)), ERROR_ALREADY_EXISTS},
-        {"create two levels", ErrorOf(api_.CeCreateDirectory(L"\\x\\y", nullptr)), ERROR_PATH_NOT_FOUND},
-        {"remove the root", ErrorOf(api_.CeRemoveDirectory(L"\\")), ERROR_ACCESS_DENIED},
-        {"remove a full folder", ErrorOf(api_.CeRemoveDirectory(L"\\full")), ERROR_DIR_NOT_EMPTY},
-        {"remove a file as folder", ErrorOf(api_.CeRemoveDirectory(L"\\a.txt")), ERROR_DIRECTORY},
-        {"delete a folder", ErrorOf(api_.CeDeleteFile(L"\\empty")), ERROR_ACCESS_DENIED},
-        {"delete a read-only file", ErrorOf(api_.CeDeleteFile(L"\\locked.txt")), ERROR_ACCESS_DENIED},
-        {"move over a file", ErrorOf(api_.CeMoveFile(L"\\a.txt", L"\\b.txt")), ERROR_ALREADY_EXISTS},
-        {"copy a folder", ErrorOf(api_.CeCopyFile(L"\\full", L"\\c", FALSE)), ERROR_ACCESS_DENIED},
-        {"copy over, forbidden", ErrorOf(api_.CeCopyFile(L"\\a.txt", L"\\b.txt", TRUE)), ERROR_FILE_EXISTS},
-        {"copy over read-only", ErrorOf(api_.CeCopyFile(L"\\a.txt", L"\\locked.txt", FALSE)),
-         ERROR_ACCESS_DENIED},
-        {"copy onto itself", ErrorOf(api_.CeCopyFile(L"\\a.txt", L"\\A.TXT", FALSE)),
-         ERROR_SHARING_VIOLATION},
+        {"create folder again", ErrorOf(CeCreateDirectory(L"\\empty", nullptr)), ERROR_ALREADY_EXISTS},
+        {"create two levels", ErrorOf(CeCreateDirectory(L"\\x\\y", nullptr)), ERROR_PATH_NOT_FOUND},
+        {"remove the root", ErrorOf(CeRemoveDirectory(L"\\")), ERROR_ACCESS_DENIED},
+        {"remove a full folder", ErrorOf(CeRemoveDirectory(L"\\full")), ERROR_DIR_NOT_EMPTY},
+        {"remove a file as folder", ErrorOf(CeRemoveDirectory(L"\\a.txt")), ERROR_DIRECTORY},
+        {"delete a folder", ErrorOf(CeDeleteFile(L"\\empty")), ERROR_ACCESS_DENIED},
+        {"delete a read-only file", ErrorOf(CeDeleteFile(L"\\locked.txt")), ERROR_ACCESS_DENIED},
+        {"move over a file", ErrorOf(CeMoveFile(L"\\a.txt", L"\\b.txt")), ERROR_ALREADY_EXISTS},
+        {"copy a folder", ErrorOf(CeCopyFile(L"\\full", L"\\c", FALSE)), ERROR_ACCESS_DENIED},
+        {"copy over, forbidden", ErrorOf(CeCopyFile(L"\\a.txt", L"\\b.txt", TRUE)), ERROR_FILE_EXISTS},
+        {"copy over read-only", ErrorOf(CeCopyFile(L"\\a.txt", L"\\locked.txt", FALSE)), ERROR_ACCESS_DENIED},
+        {"copy onto itself", ErrorOf(CeCopyFile(L"\\a.txt", L"\\A.TXT", FALSE)), ERROR_SHARING_VIOLATION},
     };
     for (const auto& [call, error, expected] : calls) {
         EXPECT_EQ(error, expected) << call;
     }
-    EXPECT_FALSE(api_.CeMoveFile(L"\\full", L"\\full\\inner"));
+    EXPECT_FALSE(CeMoveFile(L"\\full", L"\\full\\inner"));
     EXPECT_EQ(ListTree(device_.Root()), before);
     EXPECT_EQ(ReadTextFile(device_.PcPath(L"\\a.txt")), "a");
     EXPECT_EQ(ReadTextFile(device_.PcPath(L"\\b.txt")), "b");
@@ -47,17 +45,17 @@ TEST_F(Folder, CallsByNameFailAsADeviceDoes) {
 
 TEST_F(Folder, IsFilledRearrangedAndEmptied) {
     const FILETIME written = UtcTime(2017, 1, 2, 3, 4, 6);
-    ASSERT_TRUE(api_.CeCreateDirectory(L"\\a", nullptr));
+    ASSERT_TRUE(CeCreateDirectory(L"\\a", nullptr));
     WriteTextFile(device_.PcPath(L"\\a\\1.txt"), "one", written);
-    EXPECT_TRUE(api_.CeCopyFile(L"\\a\\1.txt", L"\\a\\2.txt", TRUE));
-    EXPECT_TRUE(api_.CeMoveFile(L"\\a\\1.txt", L"\\3.txt"));
-    EXPECT_TRUE(api_.CeMoveFile(L"\\a", L"\\b"));
+    EXPECT_TRUE(CeCopyFile(L"\\a\\1.txt", L"\\a\\2.txt", TRUE));
+    EXPECT_TRUE(CeMoveFile(L"\\a\\1.txt", L"\\3.txt"));
+    EXPECT_TRUE(CeMoveFile(L"\\a", L"\\b"));
     EXPECT_EQ(ListTree(device_.Root()), (StringList{L"3.txt", L"b\\", L"b\\2.txt"}));
     EXPECT_EQ(ReadTextFile(device_.PcPath(L"\\b\\2.txt")), "one");
     EXPECT_EQ(TicksOf(LastWriteTime(device_.PcPath(L"\\b\\2.txt"))), TicksOf(written));
-    EXPECT_TRUE(api_.CeCopyFile(L"\\b\\2.txt", L"\\3.txt", FALSE));
-    EXPECT_TRUE(api_.CeDeleteFile(L"\\b\\2.txt"));
-    EXPECT_TRUE(api_.CeRemoveDirectory(L"\\b"));
+    EXPECT_TRUE(CeCopyFile(L"\\b\\2.txt", L"\\3.txt", FALSE));
+    EXPECT_TRUE(CeDeleteFile(L"\\b\\2.txt"));
+    EXPECT_TRUE(CeRemoveDirectory(L"\\b"));
     EXPECT_EQ(ListTree(device_.Root()), StringList{L"3.txt"});
 }
 
@@ -129,9 +127,9 @@ TEST_F(Folder, LinksLeadNowhere) {
     rapi::FindData data;
     EXPECT_EQ(Names(L"\\*"), StringList{});
     EXPECT_EQ(ErrorOf(Open(L"\\link\\secret.txt", GENERIC_READ, OPEN_EXISTING)), DWORD{ERROR_ACCESS_DENIED});
-    EXPECT_EQ(ErrorOf(api_.CeDeleteFile(L"\\link\\secret.txt")), DWORD{ERROR_ACCESS_DENIED});
-    EXPECT_EQ(ErrorOf(api_.CeFindFirstFile(L"\\link\\*", &data)), DWORD{ERROR_ACCESS_DENIED});
-    EXPECT_EQ(ErrorOf(api_.CeCreateDirectory(L"\\link\\made", nullptr)), DWORD{ERROR_ACCESS_DENIED});
+    EXPECT_EQ(ErrorOf(CeDeleteFile(L"\\link\\secret.txt")), DWORD{ERROR_ACCESS_DENIED});
+    EXPECT_EQ(ErrorOf(CeFindFirstFile(L"\\link\\*", &data)), DWORD{ERROR_ACCESS_DENIED});
+    EXPECT_EQ(ErrorOf(CeCreateDirectory(L"\\link\\made", nullptr)), DWORD{ERROR_ACCESS_DENIED});
     EXPECT_EQ(ListTree(outside.Path()), StringList{L"secret.txt"});
 }
 
@@ -141,33 +139,33 @@ TEST_F(Folder, AFullStorageRefusesAndHasRoomAgain) {
     Reconnect();
     const auto room = [this] {
         ULARGE_INTEGER left{};
-        EXPECT_TRUE(api_.CeGetDiskFreeSpaceEx(L"\\Jobs", &left, nullptr, nullptr));
+        EXPECT_TRUE(CeGetDiskFreeSpaceEx(L"\\Jobs", &left, nullptr, nullptr));
         return left.QuadPart;
     };
     EXPECT_EQ(room(), 40U);
     const HANDLE file = Open(L"\\new.bin", GENERIC_WRITE, CREATE_NEW);
     EXPECT_TRUE(Write(file, std::string(30, 'n')));
     DWORD written = 99;
-    EXPECT_FALSE(api_.CeWriteFile(file, "12345678901", 11, &written, nullptr));
-    EXPECT_EQ(api_.CeGetLastError(), DWORD{ERROR_DISK_FULL});
+    EXPECT_FALSE(CeWriteFile(file, "12345678901", 11, &written, nullptr));
+    EXPECT_EQ(CeGetLastError(), DWORD{ERROR_DISK_FULL});
     EXPECT_EQ(written, 0U);
     EXPECT_EQ(room(), 10U);
     // Writing over what is there takes no room; a gap does.
-    api_.CeSetFilePointer(file, 0, nullptr, FILE_BEGIN);
+    CeSetFilePointer(file, 0, nullptr, FILE_BEGIN);
     EXPECT_TRUE(Write(file, std::string(40, 'm')));
     EXPECT_EQ(room(), 0U);
-    api_.CeSetFilePointer(file, 500, nullptr, FILE_BEGIN);
+    CeSetFilePointer(file, 500, nullptr, FILE_BEGIN);
     EXPECT_FALSE(Write(file, "x"));
-    EXPECT_TRUE(api_.CeCloseHandle(file));
-    EXPECT_EQ(ErrorOf(api_.CeCopyFile(L"\\new.bin", L"\\copy.bin", TRUE)), DWORD{ERROR_DISK_FULL});
+    EXPECT_TRUE(CeCloseHandle(file));
+    EXPECT_EQ(ErrorOf(CeCopyFile(L"\\new.bin", L"\\copy.bin", TRUE)), DWORD{ERROR_DISK_FULL});
     EXPECT_FALSE(Exists(device_.PcPath(L"\\copy.bin")));
 
-    EXPECT_TRUE(api_.CeDeleteFile(L"\\Jobs\\old.bin"));
+    EXPECT_TRUE(CeDeleteFile(L"\\Jobs\\old.bin"));
     EXPECT_EQ(room(), 60U);
-    EXPECT_TRUE(api_.CeCopyFile(L"\\new.bin", L"\\copy.bin", TRUE));
+    EXPECT_TRUE(CeCopyFile(L"\\new.bin", L"\\copy.bin", TRUE));
     EXPECT_EQ(room(), 20U);
-    EXPECT_TRUE(api_.CeCloseHandle(Open(L"\\copy.bin", GENERIC_WRITE, CREATE_ALWAYS)));
-    EXPECT_TRUE(api_.CeCloseHandle(Open(L"\\new.bin", GENERIC_WRITE, TRUNCATE_EXISTING)));
+    EXPECT_TRUE(CeCloseHandle(Open(L"\\copy.bin", GENERIC_WRITE, CREATE_ALWAYS)));
+    EXPECT_TRUE(CeCloseHandle(Open(L"\\new.bin", GENERIC_WRITE, TRUNCATE_EXISTING)));
     EXPECT_EQ(room(), 100U);
     // What was put there past the device counts from the next session on.
     WriteTextFile(device_.PcPath(L"\\Jobs\\past.bin"), std::string(150, 'p'));

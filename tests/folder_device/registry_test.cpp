@@ -1,4 +1,4 @@
-#include "tests/folder_device/remote_api_table.h"
+#include "tests/folder_device/fixture.h"
 
 namespace orvane::testing {
 namespace {
@@ -19,9 +19,7 @@ class DeviceRegistry : public FolderDeviceTest {
         Reconnect();
     }
 
-    LONG OpenKey(HKEY root, const wchar_t* path, HKEY& key) {
-        return api_.CeRegOpenKeyEx(root, path, 0, 0, &key);
-    }
+    LONG OpenKey(HKEY root, const wchar_t* path, HKEY& key) { return CeRegOpenKeyEx(root, path, 0, 0, &key); }
 };
 
 TEST_F(DeviceRegistry, KeysAreThoseOfTheFileAndThoseAbove) {
@@ -44,8 +42,8 @@ TEST_F(DeviceRegistry, KeysAreThoseOfTheFileAndThoseAbove) {
     HKEY field = nullptr;
     ASSERT_EQ(OpenKey(HKEY_CURRENT_USER, L"Software", software), 0);
     EXPECT_EQ(OpenKey(software, L"Maker\\Field", field), 0);
-    EXPECT_EQ(api_.CeRegCloseKey(software), 0);
-    EXPECT_EQ(api_.CeRegQueryValueEx(field, L"Number", nullptr, nullptr, nullptr, nullptr), 0);
+    EXPECT_EQ(CeRegCloseKey(software), 0);
+    EXPECT_EQ(CeRegQueryValueEx(field, L"Number", nullptr, nullptr, nullptr, nullptr), 0);
 }
 
 TEST_F(DeviceRegistry, ValuesHaveTheirTypesAndSizes) {
@@ -69,16 +67,15 @@ TEST_F(DeviceRegistry, ValuesHaveTheirTypesAndSizes) {
         DWORD found_type = 99;
         BYTE* const bytes = reinterpret_cast<BYTE*>(buffer.data());
         DWORD size = static_cast<DWORD>(data.size() - 1);
-        EXPECT_EQ(api_.CeRegQueryValueEx(key, name, nullptr, &found_type, bytes, &size), ERROR_MORE_DATA);
+        EXPECT_EQ(CeRegQueryValueEx(key, name, nullptr, &found_type, bytes, &size), ERROR_MORE_DATA);
         EXPECT_EQ(size, data.size());
         EXPECT_EQ(buffer, std::string(64, '?'));
-        EXPECT_EQ(api_.CeRegQueryValueEx(key, name, nullptr, &found_type, bytes, &size), 0);
+        EXPECT_EQ(CeRegQueryValueEx(key, name, nullptr, &found_type, bytes, &size), 0);
         EXPECT_EQ(found_type, type);
         EXPECT_EQ(buffer.substr(0, size), data);
     }
     for (const wchar_t* missing : {L"None", L"Broken"}) {
-        EXPECT_EQ(api_.CeRegQueryValueEx(key, missing, nullptr, nullptr, nullptr, nullptr),
-                  ERROR_FILE_NOT_FOUND);
+        EXPECT_EQ(CeRegQueryValueEx(key, missing, nullptr, nullptr, nullptr, nullptr), ERROR_FILE_NOT_FOUND);
     }
 }
 

@@ -1,7 +1,7 @@
 #include <memory>
 #include <thread>
 
-#include "tests/folder_device/remote_api_table.h"
+#include "tests/folder_device/fixture.h"
 
 namespace orvane::testing {
 namespace {
@@ -10,17 +10,17 @@ class Session : public FolderDeviceTest {};
 
 TEST_F(Session, AreCountedPerThread) {
     EXPECT_EQ(Connect(), S_OK);
-    EXPECT_EQ(api_.CeRapiUninit(), S_OK);
+    EXPECT_EQ(CeRapiUninit(), S_OK);
     EXPECT_TRUE(Names(L"\\*"));
     std::thread([this] {
         EXPECT_FALSE(Names(L"\\*"));
-        EXPECT_EQ(api_.CeGetLastError(), DWORD{ERROR_NOT_CONNECTED});
-        EXPECT_EQ(api_.CeRapiUninit(), E_FAIL);
+        EXPECT_EQ(CeGetLastError(), DWORD{ERROR_NOT_CONNECTED});
+        EXPECT_EQ(CeRapiUninit(), E_FAIL);
         EXPECT_EQ(Connect(), S_OK);
         EXPECT_TRUE(Names(L"\\*"));  // The thread ends with its session open.
     }).join();
-    EXPECT_EQ(api_.CeRapiUninit(), S_OK);
-    EXPECT_EQ(api_.CeRapiUninit(), E_FAIL);
+    EXPECT_EQ(CeRapiUninit(), S_OK);
+    EXPECT_EQ(CeRapiUninit(), E_FAIL);
     // No session is left in the process, so a new setting is read.
     device_.Set(L"INIT_RESULT", L"0x80070005");
     EXPECT_EQ(Connect(), E_ACCESSDENIED);
@@ -31,24 +31,24 @@ TEST_F(Session, OutsideOfOneEveryCallToTheDeviceFails) {
     const HANDLE file = Open(L"\\a.txt", GENERIC_READ, OPEN_EXISTING);
     DWORD count = 0;
     rapi::FindData* found = nullptr;
-    ASSERT_TRUE(api_.CeFindAllFiles(L"\\*", rapi::kFindName, &count, &found));
+    ASSERT_TRUE(CeFindAllFiles(L"\\*", rapi::kFindName, &count, &found));
     device_.CloseSessions();
 
     char byte = 0;
     DWORD size = 1;
-    EXPECT_FALSE(api_.CeCloseHandle(file));
-    EXPECT_FALSE(api_.CeDeleteFile(L"\\a.txt"));
-    EXPECT_FALSE(api_.CeMoveFile(L"\\a.txt", L"\\b.txt"));
-    EXPECT_FALSE(api_.CeReadFile(file, &byte, 1, &size, nullptr));
-    EXPECT_FALSE(api_.CeWriteFile(file, &byte, 1, &size, nullptr));
-    EXPECT_NE(api_.CeRegCloseKey(HKEY_CURRENT_USER), 0);
+    EXPECT_FALSE(CeCloseHandle(file));
+    EXPECT_FALSE(CeDeleteFile(L"\\a.txt"));
+    EXPECT_FALSE(CeMoveFile(L"\\a.txt", L"\\b.txt"));
+    EXPECT_FALSE(CeReadFile(file, &byte, 1, &size, nullptr));
+    EXPECT_FALSE(CeWriteFile(file, &byte, 1, &size, nullptr));
+    EXPECT_NE(CeRegCloseKey(HKEY_CURRENT_USER), 0);
     EXPECT_EQ(Open(L"\\a.txt", GENERIC_READ, OPEN_EXISTING), INVALID_HANDLE_VALUE);
-    EXPECT_EQ(api_.CeGetLastError(), DWORD{ERROR_NOT_CONNECTED});
-    EXPECT_EQ(api_.CeRapiGetError(), HRESULT_FROM_WIN32(ERROR_NOT_CONNECTED));
+    EXPECT_EQ(CeGetLastError(), DWORD{ERROR_NOT_CONNECTED});
+    EXPECT_EQ(CeRapiGetError(), HRESULT_FROM_WIN32(ERROR_NOT_CONNECTED));
     // Listings stay the caller's, and are freed once only.
     EXPECT_EQ(std::wstring(found != nullptr ? found->name : L""), L"a.txt");
-    EXPECT_EQ(api_.CeRapiFreeBuffer(found), S_OK);
-    EXPECT_EQ(api_.CeRapiFreeBuffer(found), E_INVALIDARG);
+    EXPECT_EQ(CeRapiFreeBuffer(found), S_OK);
+    EXPECT_EQ(CeRapiFreeBuffer(found), E_INVALIDARG);
 }
 
 TEST_F(Session, TheLastOneClosesEveryHandle) {
@@ -56,7 +56,7 @@ TEST_F(Session, TheLastOneClosesEveryHandle) {
     ASSERT_NE(file, INVALID_HANDLE_VALUE);
     EXPECT_FALSE(DeleteFileW(device_.PcPath(L"\\a.txt").c_str()));
     Reconnect();
-    EXPECT_EQ(ErrorOf(api_.CeCloseHandle(file)), DWORD{ERROR_INVALID_HANDLE});
+    EXPECT_EQ(ErrorOf(CeCloseHandle(file)), DWORD{ERROR_INVALID_HANDLE});
     EXPECT_TRUE(DeleteFileW(device_.PcPath(L"\\a.txt").c_str()));
 }
 
@@ -64,7 +64,7 @@ TEST_F(Session, AConnectionCanBeLateFailOrStayAway) {
     device_.CloseSessions();
     device_.Set(L"CONNECT_DELAY", L"150");
     rapi::InitRecord late{sizeof(rapi::InitRecord), nullptr, S_OK};
-    ASSERT_EQ(api_.CeRapiInitEx(&late), S_OK);
+    ASSERT_EQ(CeRapiInitEx(&late), S_OK);
     EXPECT_EQ(WaitForSingleObject(late.init_event, 0), DWORD{WAIT_TIMEOUT});
     EXPECT_FALSE(Names(L"\\*"));
     EXPECT_EQ(WaitForSingleObject(late.init_event, 5000), WAIT_OBJECT_0);
@@ -75,8 +75,8 @@ TEST_F(Session, AConnectionCanBeLateFailOrStayAway) {
     // A record whose session is closed early is not written any more.
     auto given_up =
         std::make_unique<rapi::InitRecord>(rapi::InitRecord{sizeof(rapi::InitRecord), nullptr, 77});
-    ASSERT_EQ(api_.CeRapiInitEx(given_up.get()), S_OK);
-    ASSERT_EQ(api_.CeRapiUninit(), S_OK);
+    ASSERT_EQ(CeRapiInitEx(given_up.get()), S_OK);
+    ASSERT_EQ(CeRapiUninit(), S_OK);
     given_up->init_result = 77;
     Sleep(250);
     EXPECT_EQ(given_up->init_result, 77);
@@ -88,9 +88,9 @@ TEST_F(Session, AConnectionCanBeLateFailOrStayAway) {
 
     device_.Set(L"CONNECT_DELAY", L"never");
     rapi::InitRecord away{sizeof(rapi::InitRecord), nullptr, S_OK};
-    ASSERT_EQ(api_.CeRapiInitEx(&away), S_OK);
+    ASSERT_EQ(CeRapiInitEx(&away), S_OK);
     EXPECT_EQ(WaitForSingleObject(away.init_event, 200), DWORD{WAIT_TIMEOUT});
-    EXPECT_EQ(api_.CeRapiUninit(), S_OK);
+    EXPECT_EQ(CeRapiUninit(), S_OK);
 }
 
 TEST_F(Session, WithoutTheRootFolderThereIsNoDevice) {
@@ -110,8 +110,8 @@ TEST_F(Session, ManyThreadsWorkAtOnce) {
                 EXPECT_EQ(Connect(), S_OK);
                 EXPECT_TRUE(WriteNew(path.c_str(), "content"));
                 EXPECT_TRUE(Names(L"\\*.txt"));
-                EXPECT_TRUE(api_.CeDeleteFile(path.c_str()));
-                EXPECT_EQ(api_.CeRapiUninit(), S_OK);
+                EXPECT_TRUE(CeDeleteFile(path.c_str()));
+                EXPECT_EQ(CeRapiUninit(), S_OK);
             }
         });
     }
@@ -127,7 +127,7 @@ TEST_F(Session, ForeignCodeIsNeverRun) {
     DWORD size = 9;
     BYTE* output = reinterpret_cast<BYTE*>(&size);
     const auto invoke = [&](const wchar_t* dll, const wchar_t* function) {
-        return api_.CeRapiInvoke(dll, function, 0, nullptr, &size, &output, nullptr, 0);
+        return CeRapiInvoke(dll, function, 0, nullptr, &size, &output, nullptr, 0);
     };
     EXPECT_EQ(invoke(L"there.dll", L"Run"), HRESULT_FROM_WIN32(ERROR_BAD_EXE_FORMAT));
     EXPECT_EQ(size, 0U);

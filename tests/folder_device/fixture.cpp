@@ -1,4 +1,4 @@
-#include "tests/folder_device/remote_api_table.h"
+#include "tests/folder_device/fixture.h"
 
 #include <algorithm>
 
@@ -6,7 +6,7 @@ namespace orvane::testing {
 
 HRESULT FolderDeviceTest::Connect() {
     rapi::InitRecord record{sizeof(rapi::InitRecord), nullptr, E_FAIL};
-    const HRESULT result = api_.CeRapiInitEx(&record);
+    const HRESULT result = CeRapiInitEx(&record);
     if (FAILED(result)) {
         return result;
     }
@@ -21,24 +21,24 @@ void FolderDeviceTest::Reconnect() {
 }
 
 HANDLE FolderDeviceTest::Open(const wchar_t* path, DWORD access, DWORD creation, DWORD share) {
-    return api_.CeCreateFile(path, access, share, nullptr, creation, FILE_ATTRIBUTE_NORMAL, nullptr);
+    return CeCreateFile(path, access, share, nullptr, creation, FILE_ATTRIBUTE_NORMAL, nullptr);
 }
 
 bool FolderDeviceTest::WriteNew(const wchar_t* path, std::string_view content) {
     const HANDLE file = Open(path, GENERIC_WRITE, CREATE_NEW);
-    return file != INVALID_HANDLE_VALUE && Write(file, content) && api_.CeCloseHandle(file);
+    return file != INVALID_HANDLE_VALUE && Write(file, content) && CeCloseHandle(file);
 }
 
 bool FolderDeviceTest::Write(HANDLE file, std::string_view bytes) {
     DWORD written = 0;
-    return api_.CeWriteFile(file, bytes.data(), static_cast<DWORD>(bytes.size()), &written, nullptr) &&
+    return CeWriteFile(file, bytes.data(), static_cast<DWORD>(bytes.size()), &written, nullptr) &&
            written == bytes.size();
 }
 
 std::optional<std::vector<std::wstring>> FolderDeviceTest::Names(const wchar_t* pattern) {
     DWORD count = 0;
     rapi::FindData* found = nullptr;
-    if (!api_.CeFindAllFiles(pattern, rapi::kFindName, &count, &found)) {
+    if (!CeFindAllFiles(pattern, rapi::kFindName, &count, &found)) {
         return std::nullopt;
     }
     std::vector<std::wstring> names;
@@ -46,7 +46,7 @@ std::optional<std::vector<std::wstring>> FolderDeviceTest::Names(const wchar_t* 
         names.emplace_back(found[i].name);
     }
     std::sort(names.begin(), names.end());
-    EXPECT_EQ(api_.CeRapiFreeBuffer(found), S_OK);
+    EXPECT_EQ(CeRapiFreeBuffer(found), S_OK);
     return names;
 }
 
