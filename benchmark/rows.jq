@@ -55,8 +55,7 @@ def memory:
 
 # The calls that the steps of a copy need, the mean of both ways: to the device a session with two folders to
 # create and a session with create, the chunks, three time calls (a first date while the file is not complete)
-# and close; from it a session with create, the
-# chunks and close.
+# and close; from it a session with create, the chunks and close.
 def calls_needed($bytes): ($bytes / 8192 | floor + 1) as $chunks | ((2 + 2) + (2 + 1 + $chunks + 4) + (2 + 1 + $chunks + 1)) / 2;
 # The calls of the listing that comes first are left out.
 def calls_per_file($case; $files):
