@@ -5,6 +5,10 @@
 # of the program's PATH. A display must exist (see with_display.sh).
 set -eu
 source "$(dirname "${BASH_SOURCE[0]}")/wine_prefix.sh"
+# Without a UTF-8 locale Wine cannot make files of names beyond ASCII.
+if [ "$(locale charmap 2>/dev/null)" != UTF-8 ]; then
+  export LC_ALL=C.UTF-8
+fi
 export WINEDEBUG=${WINEDEBUG:--all}
 # Without the last override a program that crashes would wait for a debugger for ever.
 export WINEDLLOVERRIDES="mscoree,mshtml,winedbg.exe="
