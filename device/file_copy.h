@@ -13,7 +13,8 @@
 // answers. No old file is touched before the source is open: after a failure up to there the target is what
 // it was. A backup (see device/backup_name.h) is made before the target is created and stays, whatever
 // becomes of the copy; when it is asked for and cannot be made, the copy is not begun and the old file stays
-// as it was.
+// as it was. A target that is to be stamped is dated 1990-01-01 until it is complete: a partial file that a
+// lost device keeps so counts as older than the whole one on the other side.
 #pragma once
 
 #include <windows.h>
