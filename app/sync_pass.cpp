@@ -2,6 +2,7 @@
 
 #include <functional>
 #include <string>
+#include <string_view>
 #include <utility>
 
 #include "app/sync_task.h"
@@ -83,7 +84,7 @@ class SyncPass {
   private:
     // False when the pass is over because the target disk is full.
     bool HandleRow(std::size_t row) {
-        const std::wstring& name = source_.listing.table.names[row];
+        const std::wstring_view name = source_.listing.table.names[row];
         const FILETIME& write_time = source_.listing.table.write_times[row];
         if (ShouldSkipCopy(task_.overwrite_old_files, write_time, name,
                            {target_.listing.table, target_.listing.rows, index_}, ask_replace_)) {
@@ -96,7 +97,7 @@ class SyncPass {
         return CopyRow(name, write_time);
     }
 
-    bool CopyRow(const std::wstring& name, const FILETIME& write_time) {
+    bool CopyRow(std::wstring_view name, const FILETIME& write_time) {
         const EntryCopy entry = {task_.pc.folder, task_.device.folder, name, kind_.to_device};
         const HANDLE cancel = task_.copy_cancel_event;
         const bool can_copy = CanCopyEntry(entry, kind_.to_device && make_backup_);
@@ -132,8 +133,9 @@ class SyncPass {
                                   Xlate(L"Synchronization - Warning")) == IDOK;
     }
 
-    std::wstring CopyLine(const std::wstring& name) const {
-        return (kind_.translate_copy_line ? Xlate(kind_.copy_line) : kind_.copy_line) + name + L'"';
+    std::wstring CopyLine(std::wstring_view name) const {
+        return (kind_.translate_copy_line ? Xlate(kind_.copy_line) : kind_.copy_line) + std::wstring(name) +
+               L'"';
     }
 
     void Report(std::wstring_view command, std::optional<std::wstring> info_text = std::nullopt) {

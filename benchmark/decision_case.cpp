@@ -20,8 +20,10 @@ struct Side {
     std::int32_t rows = 0;
 };
 
-void Name(FileNode& node, const wchar_t* format, std::int32_t number) {
-    std::swprintf(node.name, kPathBufferChars, format, static_cast<int>(number));
+std::wstring Numbered(const wchar_t* format, std::int32_t number) {
+    wchar_t text[40];
+    std::swprintf(text, std::size(text), format, static_cast<int>(number));
+    return text;
 }
 
 void FillFolder(FileNode& folder, std::int32_t first, std::int32_t count, const FILETIME& time) {
@@ -30,7 +32,7 @@ void FillFolder(FileNode& folder, std::int32_t first, std::int32_t count, const 
     folder.children = std::make_unique<FileNode[]>(static_cast<std::size_t>(count));
     for (std::int32_t i = 0; i < count; ++i) {
         FileNode& file = folder.children[static_cast<std::size_t>(i)];
-        Name(file, L"measurement %06d.qvj", first + i);
+        file.name = Numbered(L"measurement %06d.qvj", first + i);
         file.creation_time = file.last_write_time = time;
     }
 }
@@ -41,7 +43,7 @@ void FillTree(FileNode& root, std::int32_t count, std::int32_t per_folder, const
     root.children = std::make_unique<FileNode[]>(static_cast<std::size_t>(folders));
     for (std::int32_t i = 0; i < folders; ++i) {
         FileNode& folder = root.children[static_cast<std::size_t>(i)];
-        Name(folder, L"site %05d", i);
+        folder.name = Numbered(L"site %05d", i);
         FillFolder(folder, i * per_folder, per_folder, time);
     }
 }

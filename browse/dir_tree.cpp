@@ -129,7 +129,7 @@ void UCeDirTree::InsertChildren(const FileNode& node, HTREEITEM parent) {
         insert.hParent = parent;
         insert.hInsertAfter = TVI_LAST;
         insert.item.mask = TVIF_TEXT | TVIF_PARAM | TVIF_STATE;
-        insert.item.pszText = const_cast<wchar_t*>(child.name);
+        insert.item.pszText = const_cast<wchar_t*>(child.name.c_str());
         insert.item.lParam = reinterpret_cast<LPARAM>(&child);
         insert.item.state = StateOf(InitialPicture(child)) | (is_folder ? TVIS_BOLD : 0U);
         insert.item.stateMask = TVIS_STATEIMAGEMASK | (is_folder ? TVIS_BOLD : 0U);
@@ -319,7 +319,7 @@ const FileNode& UCeDirTree::NodeOf(HTREEITEM item) const {
 std::wstring UCeDirTree::PathOf(HTREEITEM item) const {
     std::wstring path;
     for (; item != nullptr; item = TreeView_GetParent(Handle(), item)) {
-        path.insert(0, std::wstring(L"\\") + NodeOf(item).name);
+        path.insert(0, L"\\" + NodeOf(item).name);
     }
     return path;
 }

@@ -15,7 +15,7 @@ int CompareSiblings(const FileNode& a, const FileNode& b) {
     if (a.is_folder != b.is_folder) {
         return a.is_folder != 0 ? -1 : 1;
     }
-    return _wcsicmp(a.name, b.name);
+    return _wcsicmp(a.name.c_str(), b.name.c_str());
 }
 
 std::vector<std::wstring_view> PathPieces(std::wstring_view path) {

@@ -75,7 +75,7 @@ std::wstring_view TrustedName(const rapi::FindData& record) {
 }
 
 void CopyRecord(const rapi::FindData& record, std::wstring_view name, FileNode& node) {
-    name.copy(node.name, name.size());
+    node.name = name;
     node.is_folder = IsFolder(record) ? 1 : 0;
     node.attributes = record.attributes;
     node.creation_time = record.creation_time;

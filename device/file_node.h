@@ -6,15 +6,14 @@
 #include <cstdint>
 #include <memory>
 #include <span>
-
-#include "platform/paths.h"
+#include <string>
 
 namespace orvane {
 
 // The root of a listing has an empty name; its children are the folder's entries. A node owns its children,
 // and so a root its whole tree. Times are UTC, sizes bytes.
 struct FileNode {
-    wchar_t name[kPathBufferChars] = {};  // The entry's own name, no path.
+    std::wstring name;  // The entry's own name, no path.
     std::unique_ptr<FileNode[]> children;
     std::int32_t child_count = 0;
     std::uint8_t is_folder = 0;  // 1 for a folder.

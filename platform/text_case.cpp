@@ -26,23 +26,26 @@ std::unique_ptr<FoldTable> ReadFoldTable() {
     return table;
 }
 
-}  // namespace
-
-wchar_t FoldCase(wchar_t unit) {
+const FoldTable& Folding() {
     static const std::unique_ptr<FoldTable> table = ReadFoldTable();
-    return (*table)[unit];
+    return *table;
 }
 
+}  // namespace
+
 bool EqualIgnoringCase(std::wstring_view a, std::wstring_view b) {
-    return std::equal(a.begin(), a.end(), b.begin(), b.end(),
-                      [](wchar_t left, wchar_t right) { return FoldCase(left) == FoldCase(right); });
+    const FoldTable& folding = Folding();
+    return std::equal(a.begin(), a.end(), b.begin(), b.end(), [&folding](wchar_t left, wchar_t right) {
+        return left == right || folding[left] == folding[right];
+    });
 }
 
 std::size_t HashIgnoringCase(std::wstring_view text) {
+    const FoldTable& folding = Folding();
     // FNV-1a, 64 bits, over the folded units.
     std::uint64_t hash = 0xCBF29CE484222325U;
     for (const wchar_t unit : text) {
-        hash = (hash ^ FoldCase(unit)) * 0x100000001B3U;
+        hash = (hash ^ folding[unit]) * 0x100000001B3U;
     }
     return static_cast<std::size_t>(hash);
 }

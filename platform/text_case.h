@@ -9,8 +9,6 @@
 
 namespace orvane {
 
-wchar_t FoldCase(wchar_t unit);
-
 bool EqualIgnoringCase(std::wstring_view a, std::wstring_view b);
 
 // Equal texts, without regard to case, have equal hashes.

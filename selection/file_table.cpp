@@ -1,11 +1,45 @@
 #include "selection/file_table.h"
 
+#include <algorithm>
 #include <bit>
-#include <cwchar>
+#include <span>
 
 #include "platform/text_case.h"
 
 namespace orvane {
+
+namespace {
+
+// Room for the names of a table to begin with; it grows by itself.
+constexpr std::size_t kUsualNameBytes = 32 * sizeof(wchar_t);
+
+constexpr std::int32_t kNoRow = -1;
+
+// Asks for the text of a name some rows further on. The processor does so by itself, but not beyond a page of
+// memory, of which the text of a long table fills many.
+void ReadAhead(std::span<const std::wstring_view> names, std::size_t row) {
+    constexpr std::size_t kRows = 8;
+    if (row + kRows < names.size()) {
+        PreFetchCacheLine(PF_TEMPORAL_LEVEL_1, names[row + kRows].data());
+    }
+}
+
+// prefix + "\" + name, in memory of `text`.
+std::wstring_view PathBelow(std::wstring_view prefix, std::wstring_view name,
+                            std::pmr::memory_resource& text) {
+    const std::size_t size = prefix.size() + 1 + name.size();
+    auto* path = static_cast<wchar_t*>(text.allocate(size * sizeof(wchar_t), alignof(wchar_t)));
+    wchar_t* end = std::copy(prefix.begin(), prefix.end(), path);
+    *end++ = L'\\';
+    std::copy(name.begin(), name.end(), end);
+    return {path, size};
+}
+
+std::uint32_t HashOf(std::wstring_view name) {
+    return static_cast<std::uint32_t>(HashIgnoringCase(name));
+}
+
+}  // namespace
 
 std::int32_t CountEntries(std::int32_t counter, const FileNode& node) {
     for (const FileNode& child : node.Children()) {
@@ -17,57 +51,72 @@ std::int32_t CountEntries(std::int32_t counter, const FileNode& node) {
     return counter;
 }
 
-void FlattenTree(FileTable& table, std::int32_t& row, const FileNode& node, const std::wstring& prefix,
+void FlattenTree(FileTable& table, std::int32_t& row, const FileNode& node, std::wstring_view prefix,
                  std::int32_t capacity) {
     if (row == 0) {
         const auto rows = static_cast<std::size_t>(capacity);
-        table = {};  // A folder's times are the zeros that the arrays are made with.
-        table.names.resize(rows);
-        table.kinds.resize(rows);
-        table.creation_times.resize(rows);
-        table.write_times.resize(rows);
+        table = {};
+        table.names.reserve(rows);
+        table.kinds.reserve(rows);
+        table.creation_times.reserve(rows);
+        table.write_times.reserve(rows);
+        table.text = std::make_unique<std::pmr::monotonic_buffer_resource>((rows + 1) * kUsualNameBytes);
     }
     for (const FileNode& child : node.Children()) {
         if (row >= capacity) {
             return;
         }
-        const auto index = static_cast<std::size_t>(row++);
-        std::wstring& name = table.names[index];
-        name.reserve(prefix.size() + 1 + std::wcslen(child.name));
-        name.append(prefix).append(1, L'\\').append(child.name);
+        ++row;
+        const std::wstring_view name = PathBelow(prefix, child.name, *table.text);
         const bool is_folder = child.is_folder != 0;
-        table.kinds[index] = is_folder ? kKindFolder : kKindFile;
+        table.names.push_back(name);
+        table.kinds.push_back(is_folder ? kKindFolder : kKindFile);
+        table.creation_times.push_back(is_folder ? FILETIME{} : child.creation_time);
+        table.write_times.push_back(is_folder ? FILETIME{} : child.last_write_time);
         if (is_folder) {
             FlattenTree(table, row, child, name, capacity);
-        } else {
-            table.creation_times[index] = child.creation_time;
-            table.write_times[index] = child.last_write_time;
         }
     }
 }
 
 FileIndex::FileIndex(const FileTable& table, std::int32_t rows)
-    : table_(&table), slots_(std::bit_ceil(static_cast<std::size_t>(rows) * 2 + 1)) {
-    for (std::int32_t row = 0; row < rows; ++row) {
-        const std::wstring& name = table.names[static_cast<std::size_t>(row)];
-        const auto hash = static_cast<std::uint32_t>(HashIgnoringCase(name));
-        Slot& slot = slots_[SlotOf(hash, name)];
-        if (slot.row < 0) {
-            slot = {hash, row};
+    : table_(table), rows_(rows), slots_(std::bit_ceil(static_cast<std::size_t>(rows) * 4 / 3 + 1), kNoRow) {
+    const std::span names(table.names.data(), static_cast<std::size_t>(rows));
+    hashes_.reserve(names.size());
+    // Two loops: the leaps of the second one through the slots then overlap.
+    for (std::size_t row = 0; row < names.size(); ++row) {
+        ReadAhead(names, row);
+        hashes_.push_back(HashOf(names[row]));
+    }
+    for (std::size_t row = 0; row < names.size(); ++row) {
+        std::int32_t& slot = slots_[SlotOf(hashes_[row], names[row])];
+        if (slot == kNoRow) {
+            slot = static_cast<std::int32_t>(row);
+        } else {
+            names_are_unique_ = false;
         }
     }
 }
 
 std::int32_t FileIndex::Find(std::wstring_view name) const {
-    return slots_[SlotOf(static_cast<std::uint32_t>(HashIgnoringCase(name)), name)].row;
+    const std::int32_t next = next_.load(std::memory_order_relaxed);
+    const bool is_next = names_are_unique_ && next < rows_ &&
+                         EqualIgnoringCase(table_.names[static_cast<std::size_t>(next)], name);
+    const std::int32_t row = is_next ? next : slots_[SlotOf(HashOf(name), name)];
+    if (row != kNoRow) {
+        next_.store(row + 1, std::memory_order_relaxed);
+    }
+    return row;
 }
 
 std::size_t FileIndex::SlotOf(std::uint32_t hash, std::wstring_view name) const {
     const std::size_t mask = slots_.size() - 1;
     std::size_t at = hash & mask;
-    while (slots_[at].row >= 0 &&
-           (slots_[at].hash != hash ||
-            !EqualIgnoringCase(table_->names[static_cast<std::size_t>(slots_[at].row)], name))) {
+    while (slots_[at] != kNoRow) {
+        const auto row = static_cast<std::size_t>(slots_[at]);
+        if (hashes_[row] == hash && EqualIgnoringCase(table_.names[row], name)) {
+            break;
+        }
         at = (at + 1) & mask;
     }
     return at;

@@ -3,8 +3,10 @@
 
 #include <windows.h>
 
+#include <atomic>
 #include <cstdint>
-#include <string>
+#include <memory>
+#include <memory_resource>
 #include <string_view>
 #include <vector>
 
@@ -18,10 +20,14 @@ inline constexpr std::wstring_view kKindFolder = L"dir";
 
 // Four parallel arrays of one capacity. How many rows are in use is kept by whoever fills the table.
 struct FileTable {
-    std::vector<std::wstring> names;       // Path below the job folder, beginning with "\".
+    std::vector<std::wstring_view> names;  // Path below the job folder, beginning with "\".
     std::vector<std::wstring_view> kinds;  // kKindFile or kKindFolder.
     std::vector<FILETIME> creation_times;  // Set for files only.
     std::vector<FILETIME> write_times;     // Last write; 0 for a folder.
+
+    // Where FlattenTree puts the text of the names, one behind the other. Names of another origin belong to
+    // whoever fills them in.
+    std::unique_ptr<std::pmr::monotonic_buffer_resource> text = nullptr;
 };
 
 // `counter` plus the number of all entries below the node, files and folders alike.
@@ -29,11 +35,14 @@ std::int32_t CountEntries(std::int32_t counter, const FileNode& node);
 
 // Appends the entries below `node`, depth first, every folder before its content, and advances `row`. The
 // first call has row 0, an empty prefix, and makes room for `capacity` rows; entries beyond it are dropped.
-void FlattenTree(FileTable& table, std::int32_t& row, const FileNode& node, const std::wstring& prefix,
+void FlattenTree(FileTable& table, std::int32_t& row, const FileNode& node, std::wstring_view prefix,
                  std::int32_t capacity);
 
 // Finds a name among the first rows of a table, which must stay unchanged as long as the index lives. Built
-// in one pass; a search costs the same however long the table is. Safe to read from any thread.
+// in one pass; a search costs the same however long the table is. Any thread may search.
+//
+// Both sides mostly list their files in the same order. A search looks first at the row behind the last one
+// found: it then walks through memory in order, which a long table needs more than anything else.
 class FileIndex {
   public:
     FileIndex(const FileTable& table, std::int32_t rows);
@@ -42,16 +51,15 @@ class FileIndex {
     std::int32_t Find(std::wstring_view name) const;
 
   private:
-    struct Slot {
-        std::uint32_t hash = 0;
-        std::int32_t row = -1;
-    };
-
-    // The slot that holds the name or the empty slot where it would go.
+    // The slot that holds the row of the name or the empty slot where it would go.
     std::size_t SlotOf(std::uint32_t hash, std::wstring_view name) const;
 
-    const FileTable* table_;
-    std::vector<Slot> slots_;  // Open addressing; a power of two, at most half full.
+    const FileTable& table_;
+    const std::int32_t rows_;
+    std::vector<std::uint32_t> hashes_;  // Of the rows' names.
+    std::vector<std::int32_t> slots_;    // Open addressing; a power of two, at most three quarters full.
+    bool names_are_unique_ = true;
+    mutable std::atomic<std::int32_t> next_{0};  // The row behind the last one found.
 };
 
 }  // namespace orvane

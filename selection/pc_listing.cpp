@@ -1,10 +1,10 @@
 #include "selection/pc_listing.h"
 
-#include <algorithm>
 #include <cwchar>
 #include <string_view>
 
 #include "platform/handles.h"
+#include "platform/paths.h"
 
 namespace orvane {
 
@@ -45,7 +45,7 @@ class PcSearch {
 };
 
 void FillNode(const WIN32_FIND_DATAW& data, FileNode& node) {
-    std::copy(std::begin(data.cFileName), std::end(data.cFileName), node.name);
+    node.name = data.cFileName;
     node.is_folder = (data.dwFileAttributes & FILE_ATTRIBUTE_DIRECTORY) != 0 ? 1 : 0;
     node.creation_time = data.ftCreationTime;
     node.last_access_time = data.ftLastAccessTime;

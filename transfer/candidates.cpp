@@ -62,16 +62,16 @@ bool BuildCandidates(const Comparison& comparison, const JobTable& source, const
             return false;
         }
         const auto row = static_cast<std::size_t>(i);
-        const std::wstring& name = source.table.names[row];
+        const std::wstring_view name = source.table.names[row];
         const FILETIME& write_time = source.table.write_times[row];
         // The user decides by ticking: nothing is asked here.
         if (source.table.kinds[row] != kKindFile ||
             ShouldSkipCopy(comparison.overwrite_old_files, write_time, name, copy_target, {})) {
             continue;
         }
-        std::wstring relative = name.substr(1);
+        const std::wstring_view relative = name.substr(1);
         if (IsListedType(relative, comparison.types)) {
-            candidates.push_back({std::move(relative), DateText(write_time)});
+            candidates.push_back({std::wstring(relative), DateText(write_time)});
         }
     }
     return true;

@@ -19,7 +19,7 @@ using Texts = std::vector<std::wstring>;
 Texts PathsOf(const FileNode& node) {
     Texts paths;
     for (const FileNode& child : node.Children()) {
-        const std::wstring path = child.name + std::wstring(child.is_folder != 0 ? L"\\" : L"");
+        const std::wstring path = child.name + (child.is_folder != 0 ? L"\\" : L"");
         paths.push_back(path);
         for (const std::wstring& below : PathsOf(child)) {
             paths.push_back(path + below);

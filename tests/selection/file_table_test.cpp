@@ -4,7 +4,9 @@
 
 #include <algorithm>
 #include <random>
+#include <string>
 #include <utility>
+#include <vector>
 
 #include "tests/support/temp_folder.h"
 
@@ -16,7 +18,7 @@ using testing::TicksOf;
 
 FileNode File(std::wstring_view name, ULONGLONG creation, ULONGLONG write) {
     FileNode node;
-    std::copy(name.begin(), name.end(), node.name);
+    node.name = name;
     node.creation_time = FileTimeOf(creation);
     node.last_write_time = FileTimeOf(write);
     return node;
@@ -73,23 +75,42 @@ bool SystemFindsEqual(std::wstring_view a, std::wstring_view b) {
                                 TRUE) == CSTR_EQUAL;
 }
 
+// Searches for every name, in order and backwards, some of them beyond the rows that take part.
+void ExpectLinearSearch(const std::vector<std::wstring>& names, std::size_t rows) {
+    FileTable table;
+    table.names.assign(names.begin(), names.end());
+    const FileIndex index(table, static_cast<std::int32_t>(rows));
+    const auto expect = [&](const std::wstring& name) {
+        const auto end = names.begin() + static_cast<std::ptrdiff_t>(rows);
+        const auto found =
+            std::find_if(names.begin(), end, [&](const auto& row) { return SystemFindsEqual(row, name); });
+        EXPECT_EQ(index.Find(name), found == end ? -1 : found - names.begin()) << name;
+    };
+    std::for_each(names.begin(), names.end(), expect);
+    std::for_each(names.rbegin(), names.rend(), expect);
+}
+
 TEST(FileIndex, FindsTheRowThatALinearSearchFinds) {
     const std::wstring units = L"aAkKsSiI\u212A\u00DF\u1E9E\u017F\u0130\u0131\u00E4\u00C4\u03C3\u03C2\u03A3";
-    FileTable table;
+    std::vector<std::wstring> names;
     for (const wchar_t first : units) {
         for (const wchar_t second : units) {
-            table.names.push_back({L'\\', first, second});
+            names.push_back({L'\\', first, second});
         }
     }
-    std::shuffle(table.names.begin(), table.names.end(), std::mt19937(1));
-    for (const std::size_t rows : {table.names.size(), table.names.size() / 4}) {
-        const FileIndex index(table, static_cast<std::int32_t>(rows));
-        for (const std::wstring& name : table.names) {
-            const auto end = table.names.begin() + static_cast<std::ptrdiff_t>(rows);
-            const auto found = std::find_if(table.names.begin(), end,
-                                            [&](const auto& row) { return SystemFindsEqual(row, name); });
-            EXPECT_EQ(index.Find(name), found == end ? -1 : found - table.names.begin()) << name;
+    std::shuffle(names.begin(), names.end(), std::mt19937(1));
+    std::vector<std::wstring> unique;
+    for (const std::wstring& name : names) {
+        if (std::none_of(unique.begin(), unique.end(),
+                         [&](const auto& other) { return SystemFindsEqual(other, name); })) {
+            unique.push_back(name);
         }
+    }
+    ASSERT_LT(unique.size(), names.size());
+    for (const auto& listing : {names, unique}) {
+        ExpectLinearSearch(listing, listing.size());
+        ExpectLinearSearch(listing, listing.size() / 4);
+        ExpectLinearSearch(listing, 0);
     }
 }
 

@@ -96,7 +96,7 @@ TEST(ListPcFolder, CountsWhatItReadFromAFolderThatChanges) {
         FileNode node;
         EXPECT_EQ(ListPcFolder(folder / L"*.*", true, node), DeviceResult::kDone);
         for (const FileNode& child : node.Children()) {
-            EXPECT_NE(child.name[0], L'\0');
+            EXPECT_FALSE(child.name.empty());
         }
     }
     stop = true;
