@@ -9,8 +9,9 @@
 namespace orvane::bench {
 
 // Flattening two listings of `count` equal files in folders of `per_folder` and deciding all their rows in
-// both directions. The device's times are `seconds_behind` the PC's.
-bool RunDecision(std::int32_t count, std::int32_t per_folder, int seconds_behind);
+// both directions. The device's times are `seconds_behind` the PC's, and it lists every `stride`-th file of a
+// folder until it has listed all: 1 is the PC's order.
+bool RunDecision(std::int32_t count, std::int32_t per_folder, int seconds_behind, int stride);
 
 // One synchronization by the real dialog, of the PC folder and the device's "\Jobs".
 bool RunSync(const std::wstring& pc_folder);

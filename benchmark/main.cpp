@@ -13,8 +13,8 @@ namespace {
 bool Run(const std::vector<std::wstring>& arguments) {
     const auto number = [&](std::size_t index) { return std::stoi(arguments[index]); };
     const std::wstring& name = arguments.at(0);
-    if (name == L"decision" && arguments.size() == 4) {
-        return orvane::bench::RunDecision(number(1), number(2), number(3));
+    if (name == L"decision" && arguments.size() == 5) {
+        return orvane::bench::RunDecision(number(1), number(2), number(3), number(4));
     }
     if (name == L"sync" && arguments.size() == 2) {
         return orvane::bench::RunSync(arguments[1]);
@@ -25,7 +25,8 @@ bool Run(const std::vector<std::wstring>& arguments) {
     if (name == L"lists" && arguments.size() == 2) {
         return orvane::bench::RunLists(arguments[1]);
     }
-    std::fputs("decision COUNT PER_FOLDER SECONDS | sync PC_FOLDER | listing | lists PC_FOLDER\n", stderr);
+    std::fputs("decision COUNT PER_FOLDER SECONDS STRIDE | sync PC_FOLDER | listing | lists PC_FOLDER\n",
+               stderr);
     return false;
 }
 

@@ -43,6 +43,9 @@ def nothing:
     ($all | row("2"; "  bar's last look (100 ms sleep), not in the above"; "ms"; null; values($case; "end_sleep_ms"))),
     ($all | row("2"; "  growth, linear is 4"; "x"; 4.5;
         by_each(values($case; "ms"); values("nothing \(size($n / 4))"; "ms")))),
+    ($all | row("2"; "  on one processor"; "ms"; null; values("\($case) one"; "ms"))),
+    ($all | row("2"; "  growth on one processor"; "x"; 4.5;
+        by_each(values("\($case) one"; "ms"); values("nothing \(size($n / 4)) one"; "ms")))),
     ($all | row("2"; "  growth outside of calls and waits"; "x"; 4.5; by_each(own($case); own("nothing \(size($n / 4))")))),
     ($all | row("2"; "  growth of rsync on the same folders"; "x"; null;
         by_each(values("\($case) rsync"; "ms"); values("nothing \(size($n / 4)) rsync"; "ms"))));
@@ -115,6 +118,7 @@ def listing:
   decision("folders"; "folders of 100"),
   decision("one"; "one folder"),
   row("1"; "decide \(shown(40000)) rows a side 2 s apart, per row"; "us"; 2; values("decision close"; "us_per_row")),
+  row("1"; "decide \(shown(40000)) rows a side in another order, per row"; "us"; 2; values("decision strewn"; "us_per_row")),
   nothing,
   memory,
   first("first small"; 1000 / $scale; 20480; "\(shown(1000)) files of 20 KB"),

@@ -49,6 +49,19 @@ measure() {
 }
 measure_sync() { measure "$1" "$2" sync "$(windows_path "$work/pc/Jobs")\\"; }
 
+# on_one_processor COMMAND...: with Wine's server there as well. On two, each call of the server costs a
+# multiple as soon as the system wakes it on the other processor, from which on it stays there: mostly after
+# some 50 ms. A long run then looks worse than a short one by more than its length.
+on_one_processor() (
+  processor=$(taskset -cp "$BASHPID" | sed 's/.*: //; s/[-,].*//')
+  taskset -cp "$processor" "$BASHPID" >/dev/null
+  source tools/wine_prefix.sh
+  end_wine_server() { /usr/lib/wine/wineserver -k && /usr/lib/wine/wineserver -w; }
+  end_wine_server
+  trap end_wine_server EXIT
+  "$@"
+)
+
 # What a user would pick instead, on the same folders: both ways, one after the other.
 xcopy_both() {
   local pc device
@@ -75,10 +88,12 @@ measure_other() { # CASE RUNS FUNCTION
 decision_cases() {
   local count
   for count in $(of_size 10000) $(of_size 40000) $(of_size 160000); do
-    measure "decision folders $count" 1 decision "$count" 100 0
-    measure "decision one $count" 1 decision "$count" "$count" 0
+    measure "decision folders $count" 5 decision "$count" 100 0 1
+    measure "decision one $count" 5 decision "$count" "$count" 0 1
   done
-  measure "decision close" 1 decision "$(of_size 40000)" 100 2
+  count=$(of_size 40000)
+  measure "decision close" 5 decision "$count" 100 2 1
+  measure "decision strewn" 5 decision "$count" "$count" 0 7919
 }
 
 nothing_cases() {
@@ -88,6 +103,7 @@ nothing_cases() {
     lay pc p "$count" 0
     lay device p "$count" 0
     measure_sync "nothing $count" 3
+    on_one_processor measure_sync "nothing $count one" 5
     measure_other "nothing $count rsync" 3 rsync_both
     if [ "$count" = "$(of_size 10000)" ]; then
       measure_other "nothing $count xcopy" 3 xcopy_both
