@@ -28,7 +28,7 @@ DeviceResult CopyEntryToPc(const FileNode& entry, const std::wstring& device_fol
     }
     const std::wstring device_path = JoinPath(device_folder, entry.name);
     const std::wstring pc_path = JoinPath(pc_folder, entry.name);
-    if (!DevicePathFits(device_path.size()) || !PcPathFits(pc_path.size())) {
+    if (!DevicePathFits(device_path.size()) || !PcPathFits(pc_path.size()) || IsShortNameOfAnother(pc_path)) {
         return DeviceResult::kFailed;
     }
     return entry.is_folder ? CopyDeviceFolderToPc(device_path, pc_path, cancel_event, /*nested=*/true)

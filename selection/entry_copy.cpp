@@ -9,10 +9,30 @@
 
 namespace orvane {
 
+namespace {
+
+// Whether the entry, or a folder on the way to it from the PC folder, goes by the short name that the PC has
+// given to another one.
+bool LeadsThroughShortName(const EntryCopy& entry) {
+    if (entry.name.find(L'~') == std::wstring_view::npos) {
+        return false;
+    }
+    const std::wstring path = entry.PcPath();
+    for (std::size_t end = entry.pc_folder.size(); end != std::wstring::npos;) {
+        end = path.find(L'\\', end + 1);
+        if (IsShortNameOfAnother(path.substr(0, end))) {
+            return true;
+        }
+    }
+    return false;
+}
+
+}  // namespace
+
 bool CanCopyEntry(const EntryCopy& entry, bool with_device_backup) {
     return IsPcFolderNamed(entry.pc_folder) && PcPathFits(entry.PcPath().size()) &&
            DevicePathFits(entry.DevicePath().size(), with_device_backup) &&
-           (entry.to_device || IsSafePcRelativePath(entry.name));
+           (entry.to_device || (IsSafePcRelativePath(entry.name) && !LeadsThroughShortName(entry)));
 }
 
 void EnsureTargetFolder(const EntryCopy& entry, HANDLE cancel_event, bool nested) {

@@ -21,8 +21,9 @@ struct EntryCopy {
 };
 
 // Whether there is a PC folder at all, both sides can hold the entry's paths, with the name of its backup on
-// the device if there is to be one, and the PC its name. (The device judges names of its own accord.) What
-// fails here must not reach a device operation: a path that does not fit would end the process.
+// the device if there is to be one, and the PC its name, which must not lead into a file or folder of another
+// name. (The device judges names of its own accord.) What fails here must not reach a device operation: a
+// path that does not fit would end the process.
 bool CanCopyEntry(const EntryCopy& entry, bool with_device_backup);
 
 // Creates the folder on the target side that holds the entry, in a device session of its own or (`nested`)

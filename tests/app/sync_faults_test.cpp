@@ -200,6 +200,31 @@ TEST_F(SyncTest, HostileNamesReachNoFileOutsideTheJobFolder) {
     EXPECT_EQ(opened, (Lines{L"\\Jobs\\...wkf", L"\\Jobs\\good.qvj"}));
 }
 
+TEST_F(SyncTest, ShortNamesLeadIntoNoOtherFolder) {
+    const std::wstring folder = L"a long folder name";
+    const Lines kept = {folder + L"\\listed.qvj", L"job\\" + folder + L"\\companion.dat"};
+    for (const std::wstring& name : kept) {
+        PutOnPc(name, "kept", noon_);
+    }
+    wchar_t path[MAX_PATH] = L"";
+    GetShortPathNameW(OnPc(folder).c_str(), path, MAX_PATH);
+    const std::wstring alias = std::wstring(path).substr(std::wstring(path).rfind(L'\\') + 1);
+    if (alias.find(L'~') == std::wstring::npos) {
+        GTEST_SKIP() << "no short names to be had here";
+    }
+    const FILETIME newer = AddSeconds(noon_, 60);
+    PutOnDevice(alias + L"\\listed.qvj", "device", newer);
+    PutOnDevice(alias + L"\\new.qvj", "device", newer);
+    PutOnDevice(L"job.wkf", "device", newer);
+    PutOnDevice(L"job\\" + alias + L"\\companion.dat", "device", newer);
+    DialogRun().Synchronize();
+    for (const std::wstring& name : kept) {
+        EXPECT_EQ(ReadTextFile(OnPc(name)), "kept") << name;
+    }
+    EXPECT_FALSE(Exists(OnPc(folder + L"\\new.qvj")));
+    EXPECT_TRUE(Exists(OnPc(L"job.wkf")));
+}
+
 // A name that brings `folder` to that many characters.
 std::wstring NameFor(std::size_t characters, const std::wstring& folder, const wchar_t* extension) {
     return std::wstring(characters - folder.size() - 4, L'n') + extension;
