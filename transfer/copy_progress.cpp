@@ -50,11 +50,7 @@ bool CopyProgress::MayGoOn() const {
     while (dialog_.GetStopState() == StopState::kAsking &&
            WaitForSingleObject(thread_.Get(), kPollMs) == WAIT_TIMEOUT) {
     }
-    return !IsStopped();
-}
-
-bool CopyProgress::IsStopped() const {
-    return dialog_.GetStopState() == StopState::kStopped;
+    return dialog_.GetStopState() != StopState::kStopped;
 }
 
 void CopyProgress::ShowFile(const std::wstring& from, const std::wstring& to, const std::wstring& name,

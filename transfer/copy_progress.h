@@ -25,8 +25,6 @@ class CopyProgress {
     // Whether the next file may begin: false when the user stopped the copy. While the user is being asked
     // this waits for the answer.
     bool MayGoOn() const;
-    // Whether the user has stopped the copy, without waiting for an answer that is still to come.
-    bool IsStopped() const;
     // Shows what is copied now; `index` counts from 0.
     void ShowFile(const std::wstring& from, const std::wstring& to, const std::wstring& name, int index,
                   int count) const;

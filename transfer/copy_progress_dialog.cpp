@@ -71,8 +71,8 @@ bool CCeShwCopyFileDlg::OnAskReplace(const std::wstring& question) {
                               Xlate(L"Synchronization - Warning")) != IDCANCEL;
 }
 
-// The stop question may still be open when the last file is done. Its answer no longer matters, and as long
-// as it is open the thread cannot end: it is taken away.
+// The stop question may still be open when the last file is done. Its answer no longer matters (who has more
+// to copy has waited for it), and as long as it is open the thread cannot end: it is taken away.
 void CCeShwCopyFileDlg::OnClose() {
     if (HWND popup = GetLastActivePopup(Handle()); popup != nullptr && popup != Handle()) {
         EndDialog(popup, IDNO);

@@ -53,8 +53,7 @@ class SelectedCopy {
     TransferOutcome Run() {
         TransferOutcome outcome;
         const int count = static_cast<int>(request_.names.size());
-        outcome.stopped = !progress_.MayGoOn();
-        for (int index = 0; index < count && !outcome.disk_full && !outcome.stopped; ++index) {
+        for (int index = 0; index < count && !outcome.disk_full && progress_.MayGoOn(); ++index) {
             const std::wstring& name = request_.names[static_cast<std::size_t>(index)];
             progress_.ShowFile(to_device_ ? pc_folder_ : device_folder_,
                                to_device_ ? device_folder_ : pc_folder_, name, index, count);
@@ -63,7 +62,6 @@ class SelectedCopy {
                 outcome.copied.push_back(name);
             }
             outcome.disk_full = result == DeviceResult::kDiskFull;
-            outcome.stopped = index + 1 < count ? !progress_.MayGoOn() : progress_.IsStopped();
         }
         return outcome;
     }
@@ -93,7 +91,7 @@ class SelectedCopy {
     // Whether the target may be replaced; true when there is none. Asks the user about two versions. A source
     // that cannot be opened is left, so the side that cannot be opened decides.
     bool MayReplace(const std::wstring& pc_path, const std::wstring& device_path) const {
-        // Within the caller's session. If none can be had, the device's file does not open either.
+        // A session within the caller's. That it may fail is not looked at: the caller's still stands.
         const DeviceSession session(request_.stop_event);
         const std::optional<FILETIME> pc_time = PcWriteTime(pc_path);
         if (!pc_time) {

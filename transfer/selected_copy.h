@@ -24,7 +24,6 @@ struct TransferRequest {
 struct TransferOutcome {
     std::vector<std::wstring> copied;  // In the order of the request.
     bool disk_full = false;            // The target's disk is full, which ended the copy.
-    bool stopped = false;              // The user stopped the copy, be it during its last file.
 };
 
 // Copies one file after the other and shows each in `progress`; the caller holds a device session on this

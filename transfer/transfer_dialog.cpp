@@ -52,7 +52,8 @@ void InsertTab(HWND tabs, int index, const wchar_t* text) {
 // and would now press a button once more or tick another entry.
 void DropPendingInput() {
     MSG message;
-    while (PeekMessageW(&message, nullptr, WM_MOUSEFIRST, WM_MOUSELAST, PM_REMOVE) ||
+    while (PeekMessageW(&message, nullptr, WM_NCMOUSEMOVE, WM_NCXBUTTONDBLCLK, PM_REMOVE) ||
+           PeekMessageW(&message, nullptr, WM_MOUSEFIRST, WM_MOUSELAST, PM_REMOVE) ||
            PeekMessageW(&message, nullptr, WM_KEYFIRST, WM_KEYLAST, PM_REMOVE)) {
     }
 }
@@ -367,7 +368,8 @@ void CCeFileTransfDlg::OnCopySelected() {
     UpdateData(true);
     {
         const ui::WaitCursor wait;
-        CopyFiles(current_page_, Names(pages_[static_cast<std::size_t>(current_page_)], true));
+        CopyFiles(current_page_, Names(pages_[static_cast<std::size_t>(current_page_)], true),
+                  /*more_follows=*/false);
     }
     EnableItem(IDC_TRANSFER_COPY_ALL, AnyCandidates());
     UpdateData(false);
@@ -375,10 +377,10 @@ void CCeFileTransfDlg::OnCopySelected() {
 
 void CCeFileTransfDlg::OnCopyAll(bool ticked_only) {
     const ui::WaitCursor wait;
-    for (const int number : {kPcPage, kDevicePage}) {
-        if (!CopyFiles(number, Names(pages_[static_cast<std::size_t>(number)], ticked_only))) {
-            break;
-        }
+    const std::vector<std::wstring> from_pc = Names(pages_[kPcPage], ticked_only);
+    const std::vector<std::wstring> from_device = Names(pages_[kDevicePage], ticked_only);
+    if (CopyFiles(kPcPage, from_pc, /*more_follows=*/!from_device.empty())) {
+        CopyFiles(kDevicePage, from_device, /*more_follows=*/false);
     }
     EnableItem(IDC_TRANSFER_COPY_ALL, AnyCandidates());
     if (!AnyCandidates()) {
@@ -399,9 +401,9 @@ std::vector<std::wstring> CCeFileTransfDlg::Names(const Page& page, bool ticked_
     return names;
 }
 
-// Copies the files of one page to the other side. Without a device nothing happens. False when the user
-// stopped the copy.
-bool CCeFileTransfDlg::CopyFiles(int number, const std::vector<std::wstring>& names) {
+// Copies the files of one page to the other side. Without a device nothing happens. False when the user does
+// not want what follows: a stop question that is still open is waited for, but only if something follows.
+bool CCeFileTransfDlg::CopyFiles(int number, const std::vector<std::wstring>& names, bool more_follows) {
     if (names.empty()) {
         return true;
     }
@@ -432,10 +434,11 @@ bool CCeFileTransfDlg::CopyFiles(int number, const std::vector<std::wstring>& na
             Xlate(direction == CopyDirection::kPcToDevice ? L"Device Disk Full!" : L"PC Disk Full!"),
             MB_OK | MB_ICONINFORMATION, Xlate(L"Copying File"));
     }
+    const bool go_on = !more_follows || progress.MayGoOn();
     progress.Close();
     session.Close();
     FinishCopy(page);
-    return !outcome.stopped;
+    return go_on;
 }
 
 void CCeFileTransfDlg::FinishCopy(Page& page) {

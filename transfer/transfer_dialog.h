@@ -79,7 +79,7 @@ class CCeFileTransfDlg : public ui::Dialog {
 
     bool ReadListings();
     std::vector<std::wstring> Names(const Page& page, bool ticked_only) const;
-    bool CopyFiles(int page, const std::vector<std::wstring>& names);
+    bool CopyFiles(int page, const std::vector<std::wstring>& names, bool more_follows);
     void FinishCopy(Page& page);
     bool AnyCandidates() const;
     Page* PageOfList(HWND list);

@@ -144,7 +144,7 @@ TEST_F(TransferTest, StopsWhenTheUserSaysSo) {
     }
 }
 
-// The last file is done while the user still thinks about stopping.
+// The last file from the PC is done while the user still thinks about stopping.
 TEST_F(TransferTest, AnOpenStopQuestionGoesWithTheLastFile) {
     PutOnPc(L"a.txt");
     device_.Set(L"CALL_DELAY", L"100");
@@ -161,6 +161,32 @@ TEST_F(TransferTest, AnOpenStopQuestionGoesWithTheLastFile) {
     EXPECT_TRUE(WaitUntil([&] { return !IsWindow(progress); }));
     EXPECT_EQ(run.Column(IDC_TRANSFER_PC_LIST), Names{});
     EXPECT_TRUE(Exists(OnDevice(L"a.txt")));
+}
+
+TEST_F(TransferTest, AnOpenStopQuestionHoldsUpTheOtherDirection) {
+    PutOnPc(L"a.txt");
+    PutOnDevice(L"b.txt");
+    device_.Set(L"CALL_DELAY", L"100");
+    device_.StartTrace();
+    const TransferRun run(settings_);
+    run.PressAndGoOn(IDC_TRANSFER_SYNCHRONIZE);
+    ASSERT_TRUE(WaitUntil([] { return ProgressWindow() != nullptr; }));
+    HWND progress = ProgressWindow();
+    PostMessageW(progress, WM_COMMAND, IDC_COPY_CANCEL, 0);
+    EXPECT_TRUE(WaitUntil([&] { return GetLastActivePopup(progress) != progress; }));
+    EXPECT_TRUE(WaitUntil([&] { return Exists(OnDevice(L"a.txt")); }));
+    // Until the copy is over and nothing but the question is left.
+    EXPECT_TRUE(WaitUntil([&] {
+        const std::size_t calls = device_.Trace().size();
+        Sleep(400);
+        return device_.Trace().size() == calls;
+    }));
+    PostMessageW(GetLastActivePopup(progress), WM_COMMAND, IDYES, 0);
+    EXPECT_TRUE(WaitUntil([&] { return !IsWindow(progress); }));
+    SendMessageW(run.Window(), WM_NULL, 0, 0);
+    EXPECT_EQ(run.Column(IDC_TRANSFER_PC_LIST), Names{});
+    EXPECT_EQ(run.Column(IDC_TRANSFER_DEVICE_LIST), Names{L"b.txt"});
+    EXPECT_FALSE(Exists(OnPc(L"b.txt")));
 }
 
 TEST_F(TransferTest, FilesThatCannotBeCopiedStayListed) {
