@@ -113,20 +113,18 @@ class Lister {
             return DeviceResult::kDone;
         }
         node.children = std::make_unique<FileNode[]>(static_cast<std::size_t>(kept));
-        node.child_count = static_cast<std::int32_t>(kept);
-        FileNode* child = node.children.get();
         for (const rapi::FindData& record : found.All()) {
             if (!Keeps(record)) {
                 continue;
             }
-            CopyRecord(record, TrustedName(record), *child);
-            if (recursive_ && child->is_folder != 0) {
-                const DeviceResult result = ListSubFolder(*child);
+            FileNode& child = node.children[static_cast<std::size_t>(node.child_count++)];
+            CopyRecord(record, TrustedName(record), child);
+            if (recursive_ && child.is_folder != 0) {
+                const DeviceResult result = ListSubFolder(child);
                 if (result != DeviceResult::kDone) {
                     return result;
                 }
             }
-            ++child;
         }
         return DeviceResult::kDone;
     }

@@ -68,12 +68,22 @@ struct CopyPlan {
     DWORD TargetCreation() const { return make_backup ? CREATE_NEW : CREATE_ALWAYS; }
 };
 
+// The times of a copy's source; the present time where they cannot be read. (A complete target must not go on
+// with the date of an incomplete one.)
 struct FileTimes {
-    FILETIME creation = {};
-    FILETIME last_access = {};
-    FILETIME last_write = {};
-    BOOL known = FALSE;
+    FILETIME creation;
+    FILETIME last_access;
+    FILETIME last_write;
 };
+
+FileTimes TimesOf(HANDLE source, BOOL (*get_times)(HANDLE, FILETIME*, FILETIME*, FILETIME*)) {
+    FileTimes times;
+    if (!get_times(source, &times.creation, &times.last_access, &times.last_write)) {
+        GetSystemTimeAsFileTime(&times.last_write);
+        times.creation = times.last_access = times.last_write;
+    }
+    return times;
+}
 
 // Copies from where the source's handle stands to its end. Neither handle is closed. A chunk that is shorter
 // than asked for is the last; so a source of full chunks only ends with a chunk of 0 bytes.
@@ -122,7 +132,7 @@ void StampDeviceFile(const CopyPlan& plan, HANDLE source, const FileTimes& times
         // Meant: a call on the device with the PC's handle and nothing to fill, its result is not looked at.
         CeGetFileTime(source, nullptr, nullptr, nullptr);
         CeSetFileTime(target, nullptr, nullptr, &plan.last_write);
-    } else if (plan.stamp == CopyPlan::Stamp::kAllThree && times.known) {
+    } else if (plan.stamp == CopyPlan::Stamp::kAllThree) {
         CeSetFileTime(target, &times.creation, &times.last_access, &times.last_write);
     }
 }
@@ -131,7 +141,7 @@ void StampPcFile(const CopyPlan& plan, const FileTimes& times, HANDLE target) {
     if (plan.stamp == CopyPlan::Stamp::kLastWrite) {
         GetFileTime(target, nullptr, nullptr, nullptr);  // Meant: its result is not looked at.
         SetFileTime(target, nullptr, nullptr, &plan.last_write);
-    } else if (plan.stamp == CopyPlan::Stamp::kAllThree && times.known) {
+    } else if (plan.stamp == CopyPlan::Stamp::kAllThree) {
         SetFileTime(target, &times.creation, &times.last_access, &times.last_write);
     }
 }
@@ -159,8 +169,8 @@ DeviceResult CopyToDevice(const std::wstring& pc_path, const std::wstring& devic
     if (!source) {
         return plan.not_begun;
     }
-    FileTimes times;
-    times.known = GetFileTime(source.Get(), &times.creation, &times.last_access, &times.last_write);
+    const FileTimes times =
+        TimesOf(source.Get(), [](auto... arguments) { return GetFileTime(arguments...); });
     if (plan.make_backup && !KeepOldDeviceFileInSession(device_path, cancel_event, plan.nested)) {
         return DeviceResult::kFailed;
     }
@@ -226,9 +236,9 @@ DeviceResult CopyToPc(const std::wstring& device_path, const std::wstring& pc_pa
     if (plan.stamp != CopyPlan::Stamp::kNone) {
         SetFileTime(target.Get(), nullptr, nullptr, &kUnfinished);
     }
-    FileTimes times;
+    FileTimes times{};
     if (plan.stamp == CopyPlan::Stamp::kAllThree) {
-        times.known = CeGetFileTime(source.Get(), &times.creation, &times.last_access, &times.last_write);
+        times = TimesOf(source.Get(), CeGetFileTime);
     }
     DeviceResult result = CopyChunks(kDevice, source.Get(), kPc, target.Get(), cancel_event);
     bool deleted = false;

@@ -71,11 +71,6 @@ struct RegistryKey {
     static Type Invalid() noexcept { return nullptr; }
     static void Close(Type handle) noexcept { RegCloseKey(handle); }
 };
-struct Library {
-    using Type = HMODULE;
-    static Type Invalid() noexcept { return nullptr; }
-    static void Close(Type handle) noexcept { FreeLibrary(handle); }
-};
 struct Icon {
     using Type = HICON;
     static Type Invalid() noexcept { return nullptr; }
@@ -110,13 +105,10 @@ using UniqueThread = UniqueHandle<handle_traits::Kernel>;
 using UniqueFile = UniqueHandle<handle_traits::File>;
 using UniqueFind = UniqueHandle<handle_traits::Find>;
 using UniqueRegistryKey = UniqueHandle<handle_traits::RegistryKey>;
-using UniqueLibrary = UniqueHandle<handle_traits::Library>;
 using UniqueIcon = UniqueHandle<handle_traits::Icon>;
 using UniqueMenu = UniqueHandle<handle_traits::Menu>;
 using UniqueImageList = UniqueHandle<handle_traits::ImageList>;
 using UniqueBrush = UniqueHandle<handle_traits::Gdi<HBRUSH>>;
-using UniquePen = UniqueHandle<handle_traits::Gdi<HPEN>>;
-using UniqueFont = UniqueHandle<handle_traits::Gdi<HFONT>>;
 using UniqueBitmap = UniqueHandle<handle_traits::Gdi<HBITMAP>>;
 using UniqueMemoryDc = UniqueHandle<handle_traits::MemoryDc>;
 
