@@ -10,7 +10,7 @@ namespace {
 constexpr int kTextSize = 256;
 
 UINT TextFlags(int format) {
-    UINT flags = DT_VCENTER | DT_SINGLELINE | DT_END_ELLIPSIS;
+    const UINT flags = DT_VCENTER | DT_SINGLELINE | DT_END_ELLIPSIS | DT_NOPREFIX;
     switch (format & HDF_JUSTIFYMASK) {
         case HDF_CENTER:
             return flags | DT_CENTER;

@@ -179,7 +179,8 @@ void COptionsDlg::OnBrowseDevice() {
     UpdateData(true);
     CCeBrowseDlg browser(1, 0, {kNoFilePattern}, Xlate(L"Mobile Device Browse"), values_.sync_path_ce,
                          Handle());
-    if (browser.DoModal() == IDOK) {
+    // Nothing is chosen where the device could not be read: the field stays as it was then.
+    if (browser.DoModal() == IDOK && !browser.ResultFolder().empty()) {
         values_.sync_path_ce = browser.ResultFolder();
     }
     UpdateData(false);

@@ -5,16 +5,13 @@
 
 namespace orvane::ui {
 
-// Shows the hour glass from construction to destruction, then the cursor that was shown before.
+// Shows the hour glass from construction to destruction, then the arrow.
 class WaitCursor {
   public:
-    WaitCursor() : previous_(SetCursor(LoadCursorW(nullptr, IDC_WAIT))) {}
-    ~WaitCursor() { SetCursor(previous_); }
+    WaitCursor() { SetCursor(LoadCursorW(nullptr, IDC_WAIT)); }
+    ~WaitCursor() { SetCursor(LoadCursorW(nullptr, IDC_ARROW)); }
     WaitCursor(const WaitCursor&) = delete;
     WaitCursor& operator=(const WaitCursor&) = delete;
-
-  private:
-    HCURSOR previous_;
 };
 
 }  // namespace orvane::ui
