@@ -355,17 +355,16 @@ void CWendlowDlg::OnAddInfo() {
 // Marks the line of the failed file in the log, if the log's lines were windows. They are not, and so an
 // error only discards its text: the file's line stays as it was. That is meant.
 void CWendlowDlg::OnErrorInfo() {
-    ShowReports();
     if (!task_.info_text.empty()) {
-        HWND progress = Item(IDC_SYNC_PROGRESS);
-        const LRESULT position = SendMessageW(progress, PBM_GETPOS, 0, 0);
-        SendMessageW(progress, PBM_SETPOS, static_cast<WPARAM>(position), 0);
+        const LRESULT position = SendMessageW(Item(IDC_SYNC_PROGRESS), PBM_GETPOS, 0, 0) + unshown_steps_;
         if (HWND line = GetDlgItem(Item(IDC_SYNC_LOG), static_cast<int>(position))) {
             SetWindowTextW(line, (ui::WindowText(line) + L"- FAILED").c_str());
         }
         task_.info_text.clear();
     }
-    SelectLastLogLine();
+    if (unshown_lines_.empty()) {
+        SelectLastLogLine();  // Else it is selected when they are shown.
+    }
 }
 
 void CWendlowDlg::OnFirstPassComplete() {

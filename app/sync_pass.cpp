@@ -86,8 +86,7 @@ class SyncPass {
     bool HandleRow(std::size_t row) {
         const std::wstring_view name = source_.listing.table.names[row];
         const FILETIME& write_time = source_.listing.table.write_times[row];
-        if (ShouldSkipCopy(task_.overwrite_old_files, write_time, name,
-                           {target_.listing.table, target_.listing.rows, index_}, ask_replace_)) {
+        if (ShouldSkipCopy(task_.overwrite_old_files, write_time, name, index_, ask_replace_)) {
             Report(kIncrementProgress);
             return true;
         }
