@@ -56,7 +56,10 @@ on_one_processor() (
   processor=$(taskset -cp "$BASHPID" | sed 's/.*: //; s/[-,].*//')
   taskset -cp "$processor" "$BASHPID" >/dev/null
   source tools/wine_prefix.sh
-  end_wine_server() { /usr/lib/wine/wineserver -k && /usr/lib/wine/wineserver -w; }
+  end_wine_server() {
+    /usr/lib/wine/wineserver -k || true # There may be none.
+    /usr/lib/wine/wineserver -w
+  }
   end_wine_server
   trap end_wine_server EXIT
   "$@"
