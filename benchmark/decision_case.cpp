@@ -60,8 +60,7 @@ std::int32_t DecideAll(const Side& source, const Side& target) {
     const FileIndex index(target.table, target.rows);
     std::int32_t due = 0;
     for (std::size_t row = 0; row < static_cast<std::size_t>(source.rows); ++row) {
-        due += ShouldSkipCopy(true, source.table.write_times[row], source.table.names[row],
-                              {target.table, target.rows, index}, nullptr)
+        due += ShouldSkipCopy(true, source.table.write_times[row], source.table.names[row], index, nullptr)
                    ? 0
                    : 1;
     }

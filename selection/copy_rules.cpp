@@ -49,15 +49,12 @@ bool IsSameVersion(const FILETIME& a, const FILETIME& b, int bound_seconds) {
 }
 
 bool ShouldSkipCopy(bool overwrite, const FILETIME& source_write_time, std::wstring_view name,
-                    const CopyTarget& target, const std::function<bool(std::wstring_view)>& ask_replace) {
-    if (target.rows < 1) {
-        return false;
-    }
-    const std::int32_t row = target.index.Find(name);
+                    const FileIndex& target, const std::function<bool(std::wstring_view)>& ask_replace) {
+    const std::int32_t row = target.Find(name);
     if (row < 0) {
         return false;
     }
-    const FILETIME& target_write_time = target.table.write_times[static_cast<std::size_t>(row)];
+    const FILETIME& target_write_time = target.Table().write_times[static_cast<std::size_t>(row)];
     if (!overwrite || SameFileTime(source_write_time, target_write_time)) {
         return true;
     }

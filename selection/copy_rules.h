@@ -22,19 +22,12 @@ inline constexpr int kSameVersionSecondsReplaceCheck = 11;
 // than `bound_seconds`. Two seconds across midnight are two versions.
 bool IsSameVersion(const FILETIME& a, const FILETIME& b, int bound_seconds);
 
-// The other side's listing as the target of copies. Table and index belong to the caller.
-struct CopyTarget {
-    const FileTable& table;
-    std::int32_t rows;
-    const FileIndex& index;
-};
-
-// Whether the source file is left alone: a file of its name is on the target side and may not be overwritten
+// Whether the source file is left alone: `target` has a file of its name that may not be overwritten
 // (`overwrite` off), has an equal time, is the same version, is newer, or is one that the user keeps.
 // `ask_replace`, empty when the user wants no warning, is called with the name only for a target that would
 // be replaced, and answers whether to replace it.
 bool ShouldSkipCopy(bool overwrite, const FILETIME& source_write_time, std::wstring_view name,
-                    const CopyTarget& target, const std::function<bool(std::wstring_view)>& ask_replace);
+                    const FileIndex& target, const std::function<bool(std::wstring_view)>& ask_replace);
 
 // The question whether the target may be replaced, in the user's language. The display texts are paths with
 // the side behind them.

@@ -47,6 +47,8 @@ class FileIndex {
   public:
     FileIndex(const FileTable& table, std::int32_t rows);
 
+    const FileTable& Table() const { return table_; }
+
     // The first row whose name is equal without regard to case, whatever its kind; -1 if there is none.
     std::int32_t Find(std::wstring_view name) const;
 

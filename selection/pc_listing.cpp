@@ -1,6 +1,7 @@
 #include "selection/pc_listing.h"
 
 #include <cwchar>
+#include <optional>
 #include <string_view>
 
 #include "platform/handles.h"
@@ -17,9 +18,7 @@ class PcSearch {
   public:
     explicit PcSearch(const std::wstring& pattern) : find_(FindFirstFileW(pattern.c_str(), &data_)) {}
 
-    bool FoundAnything() const { return static_cast<bool>(find_); }
-
-    // Whether the search went on to its regular end.
+    // Whether the search found anything, be it "." alone, and went on to its regular end.
     bool ReachedEnd() const { return reached_end_; }
 
     // Steps to the next entry, the first one at the first call. Null after the last.
@@ -44,6 +43,16 @@ class PcSearch {
     bool reached_end_ = false;
 };
 
+// The number of entries that the pattern finds; nothing when it finds none at all or the search breaks off.
+std::optional<std::int32_t> CountFound(const std::wstring& pattern) {
+    PcSearch search(pattern);
+    std::int32_t count = 0;
+    while (search.Next() != nullptr) {
+        ++count;
+    }
+    return search.ReachedEnd() ? std::optional(count) : std::nullopt;
+}
+
 void FillNode(const WIN32_FIND_DATAW& data, FileNode& node) {
     node.name = data.cFileName;
     node.is_folder = (data.dwFileAttributes & FILE_ATTRIBUTE_DIRECTORY) != 0 ? 1 : 0;
@@ -56,27 +65,20 @@ void FillNode(const WIN32_FIND_DATAW& data, FileNode& node) {
 }  // namespace
 
 DeviceResult ListPcFolder(const std::wstring& pattern, bool recurse, FileNode& node) {
-    PcSearch counting(pattern);
-    if (!counting.FoundAnything()) {
+    const std::optional<std::int32_t> capacity = CountFound(pattern);
+    if (!capacity) {
         return DeviceResult::kFailed;
     }
-    std::int32_t capacity = 0;
-    while (counting.Next() != nullptr) {
-        ++capacity;
-    }
-    if (!counting.ReachedEnd()) {
-        return DeviceResult::kFailed;
-    }
-    if (capacity == 0) {
+    if (*capacity == 0) {
         return DeviceResult::kDone;
     }
-    node.children = std::make_unique<FileNode[]>(static_cast<std::size_t>(capacity));
+    node.children = std::make_unique<FileNode[]>(static_cast<std::size_t>(*capacity));
 
     // The folder may change between the two passes: entries that are new are left out, and the count is that
     // of the entries that were really filled.
     const std::wstring folder(pattern, 0, pattern.size() - kEverything.size());
     PcSearch filling(pattern);
-    while (node.child_count < capacity) {
+    while (node.child_count < *capacity) {
         const WIN32_FIND_DATAW* data = filling.Next();
         if (data == nullptr) {
             return filling.ReachedEnd() ? DeviceResult::kDone : DeviceResult::kFailed;

@@ -56,7 +56,6 @@ bool BuildCandidates(const Comparison& comparison, const JobTable& source, const
                      std::vector<sFileDate>& candidates) {
     candidates.clear();
     const FileIndex index(target.table, target.rows);
-    const CopyTarget copy_target{target.table, target.rows, index};
     for (std::int32_t i = 0; i < source.rows; ++i) {
         if (comparison.stopped) {
             return false;
@@ -66,7 +65,7 @@ bool BuildCandidates(const Comparison& comparison, const JobTable& source, const
         const FILETIME& write_time = source.table.write_times[row];
         // The user decides by ticking: nothing is asked here.
         if (source.table.kinds[row] != kKindFile ||
-            ShouldSkipCopy(comparison.overwrite_old_files, write_time, name, copy_target, {})) {
+            ShouldSkipCopy(comparison.overwrite_old_files, write_time, name, index, {})) {
             continue;
         }
         const std::wstring_view relative = name.substr(1);

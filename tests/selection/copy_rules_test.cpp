@@ -100,8 +100,7 @@ TEST(ShouldSkipCopy, AsksOnlyForWhatWouldBeReplaced) {
                 return c.answer == Answer::kReplace;
             };
         }
-        EXPECT_EQ(ShouldSkipCopy(c.overwrite, c.source_time, c.name, {table, c.rows, index}, ask), c.skip)
-            << (&c - cases);
+        EXPECT_EQ(ShouldSkipCopy(c.overwrite, c.source_time, c.name, index, ask), c.skip) << (&c - cases);
         EXPECT_EQ(questions, c.questions) << (&c - cases);
     }
 }
