@@ -1,4 +1,8 @@
 // Whole synchronizations through the real dialog: what it does and what it shows.
+#include <windows.h>
+
+#include <commctrl.h>
+
 #include <algorithm>
 
 #include "qelutils/xlate.h"
@@ -8,8 +12,6 @@
 namespace orvane::testing {
 
 namespace {
-
-using Lines = std::vector<std::wstring>;
 
 TEST_F(SyncTest, CopiesBothWaysAndTellsSo) {
     PutOnPc(L"from_pc.qvj", "pc", noon_);
@@ -30,18 +32,18 @@ TEST_F(SyncTest, CopiesBothWaysAndTellsSo) {
     EXPECT_FALSE(dialog.IsBarVisible());
     dialog.Synchronize();
 
-    EXPECT_EQ(dialog.Log(),
-              (Lines{L"Checking files...", L"[Desktop to Mobile Device] File copy: \"\\from_pc.qvj\"",
-                     L"[Desktop to Mobile Device] File copy: \"\\newer_here.tn3\"",
-                     L"[Desktop to Mobile Device] File copy: \"\\sub\\deep\\Plan.XML\"",
-                     L"[Mobile Device to Desktop] File copy: \"\\day 1\\scan.img\"",
-                     L"[Mobile Device to Desktop] File copy: \"\\from_device.txt\"",
-                     L"[Mobile Device to Desktop] File copy: \"\\newer_there.rd3\"",
-                     L"Synchronization complete."}));
+    Lines log = dialog.Log();
+    EXPECT_EQ(log, (Lines{L"Checking files...", L"[Desktop to Mobile Device] File copy: \"\\from_pc.qvj\"",
+                          L"[Desktop to Mobile Device] File copy: \"\\newer_here.tn3\"",
+                          L"[Desktop to Mobile Device] File copy: \"\\sub\\deep\\Plan.XML\"",
+                          L"[Mobile Device to Desktop] File copy: \"\\day 1\\scan.img\"",
+                          L"[Mobile Device to Desktop] File copy: \"\\from_device.txt\"",
+                          L"[Mobile Device to Desktop] File copy: \"\\newer_there.rd3\"",
+                          L"Synchronization complete."}));
     EXPECT_EQ(dialog.Text(IDC_SYNC_CANCEL_EXIT), L"Exit");
     // 8 entries on the PC, 6 on the device.
     EXPECT_EQ(dialog.BarMaximum(), 14);
-    EXPECT_EQ(dialog.BarPosition(), 14);
+    EXPECT_EQ(SendMessageW(dialog.Item(IDC_SYNC_PROGRESS), PBM_GETPOS, 0, 0), 14);
 
     EXPECT_EQ(ReadTextFile(OnDevice(L"from_pc.qvj")), "pc");
     EXPECT_EQ(ReadTextFile(OnDevice(L"sub\\deep\\Plan.XML")), "plan");
@@ -55,17 +57,8 @@ TEST_F(SyncTest, CopiesBothWaysAndTellsSo) {
 
     // Nothing is left to do, and the log goes on below.
     dialog.Synchronize();
-    const Lines log = dialog.Log();
-    ASSERT_EQ(log.size(), 10U);
-    EXPECT_EQ(log[8], L"Checking files...");
-    EXPECT_EQ(log[9], L"Synchronization complete.");
-}
-
-TEST_F(SyncTest, EmptyFoldersAreSoonInStep) {
-    const DialogRun dialog;
-    dialog.Synchronize();
-    EXPECT_EQ(dialog.Log(), (Lines{L"Checking files...", L"Synchronization complete."}));
-    EXPECT_EQ(dialog.BarMaximum(), 0);
+    log.insert(log.end(), {L"Checking files...", L"Synchronization complete."});
+    EXPECT_EQ(dialog.Log(), log);
 }
 
 TEST_F(SyncTest, StartsAsAFileViewerOnRequest) {
@@ -73,18 +66,15 @@ TEST_F(SyncTest, StartsAsAFileViewerOnRequest) {
     const DialogRun dialog;
     ASSERT_NE(FileView(), nullptr);
     const ULONGLONG shown = GetTickCount64();
-    bool closing = false;
-    bool came_into_view = false;
-    EXPECT_TRUE(DialogRun::WaitUntil([&] {
-        came_into_view = came_into_view || IsWindowVisible(dialog.Window());
-        if (!closing && GetTickCount64() >= shown + 200) {
-            EXPECT_NE(FileView(), nullptr);
-            PostMessageW(FileView(), WM_CLOSE, 0, 0);
-            closing = true;
-        }
+    EXPECT_TRUE(WaitUntil([&] {
+        EXPECT_FALSE(IsWindowVisible(dialog.Window()));
+        return GetTickCount64() >= shown + 200;
+    }));
+    PostMessageW(FileView(), WM_CLOSE, 0, 0);
+    EXPECT_TRUE(WaitUntil([&] {
+        EXPECT_FALSE(IsWindowVisible(dialog.Window()));
         return dialog.HasEnded();
     }));
-    EXPECT_FALSE(came_into_view);
 }
 
 TEST_F(SyncTest, TakesCompanionFoldersAlongAndKeepsBackups) {
@@ -93,8 +83,7 @@ TEST_F(SyncTest, TakesCompanionFoldersAlongAndKeepsBackups) {
     PutOnPc(L"bridge\\raw\\points.dat", "points", noon_);
     PutOnDevice(L"tunnel.WKF", "job", noon_);
     PutOnDevice(L"tunnel\\points.dat", "points", noon_);
-    PutOnPc(L"level.qvj", "newer", AddSeconds(noon_, 60));
-    PutOnDevice(L"level.qvj", "older", noon_);
+    PutNewerOnPc(L"level.qvj");
     PutOnDevice(L"level.qvj.001", "oldest", noon_);
 
     DialogRun().Synchronize();
@@ -106,11 +95,8 @@ TEST_F(SyncTest, TakesCompanionFoldersAlongAndKeepsBackups) {
 
 TEST_F(SyncTest, AsksBeforeReplacingWhenTheUserWantsWarning) {
     Setting(L"Overwrite_warn", L"1");
-    PutOnPc(L"a.qvj", "newer", AddSeconds(noon_, 60));
-    PutOnDevice(L"a.qvj", "older", noon_);
-    PutOnPc(L"b.qvj", "newer", AddSeconds(noon_, 60));
-    PutOnDevice(L"b.qvj", "older", noon_);
-
+    PutNewerOnPc(L"a.qvj");
+    PutNewerOnPc(L"b.qvj");
     const MessageBoxAnswerer answers({IDCANCEL, IDOK});
     DialogRun().Synchronize();
     EXPECT_EQ(ReadTextFile(OnDevice(L"a.qvj")), "older");
@@ -130,15 +116,13 @@ TEST_F(SyncTest, WorksInTheUsersLanguage) {
         PutManyOnPc(40);
         device_.Set(L"CALL_DELAY", L"5");
         const DialogRun dialog;
-        const std::wstring exit = Xlate(L"Exit");
-        ASSERT_NE(exit, L"Exit");
-        EXPECT_EQ(dialog.Text(IDC_SYNC_CANCEL_EXIT), exit);
+        EXPECT_EQ(dialog.Text(IDC_SYNC_CANCEL_EXIT), L"Beenden");
         dialog.Press(IDC_SYNC_START);
-        EXPECT_TRUE(dialog.WaitForText(IDC_SYNC_CANCEL_EXIT, Xlate(L"Cancel")));
+        EXPECT_TRUE(WaitUntil([&] { return dialog.Text(IDC_SYNC_CANCEL_EXIT) == L"Abbrechen"; }));
         dialog.Press(IDC_SYNC_CANCEL_EXIT);
-        EXPECT_EQ(dialog.Text(IDC_SYNC_CANCEL_EXIT), exit);
+        EXPECT_EQ(dialog.Text(IDC_SYNC_CANCEL_EXIT), L"Beenden");
         dialog.Press(IDC_SYNC_CANCEL_EXIT);
-        EXPECT_TRUE(DialogRun::WaitUntil([&] { return dialog.HasEnded(); }));
+        EXPECT_TRUE(WaitUntil([&] { return dialog.HasEnded(); }));
     }
     qel_text::SetCatalogLanguage(MAKELANGID(LANG_ENGLISH, SUBLANG_ENGLISH_US));
 }
@@ -147,31 +131,33 @@ TEST_F(SyncTest, CancelStopsAndTheNextPressStartsAfresh) {
     PutManyOnPc(60);
     device_.Set(L"CALL_DELAY", L"5");
     const DialogRun dialog;
+    const auto starts = [&] {
+        const Lines log = dialog.Log();
+        return std::count(log.begin(), log.end(), L"Checking files...");
+    };
     dialog.Press(IDC_SYNC_START);
-    EXPECT_TRUE(DialogRun::WaitUntil([&] { return dialog.Log().size() >= 3; }));
+    EXPECT_TRUE(WaitUntil([&] { return dialog.Log().size() >= 3; }));
     EXPECT_EQ(dialog.Text(IDC_SYNC_STATUS), L"Synchronization in progress...");
     EXPECT_TRUE(dialog.IsBarVisible());
 
     // While a worker runs the press does nothing.
     dialog.Press(IDC_SYNC_START);
-    Lines log = dialog.Log();
-    EXPECT_EQ(std::count(log.begin(), log.end(), L"Checking files..."), 1);
+    EXPECT_EQ(starts(), 1);
 
     dialog.Press(IDC_SYNC_CANCEL_EXIT);
     EXPECT_EQ(dialog.Text(IDC_SYNC_CANCEL_EXIT), L"Exit");
     Sleep(300);  // For the file under way to end.
-    const std::size_t copied = ListTree(OnDevice(L"")).size();
-    EXPECT_LT(copied, 60U);
+    const Lines copied = DeviceFiles();
+    EXPECT_LT(copied.size(), 60U);
     Sleep(300);
-    EXPECT_EQ(ListTree(OnDevice(L"")).size(), copied);
+    EXPECT_EQ(DeviceFiles(), copied);
     EXPECT_EQ(dialog.Completions(), 0);
     EXPECT_EQ(dialog.Text(IDC_SYNC_STATUS), L"Sychronization cancelled");
     EXPECT_TRUE(dialog.IsBarVisible());
 
     device_.Set(L"CALL_DELAY", L"");
     dialog.Synchronize();
-    log = dialog.Log();
-    EXPECT_EQ(std::count(log.begin(), log.end(), L"Checking files..."), 2);
+    EXPECT_EQ(starts(), 2);
     for (int i = 0; i < 60; ++i) {
         EXPECT_EQ(ReadTextFile(OnDevice(L"new_" + std::to_wstring(i) + L".qvj")), "content") << i;
     }
@@ -187,7 +173,7 @@ TEST_F(SyncTest, CancelledInItsLastFileARunStaysCancelled) {
         device_.Set(L"CALL_DELAY", L"10");
         const DialogRun dialog;
         dialog.Press(IDC_SYNC_START);
-        EXPECT_TRUE(DialogRun::WaitUntil([&] { return dialog.Log().size() == 2; }));
+        EXPECT_TRUE(WaitUntil([&] { return dialog.Log().size() == 2; }));
         Sleep(100);
         dialog.Press(IDC_SYNC_CANCEL_EXIT);
         Sleep(300);
@@ -205,42 +191,33 @@ TEST_F(SyncTest, LeavingRemovesTheFileThatIsCopiedInPart) {
     device_.Set(L"CALL_DELAY", L"10");
     const DialogRun dialog;
     dialog.Press(IDC_SYNC_START);
-    EXPECT_TRUE(DialogRun::WaitUntil([&] { return Exists(OnDevice(L"large.qvj")); }));
+    EXPECT_TRUE(WaitUntil([&] { return Exists(OnDevice(L"large.qvj")); }));
     PostMessageW(dialog.Window(), WM_COMMAND, IDCANCEL, 0);
-    EXPECT_TRUE(DialogRun::WaitUntil([&] { return dialog.HasEnded(); }));
+    EXPECT_TRUE(WaitUntil([&] { return dialog.HasEnded(); }));
     EXPECT_FALSE(Exists(OnDevice(L"large.qvj")));
 }
 
 TEST_F(SyncTest, AnOpenQuestionHoldsUpTheNextStart) {
     Setting(L"Overwrite_warn", L"1");
-    PutOnPc(L"a.qvj", "newer", AddSeconds(noon_, 60));
-    PutOnDevice(L"a.qvj", "older", noon_);
+    PutNewerOnPc(L"a.qvj");
     const DialogRun dialog;
     const auto question = [] { return FindWindowW(L"#32770", L"Synchronization - Warning"); };
     dialog.Press(IDC_SYNC_START);
-    EXPECT_TRUE(DialogRun::WaitUntil([&] { return question() != nullptr; }));
+    EXPECT_TRUE(WaitUntil([&] { return question() != nullptr; }));
     dialog.Press(IDC_SYNC_CANCEL_EXIT);
     dialog.Press(IDC_SYNC_START);
     EXPECT_EQ(dialog.Log(), (Lines{L"Checking files..."}));
 
     PostMessageW(question(), WM_COMMAND, IDOK, 0);
-    EXPECT_TRUE(DialogRun::WaitUntil([&] { return question() == nullptr; }));
+    EXPECT_TRUE(WaitUntil([&] { return question() == nullptr; }));
     Setting(L"Overwrite_warn", L"0");
     const MessageBoxAnswerer answers({IDOK});
     dialog.Synchronize();
     EXPECT_EQ(ReadTextFile(OnDevice(L"a.qvj")), "newer");
 }
 
-TEST_F(SyncTest, EveryReportArrives) {
-    constexpr int kFiles = 300;
-    PutManyOnPc(kFiles);
-    const DialogRun dialog;
-    dialog.Synchronize();
-    EXPECT_EQ(dialog.Log().size(), kFiles + 2U);
-}
-
 TEST_F(SyncTest, TwentyRunsLeaveNoHandlesBehind) {
-    PutManyOnPc(5);
+    PutManyOnPc(1);
     PutOnDevice(L"a.txt", "device", noon_);
     const DialogRun dialog;
     dialog.Synchronize();
@@ -262,9 +239,9 @@ TEST_F(SyncTest, ShowsTheAboutBoxFromTheSystemMenu) {
     const DialogRun dialog;
     PostMessageW(dialog.Window(), WM_SYSCOMMAND, IDM_ABOUT, 0);
     const auto about = [] { return FindWindowW(L"#32770", L"About Orvanelink"); };
-    ASSERT_TRUE(DialogRun::WaitUntil([&] { return about() != nullptr; }));
+    ASSERT_TRUE(WaitUntil([&] { return about() != nullptr; }));
     PostMessageW(about(), WM_COMMAND, IDOK, 0);
-    EXPECT_TRUE(DialogRun::WaitUntil([&] { return about() == nullptr; }));
+    EXPECT_TRUE(WaitUntil([&] { return about() == nullptr; }));
 }
 
 }  // namespace

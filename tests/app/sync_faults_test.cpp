@@ -8,8 +8,6 @@ namespace orvane::testing {
 
 namespace {
 
-using Lines = std::vector<std::wstring>;
-
 TEST_F(SyncTest, AFullDeviceEndsThePassAndTheNextPressStartsAfresh) {
     PutOnPc(L"a.qvj", std::string(3000, 'a'), noon_);
     PutOnPc(L"b.qvj", std::string(20000, 'b'), noon_);
@@ -18,21 +16,20 @@ TEST_F(SyncTest, AFullDeviceEndsThePassAndTheNextPressStartsAfresh) {
     device_.Set(L"CAPACITY", L"20000");
     const DialogRun dialog;
     dialog.Press(IDC_SYNC_START);
-    EXPECT_TRUE(DialogRun::WaitUntil([&] { return dialog.Log().size() == 4; }));
+    EXPECT_TRUE(WaitUntil([&] { return dialog.Log().size() == 4; }));
     EXPECT_EQ(dialog.Log(), (Lines{L"Checking files...", L"[Desktop to Mobile Device] File copy: \"\\a.qvj\"",
                                    L"[Desktop to Mobile Device] File copy: \"\\b.qvj\"",
                                    L"[Desktop to Mobile Device] Error: DEVICE DISK FULL."}));
     Sleep(200);
     EXPECT_EQ(dialog.Text(IDC_SYNC_STATUS), L"Synchronization in progress...");
     EXPECT_EQ(dialog.Text(IDC_SYNC_CANCEL_EXIT), L"Cancel");
-    EXPECT_TRUE(Exists(OnDevice(L"a.qvj")));
-    EXPECT_FALSE(Exists(OnDevice(L"b.qvj")));
+    EXPECT_EQ(DeviceFiles(), (Lines{L"a.qvj", L"d.txt"}));
     EXPECT_FALSE(Exists(OnPc(L"d.txt")));
 
     device_.Set(L"CAPACITY", L"");
     dialog.Synchronize();
-    EXPECT_TRUE(Exists(OnDevice(L"b.qvj")));
-    EXPECT_TRUE(Exists(OnPc(L"d.txt")));
+    EXPECT_EQ(DeviceFiles(), (Lines{L"a.qvj", L"b.qvj", L"c.qvj", L"d.txt"}));
+    EXPECT_EQ(PcFiles(), DeviceFiles());
 }
 
 TEST_F(SyncTest, AnUnreadableDeviceLeavesTheDialogIdle) {
@@ -76,7 +73,7 @@ TEST_F(SyncTest, ADeviceThatVanishesCostsNoFile) {
         device_.Set(L"VANISH", std::to_wstring(call));
         const MessageBoxAnswerer answers({IDOK});
         dialog.Press(IDC_SYNC_START);
-        EXPECT_TRUE(DialogRun::WaitUntil([&] { return dialog.Text(IDC_SYNC_CANCEL_EXIT) == L"Exit"; }));
+        EXPECT_TRUE(WaitUntil([&] { return dialog.Text(IDC_SYNC_CANCEL_EXIT) == L"Exit"; }));
         device_.Set(L"VANISH", L"");
         int missing = 0;
         all_copied = ReadTextFile(OnDevice(L"big.qvj")) == whole && ReadTextFile(OnPc(L"big.txt")) == whole;
@@ -109,9 +106,9 @@ TEST_F(SyncTest, ADeviceThatVanishesCostsNoFile) {
 }
 
 TEST_F(SyncTest, AFailedFileDoesNotStopTheNext) {
-    PutOnPc(L"a.qvj", "pc", noon_);
-    PutOnPc(L"locked.qvj", "pc", noon_);
-    PutOnPc(L"z.qvj", "pc", noon_);
+    for (const wchar_t* name : {L"a.qvj", L"locked.qvj", L"z.qvj"}) {
+        PutOnPc(name, "pc", noon_);
+    }
     PutOnDevice(L"b.txt", "device", noon_);
     PutOnDevice(L"y.txt", "device", noon_);
     device_.Set(L"REFUSE", L"CeCreateFile@\\Jobs\\a.qvj=5;CeCreateFile@\\Jobs\\b.txt=32");
@@ -120,19 +117,15 @@ TEST_F(SyncTest, AFailedFileDoesNotStopTheNext) {
     const DialogRun dialog;
     dialog.Synchronize();
     CloseHandle(lock);
-    EXPECT_TRUE(Exists(OnDevice(L"z.qvj")));
-    EXPECT_TRUE(Exists(OnPc(L"y.txt")));
-    EXPECT_FALSE(Exists(OnDevice(L"a.qvj")));
-    EXPECT_FALSE(Exists(OnDevice(L"locked.qvj")));
-    EXPECT_FALSE(Exists(OnPc(L"b.txt")));
+    EXPECT_EQ(DeviceFiles(), (Lines{L"b.txt", L"y.txt", L"z.qvj"}));
+    EXPECT_EQ(PcFiles(), (Lines{L"a.qvj", L"locked.qvj", L"y.txt", L"z.qvj"}));
     // The lines of the failed files stay as they are, and no error text reaches the log.
     EXPECT_EQ(dialog.Log().size(), 7U);
 }
 
 TEST_F(SyncTest, WorksWithinSessionsAndInsideTheJobFolder) {
     Setting(L"Overwrite_bkp", L"1");
-    PutOnPc(L"a.qvj", "newer", AddSeconds(noon_, 60));
-    PutOnDevice(L"a.qvj", "older", noon_);
+    PutNewerOnPc(L"a.qvj");
     PutOnPc(L"job.wkf", "job", noon_);
     PutOnPc(L"job\\points.dat", "points", noon_);
     PutOnDevice(L"sub\\b.wkf", "job", noon_);
@@ -142,30 +135,25 @@ TEST_F(SyncTest, WorksWithinSessionsAndInsideTheJobFolder) {
     device_.StartTrace();
     DialogRun().Synchronize();
 
-    const std::vector<TraceLine> trace = device_.Trace();
     EXPECT_EQ(device_.CallsOf(L"CeRapiInitEx"), device_.CallsOf(L"CeRapiUninit"));
-    for (const TraceLine& call : trace) {
-        const bool ends_session = call.function == L"CeRapiUninit";
-        EXPECT_TRUE(ends_session || call.sessions > 0) << call.number;
+    for (const TraceLine& call : device_.Trace()) {
+        EXPECT_TRUE(call.function == L"CeRapiUninit" || call.sessions > 0) << call.number;
         const std::wstring path = call.arguments.empty() ? L"" : call.arguments[0];
         EXPECT_FALSE(path.ends_with(L"\\..") || path.ends_with(L"\\Jobs\\points.dat")) << call.number;
     }
     EXPECT_TRUE(Exists(OnDevice(L"job\\points.dat")));
 }
 
-TEST_F(SyncTest, MissingPcFolderIsMadeWithWhatTheDeviceHas) {
-    Setting(L"SyncPath_DT", pc_.Path() + L"\\not\\there\\");
-    PutOnDevice(L"a.qvj", "device", noon_);
+TEST_F(SyncTest, AMissingPcFolderIsMadeButWithoutOneNothingIsCopied) {
+    PutOnDevice(L"orvane_test.txt", "device", noon_);
+    Setting(L"SyncPath_DT", OnPc(L"not\\there\\"));
     DialogRun().Synchronize();
-    EXPECT_EQ(ReadTextFile(OnPc(L"not\\there\\a.qvj")), "device");
-}
-
-TEST_F(SyncTest, WithoutAPcFolderNothingIsCopied) {
+    const Lines made = {L"not\\", L"not\\there\\", L"not\\there\\orvane_test.txt"};
+    EXPECT_EQ(PcFiles(), made);
     // The root of the current drive must not take its place.
     std::wstring current(MAX_PATH, L'\0');
     current.resize(GetCurrentDirectoryW(MAX_PATH, current.data()));
     ASSERT_TRUE(SetCurrentDirectoryW(pc_.Path().c_str()));
-    PutOnDevice(L"orvane_test.txt", "device", noon_);
     for (const wchar_t* folder : {L"\\", L""}) {
         Setting(L"SyncPath_DT", folder);
         const DialogRun dialog;
@@ -173,7 +161,7 @@ TEST_F(SyncTest, WithoutAPcFolderNothingIsCopied) {
         EXPECT_EQ(dialog.BarMaximum(), 1);  // Nothing was listed on the PC.
         EXPECT_EQ(dialog.Log().size(), 3U);
         EXPECT_FALSE(Exists(L"\\orvane_test.txt"));
-        EXPECT_TRUE(ListTree(pc_.Path()).empty());
+        EXPECT_EQ(PcFiles(), made);
     }
     SetCurrentDirectoryW(current.c_str());
 }
@@ -186,7 +174,7 @@ TEST_F(SyncTest, HostileNamesReachNoFileOutsideTheJobFolder) {
     PutOnDevice(L"good.qvj", "device", noon_);
     device_.StartTrace();
     DialogRun().Synchronize();
-    EXPECT_EQ(ListTree(pc_.Path()), (Lines{L"good.qvj"}));
+    EXPECT_EQ(PcFiles(), (Lines{L"good.qvj"}));
     // The device would refuse most of these names, so it must not even be asked.
     Lines opened;
     for (const TraceLine& call : device_.Trace()) {
@@ -268,22 +256,20 @@ TEST_F(SyncTest, RowsWithPathsTooLongForThePcFailLikeOthers) {
     }
     const DialogRun dialog;
     dialog.Synchronize();
-    EXPECT_EQ(ListTree(pc_.Path()), (Lines{fits, L"z.xml"}));
+    EXPECT_EQ(PcFiles(), (Lines{fits, L"z.xml"}));
     EXPECT_EQ(dialog.Log().size(), 5U);
 }
 
 TEST_F(SyncTest, AsksAboutClocksThatDiffer) {
     device_.Set(L"CLOCK_OFFSET", L"180");
+    const MessageBoxAnswerer answers({IDCANCEL, IDOK});
     {
-        const MessageBoxAnswerer answers({IDCANCEL});
         const DialogRun refused;
-        EXPECT_TRUE(DialogRun::WaitUntil([&] { return refused.HasEnded(); }));
-        ASSERT_EQ(answers.Seen().size(), 1U);
-        EXPECT_EQ(answers.Seen()[0].caption, L"Syncronization");
+        EXPECT_TRUE(WaitUntil([&] { return refused.HasEnded(); }));
     }
-    const MessageBoxAnswerer answers({IDOK});
     const DialogRun accepted;
-    EXPECT_TRUE(DialogRun::WaitUntil([&] { return answers.Seen().size() == 1; }));
+    EXPECT_TRUE(WaitUntil([&] { return answers.Seen().size() == 2; }));
+    EXPECT_EQ(answers.Seen()[0].caption, L"Syncronization");
     Sleep(100);
     EXPECT_FALSE(accepted.HasEnded());
     accepted.Synchronize();

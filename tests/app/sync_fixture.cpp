@@ -15,22 +15,14 @@ namespace {
 
 constexpr const wchar_t* kKey = L"Software\\Veltrano\\CE Devices";
 constexpr const wchar_t* kComplete = L"Synchronization complete.";
-constexpr ULONGLONG kPatienceMs = 30'000;
-
-std::wstring ListLine(HWND list, LRESULT line) {
-    const LRESULT length = SendMessageW(list, LB_GETTEXTLEN, static_cast<WPARAM>(line), 0);
-    std::wstring text(static_cast<std::size_t>(length) + 1, L'\0');
-    SendMessageW(list, LB_GETTEXT, static_cast<WPARAM>(line), reinterpret_cast<LPARAM>(text.data()));
-    text.resize(static_cast<std::size_t>(length));
-    return text;
-}
 
 }  // namespace
 
 DialogRun::DialogRun() : thread_([this] { Run(); }) {
     WaitUntil([this] {
+        window_ = FindWindowW(L"Qel_Orvanelink", nullptr);
         return HasEnded() || FileView() != nullptr ||
-               (window_ != nullptr && IsWindowVisible(window_) && !Text(IDC_SYNC_CANCEL_EXIT).empty());
+               (IsWindowVisible(window_) && !Text(IDC_SYNC_CANCEL_EXIT).empty());
     });
 }
 
@@ -42,83 +34,42 @@ DialogRun::~DialogRun() {
 }
 
 void DialogRun::Run() {
-    const INITCOMMONCONTROLSEX controls = {sizeof(INITCOMMONCONTROLSEX), ICC_WIN95_CLASSES};
-    InitCommonControlsEx(&controls);
     RegisterDialogClass();
     CWendlowDlg dialog;
-    // The window exists only inside DoModal: a helper thread looks for it.
-    std::atomic<bool> done{false};
-    std::thread finder([&] {
-        while (!done && window_ == nullptr) {
-            window_ = dialog.Handle();
-            Sleep(1);
-        }
-    });
     dialog.DoModal();
     ended_ = true;
-    done = true;
-    finder.join();
     EXPECT_TRUE(WaitUntil([&] { return !dialog.HasRunningWorker(); }));
 }
 
-void DialogRun::Press(int id) const {
-    SendMessageW(GetDlgItem(window_, id), BM_CLICK, 0, 0);
-}
-
-std::wstring DialogRun::Text(int id) const {
-    wchar_t text[512] = {};
-    SendMessageW(GetDlgItem(window_, id), WM_GETTEXT, std::size(text), reinterpret_cast<LPARAM>(text));
-    return text;
-}
-
-std::vector<std::wstring> DialogRun::Log() const {
-    HWND list = GetDlgItem(window_, IDC_SYNC_LOG);
-    const LRESULT count = SendMessageW(list, LB_GETCOUNT, 0, 0);
-    std::vector<std::wstring> lines;
-    for (LRESULT line = 0; line < count; ++line) {
-        lines.push_back(ListLine(list, line));
+Lines DialogRun::Log() const {
+    HWND list = Item(IDC_SYNC_LOG);
+    Lines lines(static_cast<std::size_t>(SendMessageW(list, LB_GETCOUNT, 0, 0)));
+    for (WPARAM line = 0; line < lines.size(); ++line) {
+        wchar_t text[512] = {};
+        SendMessageW(list, LB_GETTEXT, line, reinterpret_cast<LPARAM>(text));
+        lines[line] = text;
     }
     return lines;
 }
 
 bool DialogRun::IsBarVisible() const {
-    return IsWindowVisible(GetDlgItem(window_, IDC_SYNC_PROGRESS)) != FALSE;
-}
-
-LRESULT DialogRun::BarPosition() const {
-    return SendMessageW(GetDlgItem(window_, IDC_SYNC_PROGRESS), PBM_GETPOS, 0, 0);
+    return IsWindowVisible(Item(IDC_SYNC_PROGRESS)) != FALSE;
 }
 
 LRESULT DialogRun::BarMaximum() const {
-    return SendMessageW(GetDlgItem(window_, IDC_SYNC_PROGRESS), PBM_GETRANGE, FALSE, 0);
+    return SendMessageW(Item(IDC_SYNC_PROGRESS), PBM_GETRANGE, FALSE, 0);
 }
 
 std::ptrdiff_t DialogRun::Completions() const {
-    const std::vector<std::wstring> log = Log();
+    const Lines log = Log();
     return std::count(log.begin(), log.end(), kComplete);
 }
 
 void DialogRun::Synchronize() const {
     const std::ptrdiff_t before = Completions();
     Press(IDC_SYNC_START);
-    ASSERT_TRUE(WaitForText(IDC_SYNC_STATUS, kComplete));
-    ASSERT_TRUE(WaitUntil([this] { return !IsBarVisible(); }));
+    ASSERT_TRUE(WaitUntil([this] { return Text(IDC_SYNC_STATUS) == kComplete && !IsBarVisible(); }));
     ASSERT_EQ(Completions(), before + 1);
-}
-
-bool DialogRun::WaitUntil(const std::function<bool()>& condition) {
-    const ULONGLONG end = GetTickCount64() + kPatienceMs;
-    while (!condition()) {
-        if (GetTickCount64() >= end) {
-            return false;
-        }
-        Sleep(5);
-    }
-    return true;
-}
-
-bool DialogRun::WaitForText(int id, const std::wstring& text) const {
-    return WaitUntil([&] { return Text(id) == text; });
 }
 
 HWND FileView() {
@@ -147,6 +98,11 @@ void SyncTest::PutOnPc(const std::wstring& name, std::string_view content, const
 
 void SyncTest::PutOnDevice(const std::wstring& name, std::string_view content, const FILETIME& time) const {
     WriteTextFile(OnDevice(name), content, time);
+}
+
+void SyncTest::PutNewerOnPc(const std::wstring& name) const {
+    PutOnPc(name, "newer", AddSeconds(noon_, 60));
+    PutOnDevice(name, "older", noon_);
 }
 
 void SyncTest::PutManyOnPc(int count) const {

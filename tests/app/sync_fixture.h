@@ -5,17 +5,19 @@
 #include <windows.h>
 
 #include <atomic>
-#include <functional>
 #include <string>
 #include <thread>
 #include <vector>
 
+#include "tests/support/dialog_script.h"
 #include "tests/support/folder_device.h"
 #include "tests/support/message_boxes.h"
 #include "tests/support/scratch_registry.h"
 #include "tests/support/temp_folder.h"
 
 namespace orvane::testing {
+
+using Lines = std::vector<std::wstring>;
 
 // One run of the dialog, from its construction to its end. The test drives it by messages from its own
 // thread, as a user would.
@@ -29,26 +31,23 @@ class DialogRun {
     DialogRun& operator=(const DialogRun&) = delete;
 
     HWND Window() const { return window_; }
+    HWND Item(int id) const { return GetDlgItem(window_, id); }
     bool HasEnded() const { return ended_; }
-    void Press(int id) const;
-    std::wstring Text(int id) const;
-    std::vector<std::wstring> Log() const;
+    void Press(int id) const { SendMessageW(Item(id), BM_CLICK, 0, 0); }
+    std::wstring Text(int id) const { return ItemText(window_, id); }
+    Lines Log() const;
     // How often the log tells that a run is complete.
     std::ptrdiff_t Completions() const;
     bool IsBarVisible() const;
-    LRESULT BarPosition() const;
     LRESULT BarMaximum() const;
 
     // Presses "Synchronize" and waits until the run is complete. A press that is ignored fails the test.
     void Synchronize() const;
-    // Waits, at most half a minute, until the condition holds; whether it came to hold.
-    static bool WaitUntil(const std::function<bool()>& condition);
-    bool WaitForText(int id, const std::wstring& text) const;
 
   private:
     void Run();
 
-    std::atomic<HWND> window_{nullptr};
+    HWND window_ = nullptr;
     std::atomic<bool> ended_{false};
     std::thread thread_;
 };
@@ -67,8 +66,12 @@ class SyncTest : public ::testing::Test {
     std::wstring OnDevice(const std::wstring& name) const { return device_.Root() + L"\\Jobs\\" + name; }
     void PutOnPc(const std::wstring& name, std::string_view content, const FILETIME& time) const;
     void PutOnDevice(const std::wstring& name, std::string_view content, const FILETIME& time) const;
+    // "newer" on the PC and, a minute older, "older" on the device.
+    void PutNewerOnPc(const std::wstring& name) const;
     // Creates files new_0.qvj, new_1.qvj, ... on the PC.
     void PutManyOnPc(int count) const;
+    Lines PcFiles() const { return ListTree(pc_.Path()); }
+    Lines DeviceFiles() const { return ListTree(device_.PcPath(L"\\Jobs")); }
 
     ScratchRegistry registry_;
     FolderDevice device_;

@@ -13,9 +13,7 @@ namespace orvane::testing {
 namespace {
 
 BOOL CALLBACK AddDialog(HWND window, LPARAM dialogs) {
-    std::array<wchar_t, 16> name{};
-    GetClassNameW(window, name.data(), static_cast<int>(name.size()));
-    if (IsWindowVisible(window) && std::wstring(name.data()) == L"#32770") {
+    if (IsVisibleDialog(window)) {
         reinterpret_cast<std::vector<HWND>*>(dialogs)->push_back(window);
     }
     return TRUE;
@@ -59,17 +57,23 @@ INT_PTR RunWithScript(const std::function<INT_PTR()>& modal, const std::function
     return result;
 }
 
+bool IsVisibleDialog(HWND window) {
+    std::array<wchar_t, 16> name{};
+    GetClassNameW(window, name.data(), static_cast<int>(name.size()));
+    return IsWindowVisible(window) && std::wstring(name.data()) == L"#32770";
+}
+
 std::vector<HWND> DialogsBeside(HWND window) {
     return DialogsOfThread(GetWindowThreadProcessId(window, nullptr));
 }
 
 bool WaitUntil(const std::function<bool()>& condition) {
-    const ULONGLONG end = GetTickCount64() + 5000;
+    const ULONGLONG end = GetTickCount64() + 30'000;
     while (!condition()) {
         if (GetTickCount64() > end) {
             return false;
         }
-        Sleep(10);
+        Sleep(5);
     }
     return true;
 }

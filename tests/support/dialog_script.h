@@ -13,10 +13,12 @@ namespace orvane::testing {
 // as that dialog can be seen. Dialogs that the script leaves open are closed. Returns what `modal` returns.
 INT_PTR RunWithScript(const std::function<INT_PTR()>& modal, const std::function<void(HWND)>& script);
 
+// Whether it is a dialog, or a message box, that can be seen.
+bool IsVisibleDialog(HWND window);
 // The visible dialogs of the window's thread, the window itself among them.
 std::vector<HWND> DialogsBeside(HWND window);
 
-// Waits up to five seconds; whether the condition came true.
+// Waits up to half a minute; whether the condition came true.
 bool WaitUntil(const std::function<bool()>& condition);
 
 std::wstring ItemText(HWND dialog, int id);

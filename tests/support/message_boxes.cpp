@@ -1,20 +1,13 @@
 #include "tests/support/message_boxes.h"
 
-#include <array>
-#include <string_view>
 #include <utility>
 
+#include "tests/support/dialog_script.h"
 #include "ui/data_exchange.h"
 
 namespace orvane::testing {
 
 namespace {
-
-bool IsOfClass(HWND window, std::wstring_view class_name) {
-    std::array<wchar_t, 64> name{};
-    GetClassNameW(window, name.data(), static_cast<int>(name.size()));
-    return name.data() == class_name;
-}
 
 // A dialog whose procedure lies in the system's own library is a message box.
 bool IsMessageBox(HWND window) {
@@ -29,8 +22,7 @@ bool IsMessageBox(HWND window) {
 BOOL CALLBACK FindBox(HWND window, LPARAM found) {
     DWORD process = 0;
     GetWindowThreadProcessId(window, &process);
-    if (process != GetCurrentProcessId() || !IsWindowVisible(window) || !IsOfClass(window, L"#32770") ||
-        !IsMessageBox(window)) {
+    if (process != GetCurrentProcessId() || !IsVisibleDialog(window) || !IsMessageBox(window)) {
         return TRUE;
     }
     *reinterpret_cast<HWND*>(found) = window;
@@ -69,7 +61,7 @@ SeenMessageBox Describe(HWND box) {
         if ((style & WS_VISIBLE) == 0) {
             continue;
         }
-        if (IsOfClass(child, L"Button")) {
+        if ((SendMessageW(child, WM_GETDLGCODE, 0, 0) & DLGC_BUTTON) != 0) {
             seen.style |= (style & BS_TYPEMASK) == BS_DEFPUSHBUTTON ? button_count * MB_DEFBUTTON2 : 0;
             ++button_count;
         } else if ((style & SS_TYPEMASK) == SS_ICON) {
