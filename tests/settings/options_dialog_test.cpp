@@ -1,38 +1,18 @@
 #include "settings/options_dialog.h"
 
-#include <gtest/gtest.h>
-
-#include <commctrl.h>
-
-#include <array>
 #include <bitset>
 
 #include "res/ids.h"
-#include "settings/registry_strings.h"
+#include "tests/settings/settings_values.h"
 #include "tests/support/dialog_script.h"
-#include "tests/support/folder_device.h"
-#include "tests/support/scratch_registry.h"
 
 namespace orvane {
 namespace {
 
 using testing::Press;
 
-const std::wstring kKey = L"Software\\Veltrano\\CE Devices";
 const std::wstring kAutoStartKey = L"SOFTWARE\\Microsoft\\Windows CE Services\\AutoStartOnConnect";
-
-// The boxes in the order of the block, which has all but the last.
-constexpr std::array kIds = {1021, 1022, 1023, 1024, 1025, 1027, 1029, 1026, 1038,
-                             1039, 1040, 1028, 1030, 1031, 1032, 1033, 1041};
-constexpr std::size_t kCount = kIds.size();
-constexpr std::array<const wchar_t*, kCount> kNames = {L"qvj", L"tn3", L"rd3", L"pt3", L"ln3",  L"jpg",
-                                                       L"bmp", L"all", L"old", L"bkp", L"warn", L"img",
-                                                       L"xml", L"tp3", L"wkf", L"txt", L"view"};
-constexpr std::array<const wchar_t*, kCount> kValues = {
-    L"Sync_qvj_files", L"Sync_tn3_files", L"Sync_rd3_files", L"Sync_pt3_files",      L"Sync_ln3_files",
-    L"Sync_jpg_files", L"Sync_bmp_files", L"Sync_all_files", L"Overwrite_old_files", L"Overwrite_bkp",
-    L"Overwrite_warn", L"Sync_img_files", L"Sync_xml_files", L"Sync_tp3_files",      L"Sync_wkf_files",
-    L"Sync_txt_files", L"Start_File_View"};
+constexpr std::size_t kCount = kFlags.size();
 
 using Boxes = std::bitset<kCount>;
 
@@ -46,7 +26,7 @@ Boxes Those(Condition condition) {
 }
 
 Boxes Named(std::wstring_view names) {
-    return Those([&](std::size_t i) { return names.find(kNames[i]) != std::wstring_view::npos; });
+    return Those([&](std::size_t i) { return names.find(kFlags[i].name) != std::wstring_view::npos; });
 }
 
 const Boxes kAll = Named(L"all");
@@ -56,13 +36,13 @@ const Boxes kDependent = Named(L"warn bkp");
 const Boxes kTypes = Named(L"qvj tn3 rd3 pt3 ln3 jpg bmp img xml tp3 wkf txt");
 
 Boxes Ticked(HWND dialog) {
-    return Those([&](std::size_t i) { return IsDlgButtonChecked(dialog, kIds[i]) == BST_CHECKED; });
+    return Those([&](std::size_t i) { return IsDlgButtonChecked(dialog, kFlags[i].box) == BST_CHECKED; });
 }
 
 // Without telling the dialog.
 void Tick(HWND dialog, const Boxes& boxes) {
     for (std::size_t i = 0; i < kCount; ++i) {
-        CheckDlgButton(dialog, kIds[i], boxes[i] ? BST_CHECKED : BST_UNCHECKED);
+        CheckDlgButton(dialog, kFlags[i].box, boxes[i] ? BST_CHECKED : BST_UNCHECKED);
     }
 }
 
@@ -93,32 +73,21 @@ void Browse(HWND dialog, int browse, int button, const std::wstring& start) {
     EXPECT_TRUE(testing::WaitUntil([&] { return !IsWindow(opened) && IsWindowEnabled(dialog); }));
 }
 
-std::wstring Stored(const wchar_t* name, HKEY root = HKEY_CURRENT_USER, const std::wstring& key = kKey) {
-    std::wstring text;
-    return RegReadString(root, key, name, text) ? text : L"(none)";
-}
-
 class OptionsDialog : public ::testing::Test {
   protected:
-    OptionsDialog() {
-        const INITCOMMONCONTROLSEX controls = {sizeof(controls), ICC_WIN95_CLASSES};
-        InitCommonControlsEx(&controls);
-        SetActiveWindow(owner_);
-    }
+    OptionsDialog() { SetActiveWindow(owner_); }
     ~OptionsDialog() override { DestroyWindow(owner_); }
 
     // What the dialog begins with. It does not look at the folders that are stored.
     void Set(const Boxes& ticked, const std::wstring& pc_folder = L"C:\\") {
+        SyncSettings stored{.sync_path_dt = L"C:\\stored", .sync_path_ce = L"\\stored"};
+        for (std::size_t i = 0; i < kCount; ++i) {
+            stored.*kFlags[i].flag = ticked[i] ? 1 : 0;
+        }
+        SaveSettings(stored);
+        RefreshSettingsBlock(stored, block_);
         block_.sync_path_dt = pc_folder;
         block_.sync_path_ce = L"\\Jobs\\";
-        RegWriteString(HKEY_CURRENT_USER, kKey, L"SyncPath_DT", L"C:\\stored");
-        RegWriteString(HKEY_CURRENT_USER, kKey, L"SyncPath_CE", L"\\stored");
-        for (std::size_t i = 0; i < kCount; ++i) {
-            RegWriteString(HKEY_CURRENT_USER, kKey, kValues[i], ticked[i] ? L"1" : L"0");
-            if (i + 1 < kCount) {
-                (&block_.sync_qvj_files)[i] = ticked[i] ? L"1" : L"0";
-            }
-        }
     }
     void Run(const std::function<void(HWND)>& script) {
         testing::RunWithScript([&] { return RunOptions(owner_, block_) ? IDOK : IDCANCEL; }, script);
@@ -155,8 +124,8 @@ TEST_F(OptionsDialog, TypeBoxesDecideOnAllFiles) {
         }
         if (kTypes[clicked]) {
             Tick(dialog.Handle(), (types | all_before).flip(clicked));
-            Click(dialog.Handle(), kIds[clicked]);
-            EXPECT_EQ(Ticked(dialog.Handle()), types | all) << kNames[clicked] << " " << all_before;
+            Click(dialog.Handle(), kFlags[clicked].box);
+            EXPECT_EQ(Ticked(dialog.Handle()), types | all) << kFlags[clicked].name << " " << all_before;
         }
     }
 }
@@ -191,7 +160,7 @@ TEST_F(OptionsDialog, WarningAndBackupDependOnOverwriting) {
 TEST_F(OptionsDialog, OkStoresAndCancelDoesNot) {
     // An empty folder on the device leaves the one that is stored.
     const std::array<std::array<const wchar_t*, 2>, 3> folders = {
-        {{L"\\typed\\\\", L"\\typed\\"}, {L"", L"\\stored"}, {L"\\", L"\\"}}};
+        {{L"\\typed\\\\", L"\\typed\\"}, {L"", L"\\stored\\"}, {L"\\", L"\\"}}};
     for (std::size_t run = 0; run < 2 * kCount; ++run) {
         const bool ok = run % 2 == 0;
         const auto& [typed, stored] = folders[run / 2 % folders.size()];
@@ -205,10 +174,10 @@ TEST_F(OptionsDialog, OkStoresAndCancelDoesNot) {
             Tick(dialog, ticked ^ kOverwrite);
             Press(dialog, ok ? IDOK : IDCANCEL);
         });
-        const Boxes stored_boxes = Those([](std::size_t i) { return Stored(kValues[i]) == L"1"; });
+        const Boxes stored_boxes = Those([](std::size_t i) { return Stored(kFlags[i].value) == L"1"; });
         EXPECT_EQ(stored_boxes, ok ? ticked ^ kOverwrite : ticked);
-        EXPECT_EQ(Stored(L"SyncPath_DT"), ok ? L"C:\\typed\\" : L"C:\\stored");
-        EXPECT_EQ(Stored(L"SyncPath_CE"), ok ? stored : L"\\stored");
+        EXPECT_EQ(Stored(L"SyncPath_DT"), ok ? L"C:\\typed\\" : L"C:\\stored\\");
+        EXPECT_EQ(Stored(L"SyncPath_CE"), ok ? stored : L"\\stored\\");
     }
 }
 
@@ -216,11 +185,11 @@ TEST_F(OptionsDialog, AutoStartFollowsTheBoxAfterOkOnly) {
     constexpr const wchar_t* kValue = L"ORVANE ActiveSync";
     std::array<wchar_t, MAX_PATH> program{};
     GetModuleFileNameW(nullptr, program.data(), MAX_PATH);
-    for (const unsigned run : {0U, 1U, 2U, 3U, 4U, 5U, 6U, 7U}) {
+    for (unsigned run = 0; run < 8; ++run) {
         const bool was_on = (run & 1U) != 0;
         const bool toggled = (run & 2U) != 0;
         const bool ok = (run & 4U) != 0;
-        RegWriteString(HKEY_LOCAL_MACHINE, kAutoStartKey, kValue, was_on ? L"C:\\elsewhere.exe" : L"");
+        Store(kValue, was_on ? L"C:\\elsewhere.exe" : L"", HKEY_LOCAL_MACHINE, kAutoStartKey);
         Run([&](HWND dialog) {
             EXPECT_EQ(IsDlgButtonChecked(dialog, IDC_OPTIONS_AUTO_START) != 0, was_on);
             if (toggled) {
@@ -240,21 +209,20 @@ TEST_F(OptionsDialog, OnlyAChosenPcFolderDropsWhatWasTyped) {
     testing::MakeFolder(device_.PcPath(L"\\Jobs\\North"));
     Set(kOverwrite, pc_folder.Path());
     Run([&](HWND dialog) {
+        const std::wstring& pc = pc_folder.Path();
+        const std::wstring typed = L"C:\\a \\jobs\\north\\b";
+        const Boxes both = kWarn | kOverwrite;
         const struct {
             int browse, button;
             std::wstring start, folders;
             Boxes ticked;
-        } runs[] = {
-            {IDC_OPTIONS_PC_BROWSE, IDCANCEL, pc_folder.Path(), L"C:\\a \\jobs\\north\\b",
-             kWarn | kOverwrite},
-            {IDC_OPTIONS_PC_BROWSE, IDOK, pc_folder.Path(), pc_folder.Path() + L" \\Jobs\\", kOverwrite},
-            {IDC_OPTIONS_DEVICE_BROWSE, IDCANCEL, L"\\Jobs\\North\\", L"C:\\a \\jobs\\north\\b",
-             kWarn | kOverwrite},
-            {IDC_OPTIONS_DEVICE_BROWSE, IDOK, L"\\Jobs\\North\\", L"C:\\a \\Jobs\\North\\",
-             kWarn | kOverwrite}};
+        } runs[] = {{IDC_OPTIONS_PC_BROWSE, IDCANCEL, pc, typed, both},
+                    {IDC_OPTIONS_PC_BROWSE, IDOK, pc, pc + L" \\Jobs\\", kOverwrite},
+                    {IDC_OPTIONS_DEVICE_BROWSE, IDCANCEL, L"\\Jobs\\North\\", typed, both},
+                    {IDC_OPTIONS_DEVICE_BROWSE, IDOK, L"\\Jobs\\North\\", L"C:\\a \\Jobs\\North\\", both}};
         for (const auto& run : runs) {
             Type(dialog, L"C:\\a", L"\\jobs\\north\\b");
-            Tick(dialog, kWarn | kOverwrite);
+            Tick(dialog, both);
             Browse(dialog, run.browse, run.button, run.start);
             EXPECT_EQ(Folders(dialog), run.folders);
             EXPECT_EQ(Ticked(dialog), run.ticked);

@@ -1,56 +1,14 @@
-#include "settings/settings_store.h"
-
-#include <gtest/gtest.h>
 #include <shlobj.h>
 
-#include <array>
-
-#include "settings/registry_strings.h"
-#include "tests/support/folder_device.h"
-#include "tests/support/scratch_registry.h"
+#include "tests/settings/settings_values.h"
 
 namespace orvane {
 namespace {
 
 using namespace std::string_literals;
 
-constexpr const wchar_t* kKey = L"Software\\Veltrano\\CE Devices";
-
-struct Flag {
-    const wchar_t* name;
-    std::int32_t SyncSettings::*flag;
-};
-using S = SyncSettings;
-// In the order of the block; Start_File_View is not in it.
-constexpr std::array<Flag, 17> kFlags = {{{L"Sync_qvj_files", &S::sync_qvj_files},
-                                          {L"Sync_tn3_files", &S::sync_tn3_files},
-                                          {L"Sync_rd3_files", &S::sync_rd3_files},
-                                          {L"Sync_pt3_files", &S::sync_pt3_files},
-                                          {L"Sync_ln3_files", &S::sync_ln3_files},
-                                          {L"Sync_jpg_files", &S::sync_jpg_files},
-                                          {L"Sync_bmp_files", &S::sync_bmp_files},
-                                          {L"Sync_all_files", &S::sync_all_files},
-                                          {L"Overwrite_old_files", &S::overwrite_old_files},
-                                          {L"Overwrite_bkp", &S::overwrite_bkp},
-                                          {L"Overwrite_warn", &S::overwrite_warn},
-                                          {L"Sync_img_files", &S::sync_img_files},
-                                          {L"Sync_xml_files", &S::sync_xml_files},
-                                          {L"Sync_tp3_files", &S::sync_tp3_files},
-                                          {L"Sync_wkf_files", &S::sync_wkf_files},
-                                          {L"Sync_txt_files", &S::sync_txt_files},
-                                          {L"Start_File_View", &S::start_file_view}}};
-
 class SettingsStore : public ::testing::Test {
   protected:
-    // What the registry holds, "(none)" for nothing.
-    static std::wstring Stored(const wchar_t* name) {
-        std::wstring text;
-        return RegReadString(HKEY_CURRENT_USER, kKey, name, text) ? text : L"(none)";
-    }
-    static void Store(const wchar_t* name, const std::wstring& text) {
-        ASSERT_TRUE(RegWriteString(HKEY_CURRENT_USER, kKey, name, text));
-    }
-
     testing::ScratchRegistry registry_;
 };
 
@@ -62,8 +20,9 @@ TEST_F(SettingsStore, WritesTheDefaultsAtTheFirstStart) {
     EXPECT_EQ(Stored(L"SyncPath_DT"), folder);
     EXPECT_EQ(Stored(L"SyncPath_CE"), L"(none)");
     for (const Flag& flag : kFlags) {
-        const bool on = flag.flag == &S::sync_qvj_files || flag.flag == &S::sync_wkf_files;
-        EXPECT_EQ(Stored(flag.name), on ? L"1" : L"0") << flag.name;
+        const bool on =
+            flag.flag == &SyncSettings::sync_qvj_files || flag.flag == &SyncSettings::sync_wkf_files;
+        EXPECT_EQ(Stored(flag.value), on ? L"1" : L"0") << flag.name;
     }
 }
 
@@ -78,9 +37,9 @@ TEST_F(SettingsStore, KeepsEveryFlagInAValueAndATextOfItsOwn) {
         const std::wstring* text = &block.sync_qvj_files;
         for (const Flag& flag : kFlags) {
             const bool is_on = on.flag == flag.flag;
-            EXPECT_EQ(Stored(flag.name), is_on ? L"1" : L"0") << on.name << " " << flag.name;
+            EXPECT_EQ(Stored(flag.value), is_on ? L"1" : L"0") << on.name << " " << flag.name;
             EXPECT_EQ(loaded.*flag.flag, is_on ? 1 : 0) << on.name << " " << flag.name;
-            if (flag.flag != &S::start_file_view) {
+            if (flag.flag != &SyncSettings::start_file_view) {
                 EXPECT_EQ(*text++, is_on ? L"1" : L"0") << on.name << " " << flag.name;
             }
         }
@@ -115,7 +74,8 @@ TEST_F(SettingsStore, SurvivesBytesThatAreNoText) {
                  {REG_BINARY, L"ab", 3, {L'a', L'b'}}};
     Store(L"SyncPath_DT", L"");
     for (const auto& c : cases) {
-        ASSERT_EQ(RegSetKeyValueW(HKEY_CURRENT_USER, kKey, L"SyncPath_DT", c.type, c.data, c.bytes), 0);
+        ASSERT_EQ(RegSetKeyValueW(HKEY_CURRENT_USER, kKey.c_str(), L"SyncPath_DT", c.type, c.data, c.bytes),
+                  0);
         EXPECT_EQ(Stored(L"SyncPath_DT"), c.expected) << (&c - cases);
     }
 }
