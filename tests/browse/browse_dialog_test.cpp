@@ -81,8 +81,6 @@ void DoubleClick(HWND dialog) {
 class BrowseDialog : public ::testing::Test {
   protected:
     BrowseDialog() {
-        const INITCOMMONCONTROLSEX controls = {sizeof(controls), ICC_WIN95_CLASSES};
-        InitCommonControlsEx(&controls);
         testing::MakeFolder(device_.PcPath(L"\\Temp"));
         testing::MakeFolder(device_.PcPath(L"\\CF Card\\Jobs\\A"));
         testing::WriteTextFile(device_.PcPath(L"\\CF Card\\Jobs\\b\\1.txt"), "1");
@@ -93,11 +91,11 @@ class BrowseDialog : public ::testing::Test {
     INT_PTR Run(const std::wstring& filter, const std::wstring& initial_folder,
                 const std::function<void(HWND)>& script, int file_name_mode = 1) {
         CCeBrowseDlg dialog(file_name_mode, 0, {filter}, L"Browse", initial_folder, nullptr);
-        const INT_PTR result = testing::RunWithScript([&] { return dialog.DoModal(); },
-                                                      [&](HWND window) {
-                                                          AwaitRead(window);
-                                                          script(window);
-                                                      });
+        const auto after_reading = [&](HWND window) {
+            AwaitRead(window);
+            script(window);
+        };
+        const INT_PTR result = testing::RunWithScript([&] { return dialog.DoModal(); }, after_reading);
         result_folder_ = dialog.ResultFolder();
         return result;
     }
@@ -156,11 +154,9 @@ TEST_F(BrowseDialog, FileNameFieldKeepsTheNameOnlyInItsMode) {
             [mode](HWND dialog) {
                 HWND tree = TreeOf(dialog);
                 HTREEITEM jobs = TreeView_GetSelection(tree);
-                HTREEITEM file = TreeView_GetChild(tree, jobs);
-                while (TreeView_GetNextSibling(tree, file) != nullptr) {
-                    file = TreeView_GetNextSibling(tree, file);
-                }
-                TreeView_SelectItem(tree, file);
+                // The last of its three entries.
+                HTREEITEM second = TreeView_GetNextSibling(tree, TreeView_GetChild(tree, jobs));
+                TreeView_SelectItem(tree, TreeView_GetNextSibling(tree, second));
                 EXPECT_EQ(ItemText(dialog, IDC_BROWSE_FOLDER), L"\\CF Card\\Jobs\\");
                 EXPECT_EQ(ItemText(dialog, IDC_BROWSE_FILE_NAME), L"c.job");
                 TreeView_SelectItem(tree, TreeView_GetParent(tree, jobs));
@@ -246,11 +242,10 @@ TEST_F(BrowseDialog, PropertyShowsTheSelectedItem) {
     testing::WriteTextFile(big_file, "");
     std::filesystem::resize_file(big_file, 3'000'000'000);
     const FILETIME written = testing::UtcTime(2001, 2, 3, 12);
-    {
-        const UniqueFile file(
-            CreateFileW(big_file.c_str(), FILE_WRITE_ATTRIBUTES, 0, nullptr, OPEN_EXISTING, 0, nullptr));
-        SetFileTime(file.Get(), nullptr, nullptr, &written);
-    }
+    UniqueFile file(
+        CreateFileW(big_file.c_str(), FILE_WRITE_ATTRIBUTES, 0, nullptr, OPEN_EXISTING, 0, nullptr));
+    SetFileTime(file.Get(), nullptr, nullptr, &written);
+    file.Reset();
     SetFileAttributesW(big_file.c_str(), FILE_ATTRIBUTE_READONLY);
     Run(L"job", L"\\Temp", [&written](HWND dialog) {
         const struct {
@@ -275,21 +270,19 @@ TEST_F(BrowseDialog, PropertyShowsTheSelectedItem) {
             EXPECT_EQ(IsDlgButtonChecked(property, IDC_PROPERTY_HIDDEN), 0U);
             testing::Press(property, IDOK);
             EXPECT_TRUE(WaitUntil([&] { return IsWindowEnabled(dialog) != FALSE; }));
-            TreeView_SelectItem(TreeOf(dialog),
-                                TreeView_GetChild(TreeOf(dialog), TreeView_GetSelection(TreeOf(dialog))));
+            HWND tree = TreeOf(dialog);
+            TreeView_SelectItem(tree, TreeView_GetChild(tree, TreeView_GetSelection(tree)));
         }
     });
 }
 
 TEST_F(BrowseDialog, AVeryDeepTreeEndsWhereItsPathsEnd) {
     std::wstring path = L"\\\\?\\" + device_.PcPath(L"\\Temp");
-    for (int level = 0; level < 200; ++level) {
-        path += L"\\d";
-        ASSERT_TRUE(CreateDirectoryW(path.c_str(), nullptr));
-    }
     std::wstring initial = L"\\Temp";
     for (int level = 0; level < 200; ++level) {
+        path += L"\\d";
         initial += L"\\D";
+        ASSERT_TRUE(CreateDirectoryW(path.c_str(), nullptr));
     }
     Run(kNoFiles, initial, [](HWND dialog) {
         const std::wstring folder = ItemText(dialog, IDC_BROWSE_FOLDER);
