@@ -6,7 +6,7 @@
 namespace orvane::testing {
 namespace {
 
-class Fault : public FolderDeviceTest {};
+using Fault = FolderDeviceTest;
 
 TEST_F(Fault, SettingsThatCannotBeUnderstoodOpenNoSession) {
     const struct {
@@ -15,8 +15,7 @@ TEST_F(Fault, SettingsThatCannotBeUnderstoodOpenNoSession) {
     } cases[] = {
         {L"CAPACITY", L"12k"},          {L"CLOCK_OFFSET", L"1.5"},
         {L"CALL_DELAY", L"4294967296"}, {L"CONNECT_DELAY", L"Never"},
-        {L"CONNECT_RESULT", L"5"},      {L"REFUSE", L"CeWritFile=5"},
-        {L"REFUSE", L"CeWriteFile#3"},  {L"VANISH", L"soon"},
+        {L"REFUSE", L"CeWritFile=5"},   {L"REFUSE", L"CeWriteFile#3"},
         {L"EXTRA_ENTRIES", L"\\Jobs"},  {L"EXTRA_ENTRIES", L"\\Jobs|a|hidden"},
         {L"FOUND_NULL", L"2"},          {L"TRACE", L"Z:\\no\\such\\folder\\trace.txt"},
     };
@@ -46,14 +45,11 @@ TEST_F(Fault, TheNamedCallIsRefusedAndNoOther) {
     EXPECT_FALSE(WriteNew(L"\\w=x.txt", "content"));
     EXPECT_EQ(CeGetLastError(), DWORD{ERROR_IO_DEVICE});
     const HANDLE file = Open(L"\\r.txt", GENERIC_READ, OPEN_EXISTING);
-    const HANDLE other = Open(L"\\Jobs\\a.qvj", GENERIC_READ, OPEN_EXISTING);
-    char byte = 0;
-    DWORD read = 0;
-    EXPECT_TRUE(CeReadFile(file, &byte, 1, &read, nullptr));
-    EXPECT_TRUE(CeReadFile(other, &byte, 1, &read, nullptr));
-    EXPECT_EQ(ErrorOf(CeReadFile(file, &byte, 1, &read, nullptr)), DWORD{ERROR_CRC});
-    EXPECT_TRUE(CeReadFile(file, &byte, 1, &read, nullptr));
-    EXPECT_EQ(byte, 'o');
+    for (const DWORD error : {DWORD{0}, DWORD{ERROR_CRC}, DWORD{0}}) {
+        char byte = 0;
+        DWORD read = 0;
+        EXPECT_EQ(ErrorOf(CeReadFile(file, &byte, 1, &read, nullptr)), error);
+    }
     EXPECT_EQ(CeRapiInvoke(L"a.dll", L"f", 0, nullptr, nullptr, nullptr, nullptr, 0),
               static_cast<HRESULT>(0x80070490));
     EXPECT_EQ(ErrorOf(CeCreateDirectory(L"\\cursed", nullptr)), DWORD{ERROR_FILE_CORRUPT});
@@ -69,7 +65,6 @@ TEST_F(Fault, AVanishedDeviceStaysAway) {
     EXPECT_TRUE(CeReadFile(file, &byte, 1, &read, nullptr));
     EXPECT_EQ(ErrorOf(CeReadFile(file, &byte, 1, &read, nullptr)), DWORD{ERROR_DEVICE_NOT_CONNECTED});
     EXPECT_EQ(CeRapiGetError(), HRESULT_FROM_WIN32(ERROR_DEVICE_NOT_CONNECTED));
-    EXPECT_FALSE(CeCloseHandle(file));
     EXPECT_EQ(Names(L"\\*"), std::nullopt);
     device_.CloseSessions();
     EXPECT_EQ(Connect(), HRESULT_FROM_WIN32(ERROR_DEVICE_NOT_CONNECTED));
@@ -79,64 +74,48 @@ TEST_F(Fault, AVanishedDeviceStaysAway) {
     EXPECT_TRUE(CeDeleteFile(L"\\a.txt"));
 }
 
-TEST_F(Fault, CallsCanTakeTheirTime) {
-    device_.Set(L"CALL_DELAY", L"60");
-    Reconnect();
-    const ULONGLONG start = GetTickCount64();
-    EXPECT_TRUE(CeCreateDirectory(L"\\a", nullptr));
-    EXPECT_TRUE(CeRemoveDirectory(L"\\a"));
-    EXPECT_GE(GetTickCount64() - start, 110U);
-}
-
 // The file beside the DLL, which the test must not find and does not leave behind.
-class IniFile : public Fault {
+class IniFile : public FolderDeviceTest {
   protected:
-    IniFile() {
+    void SetUp() override {
         wchar_t dll[MAX_PATH];
         GetModuleFileNameW(GetModuleHandleW(L"RAPI.DLL"), dll, MAX_PATH);
-        path_ = dll;
-        path_.replace(path_.rfind(L'\\') + 1, std::wstring::npos, L"folder_device.ini");
+        path_ = std::wstring(dll).substr(0, std::wstring(dll).rfind(L'\\')) + L"\\folder_device.ini";
+        ASSERT_FALSE(Exists(path_)) << "the test writes and removes it";
     }
-    void SetUp() override { ASSERT_FALSE(Exists(path_)) << "these tests write and remove it"; }
     void TearDown() override { DeleteFileW(path_.c_str()); }
 
     std::wstring path_;
 };
 
-TEST_F(IniFile, OneThatCannotBeReadOpensNoSession) {
+TEST_F(IniFile, CountsWhereTheEnvironmentIsSilent) {
     device_.CloseSessions();
     for (const std::string& text : {std::string("\xFF\xFE[\0]\0", 6), std::string((4 << 20) + 1, '\n')}) {
         WriteTextFile(path_, text);
         EXPECT_EQ(Connect(), HRESULT_FROM_WIN32(ERROR_BAD_CONFIGURATION)) << text.size();
     }
-}
-
-TEST_F(IniFile, CountsWhereTheEnvironmentIsSilent) {
+    // ROOT is in the environment.
     WriteTextFile(path_, "[other]\nCAPACITY=1\n[Folder_Device]\ncapacity = 4096\nROOT=nowhere\n");
     const auto total = [this] {
+        Reconnect();
         ULARGE_INTEGER bytes{};
         EXPECT_TRUE(CeGetDiskFreeSpaceEx(nullptr, nullptr, &bytes, nullptr));
         return bytes.QuadPart;
     };
-    Reconnect();  // ROOT is in the environment.
     EXPECT_EQ(total(), 4096U);
     device_.Set(L"CAPACITY", L"0x20");
-    Reconnect();
     EXPECT_EQ(total(), 32U);
     device_.Set(L"CAPACITY", L"");
-    Reconnect();
     EXPECT_GT(total(), 4096U) << "an empty text is the default, no gap for the file to fill";
 }
 
 TEST_F(Fault, TheTraceTellsEveryCall) {
     device_.StartTrace();
     Reconnect();
-    const HANDLE file = Open(L"\\J\u00F6b\t.txt", GENERIC_READ, OPEN_EXISTING, FILE_SHARE_READ);
-    ASSERT_EQ(file, INVALID_HANDLE_VALUE);
+    EXPECT_EQ(Open(L"\\J\u00F6b\t.txt", GENERIC_READ, OPEN_EXISTING, FILE_SHARE_READ), INVALID_HANDLE_VALUE);
     const HANDLE made = Open(L"\\J\u00F6b.txt", GENERIC_WRITE, CREATE_NEW);
     EXPECT_TRUE(Write(made, "12345"));
-    EXPECT_TRUE(CeCloseHandle(made));
-    std::thread([this] { CeMoveFile(L"\\a", nullptr); }).join();
+    std::thread([] { CeMoveFile(L"\\a", nullptr); }).join();
     device_.CloseSessions();
 
     const std::vector<TraceLine> lines = device_.Trace();
@@ -145,14 +124,13 @@ TEST_F(Fault, TheTraceTellsEveryCall) {
                   static_cast<unsigned long long>(reinterpret_cast<std::uintptr_t>(made)));
     const struct {
         const wchar_t* function;
-        std::vector<std::wstring> arguments;
+        StringList arguments;
         DWORD error;
     } expected[] = {
         {L"CeRapiInitEx", {}, 0},
         {L"CeCreateFile", {L"\\J\u00F6b?.txt", L"0x80000000", L"0x1", L"0x3", L"0x80"}, ERROR_INVALID_NAME},
         {L"CeCreateFile", {L"\\J\u00F6b.txt", L"0x40000000", L"0x0", L"0x1", L"0x80"}, 0},
         {L"CeWriteFile", {open_file, L"0x5"}, 0},
-        {L"CeCloseHandle", {open_file}, 0},
         {L"CeMoveFile", {L"\\a", L"(null)"}, ERROR_NOT_CONNECTED},
         {L"CeRapiUninit", {}, 0},
         {L"CeRapiUninit", {}, 0x80004005},
@@ -160,7 +138,6 @@ TEST_F(Fault, TheTraceTellsEveryCall) {
     ASSERT_EQ(lines.size(), std::size(expected));
     for (std::size_t i = 0; i < lines.size(); ++i) {
         SCOPED_TRACE(i);
-        EXPECT_EQ(lines[i].number, lines[0].number + i);
         EXPECT_EQ(lines[i].thread == GetCurrentThreadId(), lines[i].function != L"CeMoveFile");
         EXPECT_EQ(lines[i].function, expected[i].function);
         EXPECT_EQ(lines[i].arguments, expected[i].arguments);

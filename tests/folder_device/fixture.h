@@ -4,6 +4,8 @@
 #include <gtest/gtest.h>
 #include <windows.h>
 
+#include <algorithm>
+#include <iterator>
 #include <optional>
 #include <string>
 #include <string_view>
@@ -14,22 +16,61 @@
 
 namespace orvane::testing {
 
+using StringList = std::vector<std::wstring>;
+
 // A device with one session open on the test's thread.
 class FolderDeviceTest : public ::testing::Test {
   protected:
     FolderDeviceTest() { Connect(); }
 
     // Opens one more session; what CeRapiInitEx and then the connection answered.
-    HRESULT Connect();
-    // Closes all sessions and opens one, so that changed settings are read.
-    void Reconnect();
+    HRESULT Connect() {
+        rapi::InitRecord record{sizeof(rapi::InitRecord), nullptr, E_FAIL};
+        const HRESULT result = CeRapiInitEx(&record);
+        if (FAILED(result)) {
+            return result;
+        }
+        // The test's longest delay is far shorter.
+        EXPECT_EQ(WaitForSingleObject(record.init_event, 5000), WAIT_OBJECT_0);
+        return record.init_result;
+    }
 
-    HANDLE Open(const wchar_t* path, DWORD access, DWORD creation, DWORD share = 0);
+    // Closes all sessions and opens one, so that changed settings are read.
+    void Reconnect() {
+        device_.CloseSessions();
+        EXPECT_EQ(Connect(), S_OK);
+    }
+
+    HANDLE Open(const wchar_t* path, DWORD access, DWORD creation, DWORD share = 0) {
+        return CeCreateFile(path, access, share, nullptr, creation, FILE_ATTRIBUTE_NORMAL, nullptr);
+    }
+
     // Creates the file with this content through the device. False when a call failed.
-    bool WriteNew(const wchar_t* path, std::string_view content);
-    bool Write(HANDLE file, std::string_view bytes);
+    bool WriteNew(const wchar_t* path, std::string_view content) {
+        const HANDLE file = Open(path, GENERIC_WRITE, CREATE_NEW);
+        return file != INVALID_HANDLE_VALUE && Write(file, content) && CeCloseHandle(file);
+    }
+
+    bool Write(HANDLE file, std::string_view bytes) {
+        DWORD written = 0;
+        return CeWriteFile(file, bytes.data(), static_cast<DWORD>(bytes.size()), &written, nullptr) &&
+               written == bytes.size();
+    }
+
     // The names that CeFindAllFiles gives, in alphabetical order; nothing when it fails.
-    std::optional<std::vector<std::wstring>> Names(const wchar_t* pattern);
+    std::optional<StringList> Names(const wchar_t* pattern) {
+        DWORD count = 0;
+        rapi::FindData* found = nullptr;
+        if (!CeFindAllFiles(pattern, rapi::kFindName, &count, &found)) {
+            return std::nullopt;
+        }
+        StringList names;
+        std::transform(found, found + count, std::back_inserter(names),
+                       [](const rapi::FindData& entry) { return entry.name; });
+        std::sort(names.begin(), names.end());
+        EXPECT_EQ(CeRapiFreeBuffer(found), S_OK);
+        return names;
+    }
 
     // The error of a call that must have failed; 0 for one that did not.
     DWORD ErrorOf(BOOL done) { return done ? 0 : CeGetLastError(); }

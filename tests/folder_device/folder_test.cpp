@@ -3,9 +3,7 @@
 namespace orvane::testing {
 namespace {
 
-using StringList = std::vector<std::wstring>;
-
-class Folder : public FolderDeviceTest {};
+using Folder = FolderDeviceTest;
 
 TEST_F(Folder, CallsByNameFailAsADeviceDoes) {
     WriteTextFile(device_.PcPath(L"\\a.txt"), "a");
@@ -15,6 +13,8 @@ TEST_F(Folder, CallsByNameFailAsADeviceDoes) {
     MakeFolder(device_.PcPath(L"\\empty"));
     SetFileAttributesW(device_.PcPath(L"\\locked.txt").c_str(), FILE_ATTRIBUTE_READONLY);
     const StringList before = ListTree(device_.Root());
+    constexpr DWORD kRead = GENERIC_READ;
+    const HANDLE open = Open(L"\\full\\c.txt", kRead, OPEN_EXISTING, FILE_SHARE_READ | FILE_SHARE_DELETE);
     const struct {
         const char* call;
         DWORD error;
@@ -32,6 +32,17 @@ TEST_F(Folder, CallsByNameFailAsADeviceDoes) {
         {"copy over, forbidden", ErrorOf(CeCopyFile(L"\\a.txt", L"\\b.txt", TRUE)), ERROR_FILE_EXISTS},
         {"copy over read-only", ErrorOf(CeCopyFile(L"\\a.txt", L"\\locked.txt", FALSE)), ERROR_ACCESS_DENIED},
         {"copy onto itself", ErrorOf(CeCopyFile(L"\\a.txt", L"\\A.TXT", FALSE)), ERROR_SHARING_VIOLATION},
+        {"delete an open file", ErrorOf(CeDeleteFile(L"\\full\\c.txt")), ERROR_SHARING_VIOLATION},
+        {"move an open file", ErrorOf(CeMoveFile(L"\\full\\c.txt", L"\\d")), ERROR_SHARING_VIOLATION},
+        {"open an open one alone", ErrorOf(Open(L"\\full\\c.txt", kRead, OPEN_EXISTING)),
+         ERROR_SHARING_VIOLATION},
+        {"open what is not there", ErrorOf(Open(L"\\none", kRead, OPEN_EXISTING)), ERROR_FILE_NOT_FOUND},
+        {"open a folder", ErrorOf(Open(L"\\empty", kRead, OPEN_EXISTING)), ERROR_ACCESS_DENIED},
+        {"open as new", ErrorOf(Open(L"\\a.txt", GENERIC_WRITE, CREATE_NEW)), ERROR_FILE_EXISTS},
+        {"empty a read-only one", ErrorOf(Open(L"\\locked.txt", kRead, CREATE_ALWAYS)), ERROR_ACCESS_DENIED},
+        {"open with other rights", ErrorOf(Open(L"\\a.txt", kRead | FILE_APPEND_DATA, OPEN_EXISTING)),
+         ERROR_INVALID_PARAMETER},
+        {"write what is open to read", Write(open, "x") ? 0 : CeGetLastError(), ERROR_ACCESS_DENIED},
     };
     for (const auto& [call, error, expected] : calls) {
         EXPECT_EQ(error, expected) << call;
@@ -40,6 +51,7 @@ TEST_F(Folder, CallsByNameFailAsADeviceDoes) {
     EXPECT_EQ(ListTree(device_.Root()), before);
     EXPECT_EQ(ReadTextFile(device_.PcPath(L"\\a.txt")), "a");
     EXPECT_EQ(ReadTextFile(device_.PcPath(L"\\b.txt")), "b");
+    EXPECT_EQ(ReadTextFile(device_.PcPath(L"\\locked.txt")), "l");
     SetFileAttributesW(device_.PcPath(L"\\locked.txt").c_str(), FILE_ATTRIBUTE_NORMAL);
 }
 
@@ -59,69 +71,34 @@ TEST_F(Folder, IsFilledRearrangedAndEmptied) {
     EXPECT_EQ(ListTree(device_.Root()), StringList{L"3.txt"});
 }
 
-// A link to a folder, made and removed as the system does that the test runs on: Wine has no links of its own
-// but shows those of the system below it.
-class FolderLink {
-  public:
-    FolderLink(std::wstring link, const std::wstring& folder) : link_(std::move(link)) {
-        if (unix_name_ == nullptr) {
-            // A folder, and without administrator's rights where that is allowed.
-            CreateSymbolicLinkW(link_.c_str(), folder.c_str(), 0x1 | 0x2);
-        } else {
-            RunUnix(L"ln", L"-s \"" + UnixPath(folder) + L"\" " + UnixLink(), true);
-        }
+// Runs a program of the system below Wine in the folder. Such a process gives no handle to wait for: within
+// two seconds the link is there, or gone, or never will be.
+void RunUnix(const std::wstring& folder, std::wstring command, const std::wstring& link, bool there) {
+    STARTUPINFOW start{};
+    start.cb = sizeof(start);
+    PROCESS_INFORMATION process{};
+    const std::wstring program = L"Z:\\bin\\" + command.substr(0, command.find(L' '));
+    CreateProcessW(program.c_str(), command.data(), nullptr, nullptr, FALSE, 0, nullptr, folder.c_str(),
+                   &start, &process);
+    for (int i = 0; i < 200 && Exists(link) != there; ++i) {
+        Sleep(10);
     }
-    ~FolderLink() {
-        if (unix_name_ == nullptr) {
-            RemoveDirectoryW(link_.c_str());
-        } else {
-            RunUnix(L"rm", UnixLink(), false);  // Wine would remove what the link leads to.
-        }
-    }
-    FolderLink(const FolderLink&) = delete;
-    FolderLink& operator=(const FolderLink&) = delete;
-
-    bool IsThere() const {
-        const DWORD attributes = GetFileAttributesW(link_.c_str());
-        return attributes != INVALID_FILE_ATTRIBUTES && (attributes & FILE_ATTRIBUTE_REPARSE_POINT) != 0;
-    }
-
-  private:
-    using UnixName = char* CDECL(LPCWSTR);
-
-    std::wstring UnixPath(const std::wstring& path) const {
-        char* const name = unix_name_(path.c_str());
-        const std::string copy = name;
-        HeapFree(GetProcessHeap(), 0, name);
-        return std::wstring(copy.begin(), copy.end());
-    }
-    std::wstring UnixLink() const {
-        const std::size_t name = link_.rfind(L'\\');
-        return L"\"" + UnixPath(link_.substr(0, name)) + L"/" + link_.substr(name + 1) + L"\"";
-    }
-    // Such a process gives no handle to wait for: within two seconds its work is done or never will be.
-    void RunUnix(const std::wstring& program, const std::wstring& arguments, bool makes) const {
-        std::wstring command = program + L" " + arguments;
-        STARTUPINFOW start{};
-        start.cb = sizeof(start);
-        PROCESS_INFORMATION process{};
-        CreateProcessW((L"Z:\\bin\\" + program).c_str(), command.data(), nullptr, nullptr, FALSE, 0, nullptr,
-                       nullptr, &start, &process);
-        for (int i = 0; i < 200 && Exists(link_) != makes; ++i) {
-            Sleep(10);
-        }
-    }
-
-    const std::wstring link_;
-    UnixName* const unix_name_ = reinterpret_cast<UnixName*>(reinterpret_cast<void*>(
-        GetProcAddress(GetModuleHandleW(L"kernel32.dll"), "wine_get_unix_file_name")));
-};
+}
 
 TEST_F(Folder, LinksLeadNowhere) {
     const TempFolder outside;
     WriteTextFile(outside / L"secret.txt", "secret");
-    const FolderLink link(device_.PcPath(L"\\link"), outside.Path());
-    if (!link.IsThere()) {
+    const std::wstring link = device_.PcPath(L"\\link");
+    // Wine has no links of its own but shows those of the system below it.
+    const bool wine = GetProcAddress(GetModuleHandleW(L"kernel32.dll"), "wine_get_unix_file_name") != nullptr;
+    if (wine) {
+        const std::wstring target = L"../" + outside.Path().substr(outside.Path().rfind(L'\\') + 1);
+        RunUnix(device_.Root(), L"ln -s " + target + L" link", link, true);
+    } else {
+        // A folder, and without administrator's rights where that is allowed.
+        CreateSymbolicLinkW(link.c_str(), outside.Path().c_str(), 0x1 | 0x2);
+    }
+    if (!Exists(link)) {
         GTEST_SKIP() << "no links to be had here";
     }
     rapi::FindData data;
@@ -131,6 +108,11 @@ TEST_F(Folder, LinksLeadNowhere) {
     EXPECT_EQ(ErrorOf(CeFindFirstFile(L"\\link\\*", &data)), DWORD{ERROR_ACCESS_DENIED});
     EXPECT_EQ(ErrorOf(CeCreateDirectory(L"\\link\\made", nullptr)), DWORD{ERROR_ACCESS_DENIED});
     EXPECT_EQ(ListTree(outside.Path()), StringList{L"secret.txt"});
+    if (wine) {
+        RunUnix(device_.Root(), L"rm link", link, false);  // Wine would remove what the link leads to.
+    } else {
+        RemoveDirectoryW(link.c_str());
+    }
 }
 
 TEST_F(Folder, AFullStorageRefusesAndHasRoomAgain) {
