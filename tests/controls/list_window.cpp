@@ -111,34 +111,4 @@ std::wstring ListWindow::Text(int row, int column) const {
     return text;
 }
 
-std::vector<SortedListRecord> ManyRecords(int count) {
-    std::vector<SortedListRecord> records;
-    for (int number = 0; number < count; ++number) {
-        // 7919 is prime to the counts in use: every name once, out of order.
-        records.push_back({L"Job" + std::to_wstring(number * 7919 % count) + L".qvj", L"01/02/2012", false});
-    }
-    return records;
-}
-
-Picture::Picture(HWND window) {
-    RECT client{};
-    GetClientRect(window, &client);
-    HDC window_dc = GetDC(window);
-    bitmap_.Reset(CreateCompatibleBitmap(window_dc, client.right, client.bottom));
-    dc_.Reset(CreateCompatibleDC(window_dc));
-    ReleaseDC(window, window_dc);
-    SelectObject(dc_.Get(), bitmap_.Get());
-    SendMessageW(window, WM_PRINTCLIENT, reinterpret_cast<WPARAM>(dc_.Get()), PRF_CLIENT | PRF_ERASEBKGND);
-}
-
-int Picture::Count(const RECT& part, COLORREF color) const {
-    int count = 0;
-    for (int y = part.top; y < part.bottom; ++y) {
-        for (int x = part.left; x < part.right; ++x) {
-            count += At(x, y) == color ? 1 : 0;
-        }
-    }
-    return count;
-}
-
 }  // namespace orvane::testing

@@ -1,17 +1,15 @@
-// A window with one record list, and a picture to draw into.
+// A window with one record list.
 #pragma once
 
 #include <windows.h>
 
 #include <commctrl.h>
 
-#include <optional>
 #include <string>
 #include <utility>
 #include <vector>
 
 #include "controls/record_list.h"
-#include "platform/handles.h"
 
 namespace orvane::testing {
 
@@ -55,22 +53,6 @@ struct ListWindow : ParentWindow {
 
     std::vector<SortedListRecord> records;
     USortedListCtrl list;
-};
-
-// Plain entries, named by their number, none ticked.
-std::vector<SortedListRecord> ManyRecords(int count);
-
-// What a window paints of itself, as pixels.
-class Picture {
-  public:
-    explicit Picture(HWND window);
-    COLORREF At(int x, int y) const { return GetPixel(dc_.Get(), x, y); }
-    // Pixels of this colour in the rectangle.
-    int Count(const RECT& part, COLORREF color) const;
-
-  private:
-    UniqueBitmap bitmap_;
-    UniqueMemoryDc dc_;
 };
 
 }  // namespace orvane::testing

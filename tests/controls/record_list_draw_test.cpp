@@ -2,6 +2,7 @@
 
 #include "controls/color_swatch.h"
 #include "controls/record_list.h"
+#include "platform/handles.h"
 #include "tests/controls/list_window.h"
 
 namespace orvane::testing {
@@ -10,11 +11,38 @@ namespace {
 constexpr COLORREF kBlack = RGB(0, 0, 0);
 constexpr COLORREF kWhite = RGB(255, 255, 255);
 
-// The frame of a tick picture in a cell of the tick column, which is 20 pixels wide.
-RECT TickFrame(const RECT& cell) {
-    const int top = (cell.top + cell.bottom - 10) / 2;
-    return {cell.left + 5, top, cell.left + 15, top + 10};
-}
+// What a window paints of itself, as pixels.
+class Picture {
+  public:
+    explicit Picture(HWND window) {
+        RECT client{};
+        GetClientRect(window, &client);
+        HDC window_dc = GetDC(window);
+        bitmap_.Reset(CreateCompatibleBitmap(window_dc, client.right, client.bottom));
+        dc_.Reset(CreateCompatibleDC(window_dc));
+        ReleaseDC(window, window_dc);
+        SelectObject(dc_.Get(), bitmap_.Get());
+        SendMessageW(window, WM_PRINTCLIENT, reinterpret_cast<WPARAM>(dc_.Get()),
+                     PRF_CLIENT | PRF_ERASEBKGND);
+    }
+
+    COLORREF At(int x, int y) const { return GetPixel(dc_.Get(), x, y); }
+
+    // Pixels of this colour in the rectangle.
+    int Count(const RECT& part, COLORREF color) const {
+        int count = 0;
+        for (int y = part.top; y < part.bottom; ++y) {
+            for (int x = part.left; x < part.right; ++x) {
+                count += At(x, y) == color ? 1 : 0;
+            }
+        }
+        return count;
+    }
+
+  private:
+    UniqueBitmap bitmap_;
+    UniqueMemoryDc dc_;
+};
 
 TEST(RecordListDraw, TickedEntriesLookTicked) {
     ListWindow window(1039, LVS_SHOWSELALWAYS);
@@ -23,24 +51,18 @@ TEST(RecordListDraw, TickedEntriesLookTicked) {
     ListView_SetItemState(window.list.Handle(), 3, LVIS_SELECTED, LVIS_SELECTED);
     SetFocus(window.Handle());
     const Picture picture(window.list.Handle());
-    const COLORREF highlight = GetSysColor(COLOR_HIGHLIGHT);
-    const struct {
-        COLORREF mark;
-        COLORREF background;
-        bool ticked;
-    } rows[] = {{kBlack, kWhite, true},
-                {kBlack, kWhite, false},
-                {kWhite, highlight, true},
-                {kWhite, highlight, false}};
     for (int row = 0; row < 4; ++row) {
-        RECT inside = TickFrame(window.Cell(row, 2));
-        InflateRect(&inside, -1, -1);
-        const int marked = picture.Count(inside, rows[row].mark);
-        EXPECT_EQ(marked > 8, rows[row].ticked) << row;
-        EXPECT_EQ(marked + picture.Count(inside, rows[row].background), 64) << row;
-        RECT outside = window.Cell(row, 2);
-        outside.right = outside.left + 5;
-        EXPECT_EQ(picture.Count(outside, rows[row].background), 5 * (outside.bottom - outside.top)) << row;
+        const COLORREF mark = row < 2 ? kBlack : kWhite;
+        const COLORREF background = row < 2 ? kWhite : GetSysColor(COLOR_HIGHLIGHT);
+        RECT cell = window.Cell(row, 2);
+        // What the frame of the picture has in it, in a column of 20 pixels.
+        const int top = (cell.top + cell.bottom - 8) / 2;
+        const RECT inside{cell.left + 6, top, cell.left + 14, top + 8};
+        const int marked = picture.Count(inside, mark);
+        EXPECT_EQ(marked > 8, row % 2 == 0) << row;
+        EXPECT_EQ(marked + picture.Count(inside, background), 64) << row;
+        cell.right = cell.left + 5;
+        EXPECT_EQ(picture.Count(cell, background), 5 * (cell.bottom - cell.top)) << row;
     }
 }
 
@@ -111,30 +133,25 @@ TEST(RecordListDraw, SortMark) {
 }
 
 TEST(ColorSwatch, TextStandsOut) {
-    const struct {
-        std::optional<COLORENTRY> entry;
-        COLORREF fill;
-        COLORREF text;
-    } cases[] = {{std::nullopt, kWhite, kBlack},
-                 {COLORENTRY{RGB(255, 127, 1), 3}, RGB(255, 127, 1), kWhite},
-                 {COLORENTRY{RGB(255, 128, 1), 3}, RGB(255, 128, 1), kBlack}};
-    for (const auto& swatch : cases) {
-        ParentWindow window;
-        HDC dc = GetDC(window.Handle());
-        RECT cell{0, 0, 60, 30};
+    constexpr COLORENTRY kDark{RGB(255, 127, 1), 3};
+    constexpr COLORENTRY kLight{RGB(255, 128, 1), 3};
+    ParentWindow window;
+    HDC dc = GetDC(window.Handle());
+    for (const COLORENTRY* entry : {&kDark, &kLight, static_cast<const COLORENTRY*>(nullptr)}) {
+        const RECT cell{0, 0, 60, 30};
         FillRect(dc, &cell, static_cast<HBRUSH>(GetStockObject(GRAY_BRUSH)));
-        DrawColorSwatch(dc, cell, swatch.entry ? &*swatch.entry : nullptr);
+        DrawColorSwatch(dc, cell, entry);
         EXPECT_EQ(GetPixel(dc, 1, 1), RGB(128, 128, 128));
-        EXPECT_EQ(GetPixel(dc, 2, 2), swatch.fill);
+        EXPECT_EQ(GetPixel(dc, 2, 2), entry != nullptr ? entry->color : kWhite);
         int text_pixels = 0;
         for (int x = 20; x < 40; ++x) {
             for (int y = 5; y < 25; ++y) {
-                text_pixels += GetPixel(dc, x, y) == swatch.text ? 1 : 0;
+                text_pixels += GetPixel(dc, x, y) == (entry == &kDark ? kWhite : kBlack) ? 1 : 0;
             }
         }
-        EXPECT_GT(text_pixels, 3) << swatch.fill;
-        ReleaseDC(window.Handle(), dc);
+        EXPECT_GT(text_pixels, 3);
     }
+    ReleaseDC(window.Handle(), dc);
 }
 
 }  // namespace
