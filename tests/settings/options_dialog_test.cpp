@@ -5,6 +5,7 @@
 #include "res/ids.h"
 #include "tests/settings/settings_values.h"
 #include "tests/support/dialog_script.h"
+#include "tests/support/message_boxes.h"
 
 namespace orvane {
 namespace {
@@ -67,7 +68,8 @@ void Browse(HWND dialog, int browse, int button, const std::wstring& start) {
     Press(dialog, browse);
     EXPECT_TRUE(testing::WaitUntil([&] {
         opened = FindWindowW(L"#32770", device ? L"Mobile Device Browse" : L"Select Directory");
-        return testing::ItemText(opened, device ? IDC_BROWSE_FOLDER : IDC_FOLDER_DIRECTORY) == start;
+        return opened != nullptr &&
+               testing::ItemText(opened, device ? IDC_BROWSE_FOLDER : IDC_FOLDER_DIRECTORY) == start;
     }));
     Press(opened, button);
     EXPECT_TRUE(testing::WaitUntil([&] { return !IsWindow(opened) && IsWindowEnabled(dialog); }));
@@ -227,6 +229,23 @@ TEST_F(OptionsDialog, OnlyAChosenPcFolderDropsWhatWasTyped) {
             EXPECT_EQ(Folders(dialog), run.folders);
             EXPECT_EQ(Ticked(dialog), run.ticked);
         }
+    });
+}
+
+TEST_F(OptionsDialog, KeepsTheDeviceFolderWhenTheDeviceCannotBeRead) {
+    const testing::MessageBoxAnswerer boxes({IDOK});
+    device_.Set(L"REFUSE", L"CeFindAllFiles=5");
+    Run([&](HWND dialog) {
+        Type(dialog, L"C:\\a", L"\\jobs\\");
+        Press(dialog, IDC_OPTIONS_DEVICE_BROWSE);
+        HWND browser = nullptr;
+        EXPECT_TRUE(testing::WaitUntil([&] {
+            browser = FindWindowW(L"#32770", L"Mobile Device Browse");
+            return browser != nullptr && boxes.Seen().size() == 1 && IsWindowEnabled(browser);
+        }));
+        Press(browser, IDOK);
+        EXPECT_TRUE(testing::WaitUntil([&] { return !IsWindow(browser) && IsWindowEnabled(dialog); }));
+        EXPECT_EQ(Folders(dialog), L"C:\\a \\jobs\\");
     });
 }
 
