@@ -133,7 +133,7 @@ void UCeDirTree::InsertChildren(const FileNode& node, HTREEITEM parent) {
         insert.item.lParam = reinterpret_cast<LPARAM>(&child);
         insert.item.state = StateOf(InitialPicture(child)) | (is_folder ? TVIS_BOLD : 0U);
         insert.item.stateMask = TVIS_STATEIMAGEMASK | (is_folder ? TVIS_BOLD : 0U);
-        HTREEITEM item = TreeView_InsertItem(Handle(), &insert);
+        auto* const item = TreeView_InsertItem(Handle(), &insert);
         if (item != nullptr) {
             InsertChildren(child, item);
         }

@@ -102,7 +102,7 @@ void USortedListCtrl::ScrollTo(int row) const {
     const int top = static_cast<int>(Direct(LVM_GETTOPINDEX, 0, 0));
     if (row != top && ItemCount() > 0) {
         const RECT bounds = ItemRect(0, LVIR_BOUNDS);
-        Direct(LVM_SCROLL, 0, (row - top) * (bounds.bottom - bounds.top));
+        Direct(LVM_SCROLL, 0, LPARAM{row - top} * (bounds.bottom - bounds.top));
     }
 }
 

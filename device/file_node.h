@@ -24,7 +24,6 @@ struct FileNode {
     std::uint32_t size_high = 0;
     std::uint32_t size_low = 0;
 
-    std::span<FileNode> Children() { return {children.get(), static_cast<std::size_t>(child_count)}; }
     std::span<const FileNode> Children() const {
         return {children.get(), static_cast<std::size_t>(child_count)};
     }

@@ -30,11 +30,11 @@ struct DeviceTreeRequest {
     DeviceResult result = DeviceResult::kFailed;       // Out: what ListDeviceFolder answered.
 };
 
-// A thread routine; `request` is the DeviceTreeRequest to carry out. It opens a session of its own on the
+// A thread routine; `parameter` is the DeviceTreeRequest to carry out. It opens a session of its own on the
 // thread that it runs on (result kFailed if there is none), lists the folder with all that lies below into
 // the emptied root, reads the two product folders whatever the listing gave, closes the session and tells
 // the window. Returns 0.
-DWORD WINAPI LoadDeviceFolderThread(void* request);
+DWORD WINAPI LoadDeviceFolderThread(void* parameter);
 
 // Reads the folders that the maker's civil-survey product keeps in the device's registry. A folder that is
 // not there stays empty. Answers true only if both were read. The caller holds a session on this thread.

@@ -28,7 +28,7 @@ struct Argument {
     Argument() = default;
     Argument(const wchar_t* path) : text(path), kind(Kind::kText) {}
     Argument(const void* handle) : number(reinterpret_cast<std::uintptr_t>(handle)), kind(Kind::kHandle) {}
-    Argument(DWORD value) : number(value), kind(Kind::kNumber) {}
+    Argument(DWORD value) : number(value) {}
     Argument(LONG value) : Argument(static_cast<DWORD>(value)) {}
 
     enum class Kind { kText, kHandle, kNumber };

@@ -1,5 +1,7 @@
 #include "folder_device/registry_text.h"
 
+#include <algorithm>
+
 #include "folder_device/text.h"
 
 namespace folder_device {
@@ -54,7 +56,7 @@ std::optional<RegistryValue> ParseValue(const std::wstring& text) {
         if (!number || *number > MAXDWORD) {
             return std::nullopt;
         }
-        const DWORD data = static_cast<DWORD>(*number);
+        const auto data = static_cast<DWORD>(*number);
         return RegistryValue{REG_DWORD, BytesOf(&data, 1)};
     }
     if (text.starts_with(L"hex:")) {
@@ -81,14 +83,11 @@ RegistryText::RegistryText(const std::wstring& file) : sections_(ReadIniFile(fil
 }
 
 bool RegistryText::HasKey(std::wstring_view key) const {
-    for (const IniSection& section : sections_) {
+    return std::any_of(sections_.begin(), sections_.end(), [key](const IniSection& section) {
         const std::wstring_view name = section.name;
-        if (EqualNoCase(name.substr(0, key.size()), key) &&
-            (name.size() == key.size() || name[key.size()] == L'\\')) {
-            return true;
-        }
-    }
-    return false;
+        return EqualNoCase(name.substr(0, key.size()), key) &&
+               (name.size() == key.size() || name[key.size()] == L'\\');
+    });
 }
 
 std::optional<RegistryValue> RegistryText::Value(std::wstring_view key, std::wstring_view name) const {

@@ -78,7 +78,7 @@ class Reader {
     uint64_t read_ = 0;  // bytes of all strings so far
 };
 
-BOOL CALLBACK AddLanguage(HMODULE, LPCWSTR, LPWSTR name, LONG_PTR languages) noexcept {
+BOOL CALLBACK AddLanguage(HMODULE /*module*/, LPCWSTR /*type*/, LPWSTR name, LONG_PTR languages) noexcept {
     if (IS_INTRESOURCE(name)) {
         reinterpret_cast<std::vector<LANGID>*>(languages)->push_back(
             static_cast<LANGID>(reinterpret_cast<ULONG_PTR>(name)));

@@ -42,7 +42,7 @@ void TranslateText(HWND window) {
     }
 }
 
-BOOL CALLBACK TranslateChild(HWND child, LPARAM) noexcept {
+BOOL CALLBACK TranslateChild(HWND child, LPARAM /*unused*/) noexcept {
     if (!HoldsUserText(child)) {
         TranslateText(child);
     }

@@ -107,7 +107,7 @@ std::wstring FindDeviceFolder() {
         return stored;
     }
     for (const UINT candidate_id : kDeviceFolders) {
-        const std::wstring candidate = ResourceString(candidate_id);
+        std::wstring candidate = ResourceString(candidate_id);
         if (IsDeviceFolder(candidate)) {
             WriteSetting(IDS_SYNC_PATH_CE, candidate);
             return candidate;

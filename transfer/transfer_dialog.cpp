@@ -74,9 +74,9 @@ bool CCeFileTransfDlg::Page::AllTicked() const {
                        [](const sFileDate& entry) { return entry.ticked; });
 }
 
-CCeFileTransfDlg::CCeFileTransfDlg(const SyncSettingsBlock& settings, bool date_check_done, HWND parent)
+CCeFileTransfDlg::CCeFileTransfDlg(SyncSettingsBlock settings, bool date_check_done, HWND parent)
     : ui::Dialog(IDD_TRANSFER, parent),
-      settings_(settings),
+      settings_(std::move(settings)),
       date_check_done_(date_check_done),
       pages_{Page{.list_id = IDC_TRANSFER_PC_LIST,
                   .from_id = IDC_TRANSFER_PC_FROM,
@@ -459,8 +459,8 @@ bool CCeFileTransfDlg::AnyCandidates() const {
 }
 
 CCeFileTransfDlg::Page* CCeFileTransfDlg::PageOfList(HWND list) {
-    const auto page = std::find_if(pages_.begin(), pages_.end(),
-                                   [list](const Page& each) { return each.list.Handle() == list; });
+    auto* const page = std::find_if(pages_.begin(), pages_.end(),
+                                    [list](const Page& each) { return each.list.Handle() == list; });
     return list == nullptr || page == pages_.end() ? nullptr : &*page;
 }
 

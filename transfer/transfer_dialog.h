@@ -27,7 +27,7 @@ inline constexpr UINT kListingReady = WM_USER + 1;
 class CCeFileTransfDlg : public ui::Dialog {
   public:
     // `date_check_done` leaves the clock check out.
-    CCeFileTransfDlg(const SyncSettingsBlock& settings, bool date_check_done, HWND parent);
+    CCeFileTransfDlg(SyncSettingsBlock settings, bool date_check_done, HWND parent);
 
     // The settings as they are now; the caller takes them back when the dialog has ended.
     const SyncSettingsBlock& Settings() const { return settings_; }
@@ -72,14 +72,14 @@ class CCeFileTransfDlg : public ui::Dialog {
     void OnSelectAll(Page& page);
 
     // Messages.
-    void OnPageChanged(int page);
+    void OnPageChanged(int number);
     void OnListDoubleClick(HWND list);
     void OnListItemsDrawn(HWND list);
-    void OnListingReady(int page);
+    void OnListingReady(int number);
 
     bool ReadListings();
     std::vector<std::wstring> Names(const Page& page, bool ticked_only) const;
-    bool CopyFiles(int page, const std::vector<std::wstring>& names, bool more_follows);
+    bool CopyFiles(int number, const std::vector<std::wstring>& names, bool more_follows);
     void FinishCopy(Page& page);
     bool AnyCandidates() const;
     Page* PageOfList(HWND list);
