@@ -91,8 +91,8 @@ measure_other() { # CASE RUNS FUNCTION
 decision_cases() {
   local count
   for count in $(of_size 10000) $(of_size 40000) $(of_size 160000); do
-    measure "decision folders $count" 5 decision "$count" 100 0 1
-    measure "decision one $count" 5 decision "$count" "$count" 0 1
+    measure "decision folders $count" 9 decision "$count" 100 0 1
+    measure "decision one $count" 9 decision "$count" "$count" 0 1
   done
   count=$(of_size 40000)
   measure "decision close" 5 decision "$count" 100 2 1
