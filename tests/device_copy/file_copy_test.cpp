@@ -101,7 +101,7 @@ class FileCopyTest : public CopyTest, public ::testing::WithParamInterface<std::
 INSTANTIATE_TEST_SUITE_P(All, FileCopyTest, ::testing::Range(std::size_t{0}, kCopyCount));
 
 TEST_P(FileCopyTest, CopiesContentAndStampsTimes) {
-    for (const std::size_t size : {0u, 8192u, 8193u, 1u << 20}) {
+    for (const std::size_t size : {0u, 1u, 8191u, 8192u, 8193u, 1u << 20}) {
         SCOPED_TRACE(size);
         content_ = Content(size);
         SetUpOldTarget();

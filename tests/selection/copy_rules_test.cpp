@@ -29,6 +29,7 @@ FILETIME AddTicks(const FILETIME& time, ULONGLONG ticks) {
 
 TEST(IsSameVersion, TakesTheLocalDateAndTheWholeSecondsOfTheDay) {
     const FILETIME noon = LocalTime(2024, 3, 1, 12, 0, 0);
+    const FILETIME before_1980 = LocalTime(1979, 12, 31, 12, 0, 0);
     const FILETIME before_1900 = LocalTime(1899, 12, 31, 23, 59, 59);
     const FILETIME unix_epoch = UtcTime(1970, 1, 1);
     const FILETIME beyond_the_calendar = FileTimeOf(0xFFFF'FFFF'FFFF'FFFFU);
@@ -42,6 +43,8 @@ TEST(IsSameVersion, TakesTheLocalDateAndTheWholeSecondsOfTheDay) {
         {noon, AddTicks(noon, 99'999'999), true},
         {AddTicks(noon, 9'999'999), AddSeconds(noon, 10), false},
         {LocalTime(2024, 3, 1, 23, 59, 59), LocalTime(2024, 3, 2, 0, 0, 1), false},
+        {before_1980, AddSeconds(before_1980, 9), true},
+        {before_1980, AddSeconds(before_1980, 10), false},
         {before_1900, FILETIME{}, true},
         {beyond_the_calendar, unix_epoch, true},
     };
