@@ -15,7 +15,8 @@ namespace orvane {
 //
 // kFailed if the pattern finds nothing at all (a folder always finds "." or "..", so the folder is missing
 // or may not be read) or the search breaks off; a sub-folder that fails so ends the listing with the same
-// result, and the node then holds the entries read until there. kDone otherwise, also for an empty folder.
+// result, and the node then holds the entries read until there (none of a folder that could not be counted
+// to its end). kDone otherwise, also for an empty folder.
 DeviceResult ListPcFolder(const std::wstring& pattern, bool recurse, FileNode& node);
 
 }  // namespace orvane

@@ -27,7 +27,7 @@ bool RegReadString(HKEY root, const std::wstring& subkey, const std::wstring& na
         return false;
     }
     // A value may be stored without a terminator, our own are: the buffer's zeros end it then.
-    const auto* const end = std::find(buffer.begin(), buffer.end(), L'\0');
+    const auto end = std::find(buffer.begin(), buffer.end(), L'\0');
     const auto length = static_cast<std::size_t>(end - buffer.begin());
     if (length > kMaxCharacters) {
         return false;

@@ -434,7 +434,11 @@ bool CCeFileTransfDlg::CopyFiles(int number, const std::vector<std::wstring>& na
             Xlate(direction == CopyDirection::kPcToDevice ? L"Device Disk Full!" : L"PC Disk Full!"),
             MB_OK | MB_ICONINFORMATION, Xlate(L"Copying File"));
     }
-    const bool go_on = !more_follows || progress.MayGoOn();
+    bool go_on = true;
+    if (more_follows) {
+        go_on = progress.MayGoOn();
+        DropPendingInput();  // What came while the question was open.
+    }
     progress.Close();
     session.Close();
     FinishCopy(page);
@@ -459,8 +463,8 @@ bool CCeFileTransfDlg::AnyCandidates() const {
 }
 
 CCeFileTransfDlg::Page* CCeFileTransfDlg::PageOfList(HWND list) {
-    auto* const page = std::find_if(pages_.begin(), pages_.end(),
-                                    [list](const Page& each) { return each.list.Handle() == list; });
+    const auto page = std::find_if(pages_.begin(), pages_.end(),
+                                   [list](const Page& each) { return each.list.Handle() == list; });
     return list == nullptr || page == pages_.end() ? nullptr : &*page;
 }
 
