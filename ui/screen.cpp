@@ -1,0 +1,28 @@
+#include "ui/screen.h"
+
+namespace orvane::ui {
+
+int DpiOf(HWND window) {
+    // Windows 7 to 8.1 do not know it.
+    using GetDpiForWindowFunction = UINT(WINAPI*)(HWND);
+    static const auto get_dpi_for_window = reinterpret_cast<GetDpiForWindowFunction>(
+        reinterpret_cast<void*>(GetProcAddress(GetModuleHandleW(L"user32.dll"), "GetDpiForWindow")));
+    const UINT window_dpi =
+        get_dpi_for_window != nullptr && window != nullptr ? get_dpi_for_window(window) : 0;
+    if (window_dpi != 0) {
+        return static_cast<int>(window_dpi);
+    }
+    HDC dc = GetDC(nullptr);
+    const int system_dpi = dc != nullptr ? GetDeviceCaps(dc, LOGPIXELSX) : 0;
+    ReleaseDC(nullptr, dc);
+    return system_dpi != 0 ? system_dpi : USER_DEFAULT_SCREEN_DPI;
+}
+
+bool HasHighContrast() {
+    HIGHCONTRASTW contrast{};
+    contrast.cbSize = sizeof contrast;
+    return SystemParametersInfoW(SPI_GETHIGHCONTRAST, contrast.cbSize, &contrast, 0) != FALSE &&
+           (contrast.dwFlags & HCF_HIGHCONTRASTON) != 0;
+}
+
+}  // namespace orvane::ui
