@@ -23,10 +23,9 @@ struct PassKind {
     bool to_device;
     const wchar_t* source_label;
     const wchar_t* target_label;
-    const wchar_t* copy_line;  // The log line of a copy, up to the name; ends with the opening quote.
-    bool translate_copy_line;
-    const wchar_t* disk_full;
-    const wchar_t* failure;
+    std::wstring (*copy_line)();  // The log line of a copy, up to the name; ends with the opening quote.
+    qel_text::TextKey disk_full;
+    qel_text::TextKey failure;
     std::wstring_view completion;
 };
 
@@ -37,20 +36,18 @@ constexpr PassKind kToDevice = {&SyncTask::pc,
                                 true,
                                 L" [PC]",
                                 L" [Device]",
-                                L"[Desktop to Mobile Device] File copy: \"",
-                                false,
-                                L"[Desktop to Mobile Device] Error: DEVICE DISK FULL.",
-                                L"Communication Error.",
+                                [] { return std::wstring(L"[Desktop to Mobile Device] File copy: \""); },
+                                XlateKey(L"[Desktop to Mobile Device] Error: DEVICE DISK FULL."),
+                                XlateKey(L"Communication Error."),
                                 kTaskCompleteDt2Ce};
 constexpr PassKind kToPc = {&SyncTask::device,
                             &SyncTask::pc,
                             false,
                             L" [Device]",
                             L" [PC]",
-                            L"[Mobile Device to Desktop] File copy: \"",
-                            true,
-                            L"[Mobile Device to Desktop] Error: PC DISK FULL.",
-                            L"Communication Error",
+                            [] { return Xlate(L"[Mobile Device to Desktop] File copy: \""); },
+                            XlateKey(L"[Mobile Device to Desktop] Error: PC DISK FULL."),
+                            XlateKey(L"Communication Error"),
                             kTaskCompleteCe2Dt};
 
 // One run of a pass, on the worker's thread.
@@ -133,8 +130,7 @@ class SyncPass {
     }
 
     std::wstring CopyLine(std::wstring_view name) const {
-        return (kind_.translate_copy_line ? Xlate(kind_.copy_line) : kind_.copy_line) + std::wstring(name) +
-               L'"';
+        return kind_.copy_line() + std::wstring(name) + L'"';
     }
 
     void Report(std::wstring_view command, std::optional<std::wstring> info_text = std::nullopt) {

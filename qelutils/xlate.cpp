@@ -75,9 +75,9 @@ void TranslateItem(HMENU menu, UINT position) {
 
 }  // namespace
 
-std::wstring Xlate(std::wstring_view key) {
-    const std::wstring* translation = FindTranslation(key);
-    return translation != nullptr ? *translation : std::wstring(key);
+std::wstring Xlate(qel_text::TextKey key) {
+    const std::wstring* translation = FindTranslation(key.English());
+    return translation != nullptr ? *translation : std::wstring(key.English());
 }
 
 void XlateWnd(HWND window) {

@@ -82,7 +82,8 @@ void CCeShwCopyFileDlg::OnClose() {
 
 std::wstring CopyProgressTitle(int number, int count, CopyDirection direction) {
     const bool to_pc = direction == CopyDirection::kDeviceToPc;
-    const std::wstring direction_text = Xlate(to_pc ? L"From Device to PC" : L"From PC to Device");
+    const std::wstring direction_text =
+        Xlate(to_pc ? XlateKey(L"From Device to PC") : XlateKey(L"From PC to Device"));
     // The doubled brace stands for one; the single one at the end stays as it is.
     return qel_text::detail::qel_safefmt_impl(
         Xlate(L"{{Copying File {1}/{2}  - {3}}"),

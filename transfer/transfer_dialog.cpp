@@ -21,10 +21,11 @@ namespace orvane {
 namespace {
 
 struct Column {
-    const wchar_t* title;
+    qel_text::TextKey title;
     int width;  // Pixels.
 };
-constexpr std::array<Column, 3> kColumns = {{{L"File Name", 300}, {L"Date", 130}, {L" ", 20}}};
+constexpr std::array<Column, 3> kColumns = {
+    {{XlateKey(L"File Name"), 300}, {XlateKey(L"Date"), 130}, {XlateKey(L" "), 20}}};
 
 // A kind that needs an extra value, whatever it is.
 constexpr DWORD kColumnWithExtra = 0x2;
@@ -40,7 +41,7 @@ void InsertColumn(HWND list, int index, const Column& column) {
     SendMessageW(list, LVM_INSERTCOLUMNW, static_cast<WPARAM>(index), reinterpret_cast<LPARAM>(&item));
 }
 
-void InsertTab(HWND tabs, int index, const wchar_t* text) {
+void InsertTab(HWND tabs, int index, qel_text::TextKey text) {
     std::wstring title = Xlate(text);
     TCITEMW item{};
     item.mask = TCIF_TEXT;
@@ -142,8 +143,8 @@ void CCeFileTransfDlg::SetUpList(Page& page) {
 void CCeFileTransfDlg::SetUpTabs() {
     tabs_.Attach(Item(IDC_TRANSFER_TABS));
     // The item that is at its place already moves on.
-    InsertTab(tabs_.Handle(), 0, L"Mobile Device");
-    InsertTab(tabs_.Handle(), 0, L"PC");
+    InsertTab(tabs_.Handle(), 0, XlateKey(L"Mobile Device"));
+    InsertTab(tabs_.Handle(), 0, XlateKey(L"PC"));
     for (const int number : {kDevicePage, kPcPage}) {
         const Page& page = pages_[static_cast<std::size_t>(number)];
         for (const int id : {page.list_id, page.from_id, page.folder_id, page.all_id, IDC_TRANSFER_COPY}) {
@@ -282,8 +283,8 @@ void CCeFileTransfDlg::OnPageChanged(int number) {
     current_page_ = number;
     Page& page = pages_[static_cast<std::size_t>(number)];
     SetDlgItemTextW(Handle(), IDC_TRANSFER_COPY,
-                    Xlate(number == kPcPage ? L"Copy Selected File(s) from PC to Device"
-                                            : L"Copy Selected File(s) from Device to PC")
+                    Xlate(number == kPcPage ? XlateKey(L"Copy Selected File(s) from PC to Device")
+                                            : XlateKey(L"Copy Selected File(s) from Device to PC"))
                         .c_str());
     // Which of the entries are ticked counts as soon as the list has been drawn.
     const bool has_items = page.list.ItemCount() > 0;
@@ -429,10 +430,10 @@ bool CCeFileTransfDlg::CopyFiles(int number, const std::vector<std::wstring>& na
     if (outcome.disk_full) {
         // The progress window, which belongs to another thread, would cover the box.
         SetForegroundWindow(Handle());
-        ui::ShowMessageBox(
-            Handle(),
-            Xlate(direction == CopyDirection::kPcToDevice ? L"Device Disk Full!" : L"PC Disk Full!"),
-            MB_OK | MB_ICONINFORMATION, Xlate(L"Copying File"));
+        ui::ShowMessageBox(Handle(),
+                           Xlate(direction == CopyDirection::kPcToDevice ? XlateKey(L"Device Disk Full!")
+                                                                         : XlateKey(L"PC Disk Full!")),
+                           MB_OK | MB_ICONINFORMATION, Xlate(L"Copying File"));
     }
     bool go_on = true;
     if (more_follows) {

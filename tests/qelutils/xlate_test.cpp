@@ -18,9 +18,7 @@ class Translation : public ::testing::Test {
 };
 
 TEST_F(Translation, LooksUpTheUsersLanguageAndFallsBackToTheKey) {
-    for (const wchar_t* key : {L"", L"Exit it", L"Not translated yet"}) {
-        EXPECT_EQ(Xlate(key), key);
-    }
+    EXPECT_EQ(Xlate(L"Exit it"), L"Exit it");
     EXPECT_EQ(Xlate(L"The file:\n{1} \n\nWill be replaced by the file:\n{2}"),
               L"{2}\n\u00FCberschreibt\n{1}");
     qel_text::SetCatalogLanguage(kEnglish);
