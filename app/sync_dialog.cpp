@@ -4,7 +4,6 @@
 
 #include <utility>
 
-#include "app/about_dialog.h"
 #include "app/sync_pass.h"
 #include "device/clock_check.h"
 #include "platform/paths.h"
@@ -14,8 +13,7 @@
 #include "selection/job_table.h"
 #include "settings/options_dialog.h"
 #include "transfer/transfer_dialog.h"
-#include "ui/message_box.h"
-#include "ui/wait_cursor.h"
+#include "ui/waiting.h"
 
 namespace orvane {
 
@@ -38,6 +36,12 @@ constexpr UINT_PTR kReportTimer = 1;
 // reports change is shown in one go, this often at most.
 constexpr DWORD kShowIntervalMs = 50;
 
+// The about box.
+class CAboutDlg : public ui::Dialog {
+  public:
+    explicit CAboutDlg(HWND parent) : Dialog(IDD_ABOUT, parent) {}
+};
+
 }  // namespace
 
 CWendlowDlg::CWendlowDlg()
@@ -56,8 +60,6 @@ bool CWendlowDlg::HasRunningWorker() const {
 }
 
 bool CWendlowDlg::OnInitDialog() {
-    Dialog::OnInitDialog();
-    XlateWnd(Handle());
     SendMessageW(Handle(), WM_SETICON, ICON_BIG, reinterpret_cast<LPARAM>(icon_));
     SendMessageW(Handle(), WM_SETICON, ICON_SMALL, reinterpret_cast<LPARAM>(icon_));
     SetWindowTextW(Handle(), Xlate(L"Desktop-Mobile Device Synchronization").c_str());
@@ -101,10 +103,7 @@ void CWendlowDlg::OnCancel() {
     Dialog::OnCancel();
 }
 
-bool CWendlowDlg::OnCommand(int id, UINT code) {
-    if (code != BN_CLICKED) {
-        return false;
-    }
+bool CWendlowDlg::OnClicked(int id) {
     switch (id) {
         case IDC_SYNC_START:
             OnSynchronize();
@@ -152,7 +151,7 @@ std::optional<LRESULT> CWendlowDlg::OnMessage(UINT message, WPARAM wparam, LPARA
         case WM_CTLCOLORLISTBOX:
             return OnCtlColor(message, reinterpret_cast<HDC>(wparam));
         default:
-            return Dialog::OnMessage(message, wparam, lparam);
+            return std::nullopt;
     }
 }
 

@@ -26,7 +26,7 @@ class CWendlowDlg : public ui::Dialog {
   protected:
     bool OnInitDialog() override;
     void OnCancel() override;
-    bool OnCommand(int id, UINT code) override;
+    bool OnClicked(int id) override;
     std::optional<LRESULT> OnMessage(UINT message, WPARAM wparam, LPARAM lparam) override;
 
   private:

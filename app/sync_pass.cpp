@@ -10,7 +10,7 @@
 #include "platform/handles.h"
 #include "qelutils/xlate.h"
 #include "selection/entry_copy.h"
-#include "ui/message_box.h"
+#include "ui/dialog.h"
 
 namespace orvane {
 

@@ -2,7 +2,6 @@
 
 #include <utility>
 
-#include "qelutils/xlate.h"
 #include "res/ids.h"
 
 namespace orvane {
@@ -20,8 +19,6 @@ void CCeBrowseDlg::DoDataExchange(ui::DataExchange& exchange) {
 }
 
 bool CCeBrowseDlg::OnInitDialog() {
-    Dialog::OnInitDialog();
-    XlateWnd(Handle());
     if (!ReplacePlaceholder()) {
         End(IDCANCEL);
         return true;
@@ -63,7 +60,7 @@ bool CCeBrowseDlg::ReplacePlaceholder() {
     return true;
 }
 
-std::optional<LRESULT> CCeBrowseDlg::OnMessage(UINT message, WPARAM wparam, LPARAM lparam) {
+std::optional<LRESULT> CCeBrowseDlg::OnMessage(UINT message, WPARAM /*wparam*/, LPARAM lparam) {
     if (message == WM_NOTIFY) {
         const auto& header = *reinterpret_cast<const NMHDR*>(lparam);
         if (header.idFrom == IDC_BROWSE_TREE && header.code == TVN_SELCHANGEDW) {
@@ -71,7 +68,7 @@ std::optional<LRESULT> CCeBrowseDlg::OnMessage(UINT message, WPARAM wparam, LPAR
             return 0;
         }
     }
-    return Dialog::OnMessage(message, wparam, lparam);
+    return std::nullopt;
 }
 
 void CCeBrowseDlg::OnSelectionChanged() {

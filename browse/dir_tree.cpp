@@ -10,7 +10,7 @@
 #include "platform/text_case.h"
 #include "qelutils/xlate.h"
 #include "res/ids.h"
-#include "ui/message_box.h"
+#include "ui/dialog.h"
 
 namespace orvane {
 
@@ -332,9 +332,8 @@ void UCeDirTree::SetPicture(HTREEITEM item, TreePicture picture) {
     TreeView_SetItemState(Handle(), item, StateOf(picture), TVIS_STATEIMAGEMASK);
 }
 
-// The owner is whatever message box of this dialog is up already, so that it cannot be answered first.
 void UCeDirTree::ShowMessage(const std::wstring& text) const {
-    ui::ShowMessageBox(GetLastActivePopup(GetAncestor(Handle(), GA_ROOT)), text);
+    ui::ShowMessageBox(Handle(), text);
 }
 
 }  // namespace orvane

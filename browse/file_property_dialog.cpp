@@ -17,8 +17,6 @@ UCeFilePropertyDlg::UCeFilePropertyDlg(std::wstring path, const FileNode& node, 
       node_(node) {}
 
 bool UCeFilePropertyDlg::OnInitDialog() {
-    Dialog::OnInitDialog();
-    XlateWnd(Handle());
     const bool is_folder = node_.is_folder != 0;
     SetDlgItemTextW(Handle(), IDC_PROPERTY_PATH, path_.c_str());
     ShowKind(is_folder);

@@ -6,7 +6,7 @@
 #include "platform/resources.h"
 #include "qelutils/xlate.h"
 #include "res/ids.h"
-#include "ui/data_exchange.h"
+#include "ui/dialog.h"
 
 namespace orvane {
 

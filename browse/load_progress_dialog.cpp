@@ -3,7 +3,6 @@
 #include <utility>
 
 #include "browse/icons.h"
-#include "qelutils/xlate.h"
 #include "res/ids.h"
 
 namespace orvane {
@@ -30,18 +29,16 @@ void CLoadProgressDlg::ShowPainted() {
 }
 
 bool CLoadProgressDlg::OnInitDialog() {
-    Dialog::OnInitDialog();
-    XlateWnd(Handle());
     SetDlgItemTextW(Handle(), IDC_LOAD_TEXT, text_.c_str());
     SetTimer(Handle(), kFrameTimer, kFrameMs, nullptr);
     return true;
 }
 
-std::optional<LRESULT> CLoadProgressDlg::OnMessage(UINT message, WPARAM wparam, LPARAM lparam) {
+std::optional<LRESULT> CLoadProgressDlg::OnMessage(UINT message, WPARAM /*wparam*/, LPARAM /*lparam*/) {
     if (message == WM_TIMER) {
         ShowNextFrame();
     }
-    return Dialog::OnMessage(message, wparam, lparam);
+    return std::nullopt;
 }
 
 void CLoadProgressDlg::ShowNextFrame() {

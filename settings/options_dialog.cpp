@@ -95,10 +95,8 @@ void COptionsDlg::DoDataExchange(ui::DataExchange& exchange) {
 }
 
 bool COptionsDlg::OnInitDialog() {
-    const bool default_focus = Dialog::OnInitDialog();
-    XlateWnd(Handle());
     EnableOverwriteBoxes();
-    return default_focus;
+    return true;
 }
 
 void COptionsDlg::OnCancel() {
@@ -106,10 +104,7 @@ void COptionsDlg::OnCancel() {
     Dialog::OnCancel();
 }
 
-bool COptionsDlg::OnCommand(int id, UINT code) {
-    if (code != BN_CLICKED) {
-        return false;
-    }
+bool COptionsDlg::OnClicked(int id) {
     switch (id) {
         case IDC_OPTIONS_DEVICE_BROWSE:
             OnBrowseDevice();

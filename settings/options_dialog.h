@@ -26,7 +26,7 @@ class COptionsDlg : public ui::Dialog {
   protected:
     bool OnInitDialog() override;
     void OnCancel() override;
-    bool OnCommand(int id, UINT code) override;
+    bool OnClicked(int id) override;
     void DoDataExchange(ui::DataExchange& exchange) override;
 
   private:

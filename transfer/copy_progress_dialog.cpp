@@ -3,7 +3,6 @@
 #include "qelutils/text_format.h"
 #include "qelutils/xlate.h"
 #include "res/ids.h"
-#include "ui/message_box.h"
 
 namespace orvane {
 
@@ -11,16 +10,13 @@ CCeShwCopyFileDlg::CCeShwCopyFileDlg(CopyDirection direction)
     : ui::Dialog(IDD_COPY_PROGRESS), direction_(direction), ready_(NewManualResetEvent()) {}
 
 bool CCeShwCopyFileDlg::OnInitDialog() {
-    ui::Dialog::OnInitDialog();
-    XlateWnd(Handle());
-    UpdateData(false);
     SetForegroundWindow(Handle());
     SetEvent(ready_.Get());
     return true;
 }
 
-bool CCeShwCopyFileDlg::OnCommand(int id, UINT code) {
-    if (id == IDC_COPY_CANCEL && code == BN_CLICKED) {
+bool CCeShwCopyFileDlg::OnClicked(int id) {
+    if (id == IDC_COPY_CANCEL) {
         OnStop();
         return true;
     }

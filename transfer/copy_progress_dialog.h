@@ -45,7 +45,7 @@ class CCeShwCopyFileDlg : public ui::Dialog {
     void OnOK() override {}
     // Escape and the close box ask like the button.
     void OnCancel() override { OnStop(); }
-    bool OnCommand(int id, UINT code) override;
+    bool OnClicked(int id) override;
     std::optional<LRESULT> OnMessage(UINT message, WPARAM wparam, LPARAM lparam) override;
 
   private:

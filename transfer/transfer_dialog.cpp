@@ -13,8 +13,7 @@
 #include "settings/options_dialog.h"
 #include "transfer/copy_progress.h"
 #include "transfer/selected_copy.h"
-#include "ui/message_box.h"
-#include "ui/wait_cursor.h"
+#include "ui/waiting.h"
 
 namespace orvane {
 
@@ -47,16 +46,6 @@ void InsertTab(HWND tabs, int index, qel_text::TextKey text) {
     item.mask = TCIF_TEXT;
     item.pszText = title.data();
     SendMessageW(tabs, TCM_INSERTITEMW, static_cast<WPARAM>(index), reinterpret_cast<LPARAM>(&item));
-}
-
-// Forgets clicks and keys that came while the thread was copying: they were meant for what was shown then,
-// and would now press a button once more or tick another entry.
-void DropPendingInput() {
-    MSG message;
-    while (PeekMessageW(&message, nullptr, WM_NCMOUSEMOVE, WM_NCXBUTTONDBLCLK, PM_REMOVE) ||
-           PeekMessageW(&message, nullptr, WM_MOUSEFIRST, WM_MOUSELAST, PM_REMOVE) ||
-           PeekMessageW(&message, nullptr, WM_KEYFIRST, WM_KEYLAST, PM_REMOVE)) {
-    }
 }
 
 bool SameFolder(std::wstring_view a, std::wstring_view b) {
@@ -95,8 +84,6 @@ void CCeFileTransfDlg::DoDataExchange(ui::DataExchange& exchange) {
 }
 
 bool CCeFileTransfDlg::OnInitDialog() {
-    ui::Dialog::OnInitDialog();
-    XlateWnd(Handle());
     UpdateData(true);
     for (Page& page : pages_) {
         SetUpList(page);
@@ -161,10 +148,7 @@ void CCeFileTransfDlg::ShowFolders() {
     SetDlgItemTextW(Handle(), IDC_TRANSFER_DEVICE_FOLDER, settings_.sync_path_ce.c_str());
 }
 
-bool CCeFileTransfDlg::OnCommand(int id, UINT code) {
-    if (code != BN_CLICKED) {
-        return false;
-    }
+bool CCeFileTransfDlg::OnClicked(int id) {
     switch (id) {
         case IDC_TRANSFER_REFRESH:
             UpdateData(true);
@@ -426,7 +410,7 @@ bool CCeFileTransfDlg::CopyFiles(int number, const std::vector<std::wstring>& na
     // Before anything can paint the list, which shows the entries where they lie.
     RemoveCandidates(page.candidates, outcome.copied);
     page.list.SetItems(page.candidates);
-    DropPendingInput();
+    ui::DropPendingInput();
     if (outcome.disk_full) {
         // The progress window, which belongs to another thread, would cover the box.
         SetForegroundWindow(Handle());
@@ -438,7 +422,7 @@ bool CCeFileTransfDlg::CopyFiles(int number, const std::vector<std::wstring>& na
     bool go_on = true;
     if (more_follows) {
         go_on = progress.MayGoOn();
-        DropPendingInput();  // What came while the question was open.
+        ui::DropPendingInput();  // What came while the question was open.
     }
     progress.Close();
     session.Close();

@@ -34,7 +34,7 @@ class CCeFileTransfDlg : public ui::Dialog {
 
   protected:
     bool OnInitDialog() override;
-    bool OnCommand(int id, UINT code) override;
+    bool OnClicked(int id) override;
     std::optional<LRESULT> OnMessage(UINT message, WPARAM wparam, LPARAM lparam) override;
     void DoDataExchange(ui::DataExchange& exchange) override;
 

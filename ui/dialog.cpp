@@ -1,7 +1,10 @@
 #include "ui/dialog.h"
 
 #include "platform/resources.h"
+#include "qelutils/xlate.h"
+#include "res/ids.h"
 #include "ui/control.h"
+#include "ui/waiting.h"
 
 namespace orvane::ui {
 
@@ -30,6 +33,38 @@ bool ReturnsResultDirectly(UINT message) {
 
 }  // namespace
 
+void DataExchange::Text(int id, std::wstring& value) const {
+    if (save_) {
+        value = WindowText(GetDlgItem(dialog_, id));
+    } else {
+        SetDlgItemTextW(dialog_, id, value.c_str());
+    }
+}
+
+void DataExchange::Check(int id, int& value) const {
+    if (save_) {
+        value = IsDlgButtonChecked(dialog_, id) == BST_CHECKED ? 1 : 0;
+    } else {
+        CheckDlgButton(dialog_, id, value != 0 ? BST_CHECKED : BST_UNCHECKED);
+    }
+}
+
+std::wstring WindowText(HWND window) {
+    std::wstring text(static_cast<std::size_t>(GetWindowTextLengthW(window)), L'\0');
+    if (!text.empty()) {
+        // The length may shrink between the two calls.
+        const int length = GetWindowTextW(window, text.data(), static_cast<int>(text.size()) + 1);
+        text.resize(static_cast<std::size_t>(length));
+    }
+    return text;
+}
+
+int ShowMessageBox(HWND about, const std::wstring& text, UINT style, const std::wstring& caption) {
+    const std::wstring title = caption.empty() ? ResourceString(IDS_APPLICATION_NAME) : caption;
+    HWND owner = about != nullptr ? GetLastActivePopup(GetAncestor(about, GA_ROOT)) : nullptr;
+    return MessageBoxW(owner, text.c_str(), title.c_str(), style);
+}
+
 Dialog::~Dialog() {
     Destroy();
 }
@@ -55,11 +90,6 @@ void Dialog::UpdateData(bool save) {
     DoDataExchange(exchange);
 }
 
-bool Dialog::OnInitDialog() {
-    UpdateData(false);
-    return true;
-}
-
 void Dialog::OnOK() {
     UpdateData(true);
     End(IDOK);
@@ -69,43 +99,44 @@ void Dialog::OnCancel() {
     End(IDCANCEL);
 }
 
-bool Dialog::OnCommand(int /*id*/, UINT /*code*/) {
-    return false;
+bool Dialog::Initialise() {
+    UpdateData(false);
+    XlateWnd(window_);
+    return OnInitDialog();
 }
 
-std::optional<LRESULT> Dialog::OnMessage(UINT /*message*/, WPARAM /*wparam*/, LPARAM /*lparam*/) {
-    return std::nullopt;
-}
-
-void Dialog::DoDataExchange(DataExchange& /*exchange*/) {}
-
-std::optional<LRESULT> Dialog::DispatchCommand(int id, UINT code) {
-    if (OnCommand(id, code)) {
-        return 0;
+bool Dialog::HandleClick(int id) {
+    if (OnClicked(id)) {
+        return true;
     }
-    if (code == BN_CLICKED && id == IDOK) {
+    if (id == IDOK) {
         OnOK();
-        return 0;
-    }
-    if (code == BN_CLICKED && id == IDCANCEL) {
+    } else if (id == IDCANCEL) {
         OnCancel();
+    }
+    return id == IDOK || id == IDCANCEL;
+}
+
+std::optional<LRESULT> Dialog::HandleMessage(UINT message, WPARAM wparam, LPARAM lparam) {
+    if (message == WM_INITDIALOG) {
+        return Initialise() ? TRUE : FALSE;
+    }
+    if (const auto reflected = Control::Reflect(window_, message, wparam, lparam)) {
+        return reflected;
+    }
+    if (message == WM_COMMAND && HIWORD(wparam) == BN_CLICKED && HandleClick(LOWORD(wparam))) {
         return 0;
     }
-    return std::nullopt;
+    if (message == WM_SETCURSOR && LOWORD(lparam) == HTCLIENT && WaitCursor::IsShown()) {
+        SetCursor(LoadCursorW(nullptr, IDC_WAIT));
+        return TRUE;
+    }
+    return OnMessage(message, wparam, lparam);
 }
 
 std::optional<LRESULT> Dialog::Dispatch(UINT message, WPARAM wparam, LPARAM lparam) noexcept {
     try {
-        if (message == WM_INITDIALOG) {
-            return OnInitDialog() ? TRUE : FALSE;
-        }
-        if (const auto reflected = Control::Reflect(window_, message, wparam, lparam)) {
-            return reflected;
-        }
-        if (message == WM_COMMAND) {
-            return DispatchCommand(LOWORD(wparam), HIWORD(wparam));
-        }
-        return OnMessage(message, wparam, lparam);
+        return HandleMessage(message, wparam, lparam);
     } catch (...) {
         // An exception must not unwind through the system's code. Memory is all that can have failed here;
         // default processing keeps the window alive.

@@ -1,14 +1,38 @@
-// Dialogs on templates.
+// Dialogs on templates, the exchange of their controls' data, and message boxes.
 #pragma once
 
 #include <windows.h>
 
 #include <atomic>
 #include <optional>
-
-#include "ui/data_exchange.h"
+#include <string>
 
 namespace orvane::ui {
+
+// The exchange between a dialog's controls and its members, one description for both directions.
+class DataExchange {
+  public:
+    // `save` true: the controls' data go into the members; false: the members are shown in the controls.
+    DataExchange(HWND dialog, bool save) : dialog_(dialog), save_(save) {}
+
+    void Text(int id, std::wstring& value) const;
+    // A check box; 1 for ticked, 0 for not.
+    void Check(int id, int& value) const;
+
+  private:
+    HWND dialog_;
+    bool save_;
+};
+
+// The whole text of a window, however long.
+std::wstring WindowText(HWND window);
+
+// Shows a message box of the given MB_ style and returns the chosen button's id (0 if it cannot be shown).
+// An empty caption means the application's name. `about` is the window that the box is about, a dialog or one
+// of its controls: the owner is what stands on top of that dialog, a box that is up already for instance, so
+// that this one is answered first. Null for a box of its own.
+int ShowMessageBox(HWND about, const std::wstring& text, UINT style = MB_OK,
+                   const std::wstring& caption = {});
 
 // A modal or modeless dialog on a template of the program's resources. The object must outlive the window;
 // a modeless window is destroyed with the object. Window and object belong to the thread that calls DoModal
@@ -36,23 +60,28 @@ class Dialog {
     HWND Item(int id) const { return GetDlgItem(window_, id); }
     void End(INT_PTR result) { EndDialog(window_, result); }
 
-    // WM_INITDIALOG. True lets the system set the focus to the first control. The base writes the members
-    // to the controls.
-    virtual bool OnInitDialog();
+    // WM_INITDIALOG, after the members were shown in the controls and the window was translated. True lets
+    // the system set the focus to the first control.
+    virtual bool OnInitDialog() { return true; }
     // OK and Cancel, from their buttons, Enter and Escape. The base of OnOK takes the control values and ends
     // with IDOK, that of OnCancel ends with IDCANCEL.
     virtual void OnOK();
     virtual void OnCancel();
-    // A command from a control, a menu or an accelerator; false means default processing.
-    virtual bool OnCommand(int id, UINT code);
-    // Any other message. No value means default processing.
-    virtual std::optional<LRESULT> OnMessage(UINT message, WPARAM wparam, LPARAM lparam);
-    virtual void DoDataExchange(DataExchange& exchange);
+    // A click on a button. False: it is none of the dialog's own; OK and Cancel get their handlers then.
+    virtual bool OnClicked(int /*id*/) { return false; }
+    // Any other message, other commands included. No value means default processing, which is all that the
+    // base does.
+    virtual std::optional<LRESULT> OnMessage(UINT /*message*/, WPARAM /*wparam*/, LPARAM /*lparam*/) {
+        return std::nullopt;
+    }
+    virtual void DoDataExchange(DataExchange& /*exchange*/) {}
 
   private:
     static INT_PTR CALLBACK Thunk(HWND window, UINT message, WPARAM wparam, LPARAM lparam) noexcept;
     std::optional<LRESULT> Dispatch(UINT message, WPARAM wparam, LPARAM lparam) noexcept;
-    std::optional<LRESULT> DispatchCommand(int id, UINT code);
+    std::optional<LRESULT> HandleMessage(UINT message, WPARAM wparam, LPARAM lparam);
+    bool Initialise();
+    bool HandleClick(int id);
 
     UINT template_id_;
     HWND parent_;

@@ -8,7 +8,7 @@
 #include "res/ids.h"
 #include "tests/support/dialog_script.h"
 #include "tests/support/temp_folder.h"
-#include "ui/data_exchange.h"
+#include "ui/dialog.h"
 
 namespace orvane {
 

@@ -4,7 +4,7 @@
 
 #include <array>
 
-#include "ui/data_exchange.h"
+#include "ui/dialog.h"
 
 namespace {
 

@@ -6,7 +6,7 @@
 #include <array>
 #include <thread>
 
-#include "ui/data_exchange.h"
+#include "ui/dialog.h"
 
 namespace orvane::testing {
 

@@ -3,7 +3,7 @@
 #include <utility>
 
 #include "tests/support/dialog_script.h"
-#include "ui/data_exchange.h"
+#include "ui/dialog.h"
 
 namespace orvane::testing {
 
