@@ -2,16 +2,21 @@
 
 #include <algorithm>
 
-#include "folder_device/text.h"
+#include "platform/text_case.h"
 
 namespace folder_device {
+
+ThreadErrors& Errors() {
+    thread_local ThreadErrors errors;
+    return errors;
+}
 
 Call::~Call() {
     if (configuration_->trace.IsOpen()) {
         Guarded(
             [this] {
                 configuration_->trace.Write(
-                    {function_, thread_.sessions.size(), std::move(argument_text_), result_, error_});
+                    {function_, device_.sessions.Count(), std::move(argument_text_), result_, error_});
                 return true;
             },
             false);  // The line is lost.
@@ -19,51 +24,49 @@ Call::~Call() {
 }
 
 DWORD Call::EnterDevice() {
-    if (!thread_.IsConnected()) {
-        thread_.rapi_error = HRESULT_FROM_WIN32(ERROR_NOT_CONNECTED);
+    if (!device_.sessions.IsConnected()) {
+        Errors().transport = HRESULT_FROM_WIN32(ERROR_NOT_CONNECTED);
         return ERROR_NOT_CONNECTED;
     }
     if (TheSettings().call_delay != 0) {
         Sleep(TheSettings().call_delay);
     }
-    if (configuration_->faults.CountCall()) {
-        thread_.rapi_error = HRESULT_FROM_WIN32(ERROR_DEVICE_NOT_CONNECTED);
+    fate_ = configuration_->faults.OfDeviceCall(function_,
+                                                [this](const std::wstring& path) { return IsOnPath(path); });
+    if (fate_.vanished) {
+        Sleep(TheSettings().vanish_delay);
+        Errors().transport = HRESULT_FROM_WIN32(ERROR_DEVICE_NOT_CONNECTED);
         return ERROR_DEVICE_NOT_CONNECTED;
     }
-    thread_.rapi_error = S_OK;
-    return Refusal(true);
+    Errors().transport = S_OK;
+    return fate_.refusal;
 }
 
 HRESULT Call::EnterLocal() {
-    const DWORD refusal = Refusal(false);
+    const DWORD refusal = configuration_->faults.OfLocalCall(function_);
     return refusal == ERROR_SUCCESS ? S_OK : ToHresult(refusal);
 }
 
 void Call::LeaveLocal(HRESULT result) {
-    thread_.rapi_error = SUCCEEDED(result) ? S_OK : result;
+    Errors().transport = SUCCEEDED(result) ? S_OK : result;
     if (FAILED(result)) {
         error_ = static_cast<DWORD>(result);
-        thread_.last_error =
+        Errors().device =
             HRESULT_FACILITY(result) == FACILITY_WIN32 ? static_cast<DWORD>(HRESULT_CODE(result)) : error_;
     }
     Return(result);
-}
-
-DWORD Call::Refusal(bool reaches_device) {
-    return configuration_->faults.Refusal(function_, reaches_device,
-                                          [this](const std::wstring& path) { return IsOnPath(path); });
 }
 
 bool Call::IsOnPath(const std::wstring& path) const {
     return std::any_of(
         arguments_.begin(), arguments_.begin() + argument_count_, [&](const Argument& argument) {
             if (argument.kind == Argument::Kind::kText) {
-                return argument.text != nullptr && EqualNoCase(argument.text, path);
+                return argument.text != nullptr && orvane::EqualIgnoringCase(argument.text, path);
             }
             const auto object = argument.kind == Argument::Kind::kHandle
                                     ? device_.handles.Find(reinterpret_cast<HANDLE>(argument.number))
                                     : nullptr;
-            return object != nullptr && EqualNoCase(object->path, path);
+            return object != nullptr && orvane::EqualIgnoringCase(object->path, path);
         });
 }
 

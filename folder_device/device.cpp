@@ -1,6 +1,5 @@
 #include "folder_device/device.h"
 
-#include <algorithm>
 #include <exception>
 
 namespace folder_device {
@@ -10,123 +9,67 @@ namespace {
 // Written while the DLL is loaded and unloaded only.
 Device* the_device = nullptr;
 
-std::wstring FolderOf(HMODULE module) {
-    std::wstring path(MAX_PATH, L'\0');
-    for (;;) {
-        const DWORD size = GetModuleFileNameW(module, path.data(), static_cast<DWORD>(path.size()));
-        if (size < path.size()) {
-            path.resize(size);
-            return path.substr(0, path.find_last_of(L'\\'));
-        }
-        path.resize(path.size() * 2);
-    }
-}
-
 }  // namespace
-
-bool ThreadState::IsConnected() const {
-    return std::any_of(sessions.begin(), sessions.end(),
-                       [](const std::shared_ptr<Connection>& session) { return session->IsUp(); });
-}
-
-Device::Device(std::wstring dll_folder, DWORD slot)
-    : dll_folder_(std::move(dll_folder)),
-      slot_(slot),
-      configuration_(std::make_shared<Configuration>(std::nullopt, std::nullopt)) {}
-
-Device::~Device() {
-    for (const std::unique_ptr<ThreadState>& thread : threads_) {
-        for (const std::shared_ptr<Connection>& session : thread->sessions) {
-            session->End();
-        }
-    }
-    TlsFree(slot_);
-}
-
-bool Device::Start(HMODULE module) {
-    const DWORD slot = TlsAlloc();
-    if (slot == TLS_OUT_OF_INDEXES) {
-        return false;
-    }
-    try {
-        the_device = new Device(FolderOf(module), slot);
-    } catch (const std::exception&) {
-        TlsFree(slot);
-        return false;
-    }
-    return true;
-}
-
-void Device::Stop() {
-    delete the_device;
-    the_device = nullptr;
-}
 
 Device& Device::Get() {
     return *the_device;
 }
 
-ThreadState& Device::Thread() {
-    auto* state = static_cast<ThreadState*>(TlsGetValue(slot_));
-    if (state == nullptr) {
-        auto made = std::make_unique<ThreadState>();
-        state = made.get();
-        const std::scoped_lock lock(threads_mutex_);
-        threads_.push_back(std::move(made));
-        TlsSetValue(slot_, state);
-    }
-    return *state;
-}
-
-void Device::EndThread() {
-    auto* const state = static_cast<ThreadState*>(TlsGetValue(slot_));
-    if (state == nullptr) {
-        return;
-    }
-    for (const std::shared_ptr<Connection>& session : state->sessions) {
-        session->End();
-    }
-    open_sessions_ -= state->sessions.size();
-    const std::scoped_lock lock(threads_mutex_);
-    std::erase_if(threads_,
-                  [state](const std::unique_ptr<ThreadState>& thread) { return thread.get() == state; });
-}
-
 void Device::ReadSettings() {
-    const std::scoped_lock lock(sessions_mutex_);
-    if (open_sessions_ != 0) {
+    const std::scoped_lock lock(settings_mutex_);
+    if (sessions.AnyInProcess()) {
         return;
     }
     handles.CloseAll();
-    std::optional<SettingTexts> texts = ReadSettingTexts(dll_folder_);
     std::shared_ptr<Configuration> configuration = Current();
-    if (!configuration->IsUsable() || configuration->texts != texts) {
-        std::optional<Settings> settings = texts ? ParseSettings(*texts, dll_folder_) : std::nullopt;
-        configuration = std::make_shared<Configuration>(std::move(texts), std::move(settings));
+    if (SettingTexts texts = SettingTexts::Read();
+        !configuration->IsUsable() || !(configuration->settings.texts == Settings(texts).texts)) {
+        configuration = std::make_shared<Configuration>(std::move(texts));
     }
     storage.Recount(configuration->settings.root, configuration->settings.capacity);
     configuration_ = std::move(configuration);
 }
 
 void Device::OpenSession(std::shared_ptr<Connection> connection) {
-    ThreadState& thread = Thread();
-    const std::scoped_lock lock(sessions_mutex_);
-    thread.sessions.push_back(std::move(connection));
-    ++open_sessions_;
+    const std::scoped_lock lock(settings_mutex_);
+    sessions.Open(std::move(connection));
 }
 
 bool Device::CloseSession() {
-    ThreadState& thread = Thread();
-    if (thread.sessions.empty()) {
-        return false;
-    }
-    thread.sessions.back()->End();
-    thread.sessions.pop_back();
-    const std::scoped_lock lock(sessions_mutex_);
-    if (--open_sessions_ == 0) {
+    const std::scoped_lock lock(settings_mutex_);
+    const bool closed = sessions.Close();
+    if (closed && !sessions.AnyInProcess()) {
         handles.CloseAll();
     }
-    return true;
+    return closed;
 }
 
 }  // namespace folder_device
+
+// Runs under the loader lock. Nothing here waits for a thread, loads a library or takes a lock that is held
+// over such a thing. At the end of the process nothing is done: the system closes what is open, and threads
+// that were ended while they held a lock must not be waited for.
+BOOL WINAPI DllMain(HINSTANCE /*module*/, DWORD reason, LPVOID process_ends) {
+    using folder_device::the_device;
+    switch (reason) {
+        case DLL_PROCESS_ATTACH:
+            try {
+                the_device = new folder_device::Device;
+            } catch (const std::exception&) {
+                return FALSE;
+            }
+            break;
+        case DLL_THREAD_DETACH:
+            the_device->sessions.EndThread();
+            break;
+        case DLL_PROCESS_DETACH:
+            if (process_ends == nullptr) {
+                the_device->sessions.EndAll();
+                delete the_device;
+            }
+            break;
+        default:
+            break;
+    }
+    return TRUE;
+}

@@ -1,10 +1,11 @@
 #include "folder_device/device_path.h"
 
-#include <algorithm>
 #include <cwchar>
 
-#include "folder_device/owned_handle.h"
-#include "folder_device/text.h"
+#include "folder_device/ini_text.h"
+#include "platform/handles.h"
+#include "platform/paths.h"
+#include "platform/text_case.h"
 
 namespace folder_device {
 
@@ -21,18 +22,6 @@ bool HasUnpairedSurrogate(std::wstring_view name) {
         }
     }
     return false;
-}
-
-// The names that open a device of the PC from every folder; their digits may be superscript.
-bool IsReserved(std::wstring_view name) {
-    const std::wstring_view base = Trim(name.substr(0, name.find(L'.')));
-    if (base.size() == 4 &&
-        (EqualNoCase(base.substr(0, 3), L"COM") || EqualNoCase(base.substr(0, 3), L"LPT"))) {
-        return std::wstring_view(L"0123456789\u00B9\u00B2\u00B3").find(base[3]) != std::wstring_view::npos;
-    }
-    constexpr std::wstring_view kNames[] = {L"CON", L"PRN", L"AUX", L"NUL", L"CONIN$", L"CONOUT$", L"CLOCK$"};
-    return std::any_of(std::begin(kNames), std::end(kNames),
-                       [base](std::wstring_view reserved) { return EqualNoCase(base, reserved); });
 }
 
 DWORD CheckSyntax(std::wstring_view path) {
@@ -64,9 +53,9 @@ bool HasThatName(const std::wstring& pc_path) {
         return true;
     }
     WIN32_FIND_DATAW entry;
-    const auto search = Own<OwnedFind>(
+    const orvane::UniqueFind search(
         FindFirstFileExW(pc_path.c_str(), FindExInfoBasic, &entry, FindExSearchNameMatch, nullptr, 0));
-    return search != nullptr && EqualNoCase(entry.cFileName, name);
+    return search && orvane::EqualIgnoringCase(entry.cFileName, name);
 }
 
 // What is refused of an existing place: a link, and one that only a shortened name leads to.
@@ -80,13 +69,7 @@ DWORD CheckExisting(const std::wstring& pc_path, DWORD attributes) {
 }  // namespace
 
 bool IsDeviceName(std::wstring_view name) {
-    if (name.empty() || name.size() > kMaxNameLength || name.back() == L'.' || name.back() == L' ') {
-        return false;
-    }
-    const bool forbidden = std::any_of(name.begin(), name.end(), [](wchar_t c) {
-        return c < L' ' || std::wstring_view(L"/\\:*?\"<>|").find(c) != std::wstring_view::npos;
-    });
-    return !forbidden && !HasUnpairedSurrogate(name) && !IsReserved(name);
+    return name.size() <= kMaxNameLength && orvane::IsSafePcName(name) && !HasUnpairedSurrogate(name);
 }
 
 DWORD Locate(const std::wstring& root, const wchar_t* path, Location& location) {

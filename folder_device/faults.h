@@ -1,5 +1,5 @@
-// The refused calls and the vanishing device, with their counters. Any thread may ask; the counters belong
-// to one configuration and begin anew with the next.
+// The faults that strike single calls, with their counters. Any thread may ask; the counters belong to one
+// configuration and begin anew with the next.
 #pragma once
 
 #include <windows.h>
@@ -7,50 +7,89 @@
 #include <atomic>
 #include <cstdint>
 #include <memory>
+#include <optional>
+#include <string_view>
 #include <vector>
 
-#include "folder_device/functions.h"
 #include "folder_device/settings.h"
 
 namespace folder_device {
 
-class Faults {
+// Rules of one setting and how many calls each of them has matched.
+class CountedRules {
   public:
-    explicit Faults(const Settings& settings)
-        : rules_(settings.refuse),
-          matches_(std::make_unique<std::atomic<std::uint64_t>[]>(rules_.size())),
-          vanish_at_(settings.vanish_at) {}
+    explicit CountedRules(const std::vector<CallRule>& rules)
+        : rules_(rules), matches_(std::make_unique<std::atomic<std::uint64_t>[]>(rules.size())) {}
 
-    // Counts one call that reaches the device; true when the device has vanished with or before it.
-    bool CountCall() { return vanish_at_ != 0 && ++calls_ >= vanish_at_; }
-    // Whether the device has vanished already.
-    bool Vanished() const { return vanish_at_ != 0 && calls_ >= vanish_at_; }
-
-    // The error of the first rule that refuses this call, 0 when none does. Every rule that matches counts
-    // the call. `reaches_device` says whether rules for "*" apply; `on_path` is asked with a rule's path.
+    // The value of the first rule that holds for this call. Every rule that matches counts the call.
+    // `reaches_device` says whether rules for "*" apply; `on_path` is asked with a rule's path.
     template <class OnPath>
-    DWORD Refusal(Function function, bool reaches_device, OnPath on_path) {
-        DWORD error = ERROR_SUCCESS;
+    std::optional<DWORD> Find(std::string_view function, bool reaches_device, OnPath on_path) {
+        std::optional<DWORD> value;
         for (std::size_t i = 0; i < rules_.size(); ++i) {
-            const RefuseRule& rule = rules_[i];
-            if (rule.function ? *rule.function != function : !reaches_device) {
-                continue;
-            }
-            if (!rule.path.empty() && !on_path(rule.path)) {
+            const CallRule& rule = rules_[i];
+            if ((rule.function.empty() ? !reaches_device : rule.function != function) ||
+                (!rule.path.empty() && !on_path(rule.path))) {
                 continue;
             }
             const std::uint64_t count = ++matches_[i];
-            if (error == ERROR_SUCCESS && (rule.nth == 0 || rule.nth == count)) {
-                error = rule.error;
+            if (!value && (rule.nth == 0 || rule.nth == count)) {
+                value = rule.value;
             }
         }
-        return error;
+        return value;
     }
 
   private:
-    const std::vector<RefuseRule> rules_;
+    const std::vector<CallRule>& rules_;
     const std::unique_ptr<std::atomic<std::uint64_t>[]> matches_;  // One for each rule.
-    const std::uint64_t vanish_at_;
+};
+
+class Faults {
+  public:
+    // The settings must outlive it.
+    explicit Faults(const Settings& settings)
+        : settings_(settings),
+          refuse_(settings.refuse),
+          lose_reply_(settings.lose_reply),
+          fall_short_(settings.fall_short) {}
+
+    // What becomes of one call that reaches the device.
+    struct Fate {
+        bool vanished = false;        // The device is gone, with this call or before it.
+        DWORD refusal = 0;            // The call is not carried out and fails with this.
+        DWORD lost_reply = 0;         // It is carried out and then fails with this.
+        DWORD byte_limit = MAXDWORD;  // The most bytes that it transfers.
+    };
+
+    // Counts the call and tells; does not return when the process is to end here.
+    template <class OnPath>
+    Fate OfDeviceCall(std::string_view function, OnPath on_path) {
+        const std::uint64_t number = ++calls_;
+        if (number == settings_.end_process) {
+            TerminateProcess(GetCurrentProcess(), 99);
+        }
+        if (Vanished()) {
+            return {.vanished = true};
+        }
+        const DWORD refused_here = number == settings_.fail_call ? ERROR_ACCESS_DENIED : ERROR_SUCCESS;
+        const DWORD lost_here = number == settings_.lose_call ? ERROR_ACCESS_DENIED : ERROR_SUCCESS;
+        return {.refusal = refuse_.Find(function, true, on_path).value_or(refused_here),
+                .lost_reply = lose_reply_.Find(function, true, on_path).value_or(lost_here),
+                .byte_limit = fall_short_.Find(function, true, on_path).value_or(MAXDWORD)};
+    }
+    // The refusal of a call that stays on the PC, by its name only; 0 when there is none.
+    DWORD OfLocalCall(std::string_view function) {
+        return refuse_.Find(function, false, [](const std::wstring&) { return false; }).value_or(0);
+    }
+    // Whether the device has vanished already.
+    bool Vanished() const { return settings_.vanish != 0 && calls_ >= settings_.vanish; }
+
+  private:
+    const Settings& settings_;
+    CountedRules refuse_;
+    CountedRules lose_reply_;
+    CountedRules fall_short_;
     std::atomic<std::uint64_t> calls_{0};
 };
 

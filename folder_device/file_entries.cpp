@@ -1,12 +1,21 @@
 // Files by handle: open, read, write, move, measure, time, close.
 #include "folder_device/call.h"
-#include "folder_device/device_clock.h"
 #include "folder_device/device_path.h"
-#include "folder_device/entry_points.h"
+#include "folder_device/device_times.h"
 
 using namespace folder_device;
 
 namespace {
+
+struct FileObject : Object {
+    FileObject(std::wstring opened_path, orvane::UniqueFile opened_file, DWORD granted_access)
+        : Object(std::move(opened_path)), file(std::move(opened_file)), access(granted_access) {}
+
+    const orvane::UniqueFile file;
+    const DWORD access;
+    // Set through this handle, and then kept against later writes through it.
+    std::optional<FILETIME> explicit_last_write;
+};
 
 struct OpenRequest {
     const wchar_t* path;
@@ -52,9 +61,9 @@ DWORD OpenDeviceFile(Call& call, const OpenRequest& request, HANDLE& result) {
     StorageChange change(call.TheDevice().storage);
     const std::uint64_t old_size =
         change.Limited() && Truncates(request.creation) ? FileSizeAt(file.pc_path) : 0;
-    auto opened = Own<OwnedHandle>(CreateFileW(file.pc_path.c_str(), request.access,
-                                               request.share_mode & kKnownShare, nullptr, request.creation,
-                                               request.attributes & kKnownAttributes, nullptr));
+    orvane::UniqueFile opened(CreateFileW(file.pc_path.c_str(), request.access,
+                                          request.share_mode & kKnownShare, nullptr, request.creation,
+                                          request.attributes & kKnownAttributes, nullptr));
     const DWORD note = GetLastError();
     if (!opened) {
         return note;
@@ -90,7 +99,7 @@ DWORD SizesOfWrite(HANDLE file, DWORD wanted, std::uint64_t& old_size, std::uint
 void StampWritten(FileObject& file, std::int64_t offset) {
     if (file.explicit_last_write || offset != 0) {
         const FILETIME time = file.explicit_last_write.value_or(DeviceNow(offset));
-        SetFileTime(file.file.get(), nullptr, nullptr, &time);
+        SetFileTime(file.file.Get(), nullptr, nullptr, &time);
     }
 }
 
@@ -100,7 +109,7 @@ DWORD WriteDeviceFile(Call& call, FileObject& file, LPCVOID buffer, DWORD wanted
     std::uint64_t old_size = 0;
     std::uint64_t new_size = 0;
     if (change.Limited()) {
-        if (const DWORD error = SizesOfWrite(file.file.get(), wanted, old_size, new_size);
+        if (const DWORD error = SizesOfWrite(file.file.Get(), wanted, old_size, new_size);
             error != ERROR_SUCCESS) {
             return error;
         }
@@ -108,7 +117,7 @@ DWORD WriteDeviceFile(Call& call, FileObject& file, LPCVOID buffer, DWORD wanted
             return ERROR_DISK_FULL;
         }
     }
-    if (!WriteFile(file.file.get(), buffer, wanted, &written, nullptr)) {
+    if (!WriteFile(file.file.Get(), buffer, wanted, &written, nullptr)) {
         return GetLastError();
     }
     change.Book(old_size, new_size);
@@ -127,8 +136,41 @@ bool IsTime(const FILETIME* time) {
 // Finds the open file and lets `work` do something with it; ERROR_INVALID_HANDLE when there is none.
 template <class Work>
 DWORD OnFile(Call& call, HANDLE handle, Work work) {
-    const auto file = call.TheDevice().handles.FindKind<FileObject>(handle);
+    const auto file = call.TheDevice().handles.Find<FileObject>(handle);
     return file != nullptr ? work(*file) : static_cast<DWORD>(ERROR_INVALID_HANDLE);
+}
+
+// A read or a write: `work` moves bytes and counts them. A call that fails tells of none.
+template <class Work>
+BOOL Transfer(Call& call, HANDLE handle, LPDWORD moved, LPOVERLAPPED overlapped, Work work) {
+    DWORD count = 0;
+    const BOOL done = call.RunBool([&]() -> DWORD {
+        if (moved == nullptr || overlapped != nullptr) {
+            return ERROR_INVALID_PARAMETER;
+        }
+        return OnFile(call, handle, [&](FileObject& open) { return work(open, count); });
+    });
+    if (moved != nullptr) {
+        *moved = done ? count : 0;
+    }
+    return done;
+}
+
+// What `work` answers of the open file: the low half of a number of 64 bits. 0xFFFFFFFF may be one or tell of
+// a failure, so that the device error is set in any case.
+template <class Work>
+DWORD LowHalf(Call& call, HANDLE handle, Work work) {
+    static_assert(INVALID_SET_FILE_POINTER == INVALID_FILE_SIZE);
+    return call.RunFor(INVALID_FILE_SIZE, [&](DWORD& low) {
+        return OnFile(call, handle, [&](FileObject& open) -> DWORD {
+            const std::scoped_lock one_move(open.mutex);
+            SetLastError(ERROR_SUCCESS);
+            low = work(open.file.Get());
+            const DWORD error = low == INVALID_FILE_SIZE ? GetLastError() : ERROR_SUCCESS;
+            call.Note(error);
+            return error;
+        });
+    });
 }
 
 }  // namespace
@@ -137,89 +179,52 @@ DWORD OnFile(Call& call, HANDLE handle, Work work) {
 // GENERIC_WRITE, both or none, deletion cannot be shared. Security and template are not looked at.
 HANDLE WINAPI CeCreateFile(LPCWSTR path, DWORD access, DWORD share_mode, LPSECURITY_ATTRIBUTES /*security*/,
                            DWORD creation, DWORD attributes, HANDLE /*template_file*/) {
-    Call call(Function::kCreateFile, path, access, share_mode, creation, attributes);
-    HANDLE result = INVALID_HANDLE_VALUE;
-    call.Run([&] { return OpenDeviceFile(call, {path, access, share_mode, creation, attributes}, result); });
-    return call.Return(result);
+    Call call(__func__, path, access, share_mode, creation, attributes);
+    return call.RunFor(INVALID_HANDLE_VALUE, [&](HANDLE& result) {
+        return OpenDeviceFile(call, {path, access, share_mode, creation, attributes}, result);
+    });
 }
 
 // Closes a file's handle; those of searches and registry keys have closers of their own.
 BOOL WINAPI CeCloseHandle(HANDLE object) {
-    Call call(Function::kCloseHandle, object);
+    Call call(__func__, object);
     return call.RunBool([&] { return call.TheDevice().handles.Close<FileObject>(object); });
 }
 
 BOOL WINAPI CeReadFile(HANDLE file, LPVOID buffer, DWORD wanted, LPDWORD read, LPOVERLAPPED overlapped) {
-    Call call(Function::kReadFile, file, wanted);
-    if (read != nullptr) {
-        *read = 0;
-    }
-    return call.RunBool([&]() -> DWORD {
-        if (read == nullptr || overlapped != nullptr) {
-            return ERROR_INVALID_PARAMETER;
-        }
-        return OnFile(call, file, [&](FileObject& open) -> DWORD {
-            const std::scoped_lock one_read(open.mutex);
-            return ReadFile(open.file.get(), buffer, wanted, read, nullptr) ? ERROR_SUCCESS : GetLastError();
-        });
+    Call call(__func__, file, wanted);
+    return Transfer(call, file, read, overlapped, [&](FileObject& open, DWORD& count) {
+        const std::scoped_lock one_read(open.mutex);
+        return LastErrorUnless(ReadFile(open.file.Get(), buffer, call.BytesOf(wanted), &count, nullptr));
     });
 }
 
 // All of the bytes are written or, when the storage is full (ERROR_DISK_FULL), none.
 BOOL WINAPI CeWriteFile(HANDLE file, LPCVOID buffer, DWORD wanted, LPDWORD written, LPOVERLAPPED overlapped) {
-    Call call(Function::kWriteFile, file, wanted);
-    if (written != nullptr) {
-        *written = 0;
-    }
-    return call.RunBool([&]() -> DWORD {
-        if (written == nullptr || overlapped != nullptr) {
-            return ERROR_INVALID_PARAMETER;
-        }
-        return OnFile(call, file, [&](FileObject& open) {
-            return WriteDeviceFile(call, open, buffer, wanted, *written);
-        });
+    Call call(__func__, file, wanted);
+    return Transfer(call, file, written, overlapped, [&](FileObject& open, DWORD& count) {
+        return WriteDeviceFile(call, open, buffer, call.BytesOf(wanted), count);
     });
 }
 
 // The new position's low half, or 0xFFFFFFFF with the device error not 0.
 DWORD WINAPI CeSetFilePointer(HANDLE file, LONG distance, PLONG distance_high, DWORD method) {
-    Call call(Function::kSetFilePointer, file, distance, method);
-    DWORD low = INVALID_SET_FILE_POINTER;
-    call.Run([&] {
-        return OnFile(call, file, [&](FileObject& open) -> DWORD {
-            const std::scoped_lock one_move(open.mutex);
-            SetLastError(ERROR_SUCCESS);
-            low = SetFilePointer(open.file.get(), distance, distance_high, method);
-            const DWORD error = low == INVALID_SET_FILE_POINTER ? GetLastError() : ERROR_SUCCESS;
-            call.Note(error);
-            return error;
-        });
-    });
-    return call.Return(low);
+    Call call(__func__, file, distance, method);
+    return LowHalf(call, file,
+                   [&](HANDLE open) { return SetFilePointer(open, distance, distance_high, method); });
 }
 
 // The size's low half, or 0xFFFFFFFF with the device error not 0.
 DWORD WINAPI CeGetFileSize(HANDLE file, LPDWORD size_high) {
-    Call call(Function::kGetFileSize, file);
-    DWORD low = INVALID_FILE_SIZE;
-    call.Run([&] {
-        return OnFile(call, file, [&](FileObject& open) -> DWORD {
-            SetLastError(ERROR_SUCCESS);
-            low = GetFileSize(open.file.get(), size_high);
-            const DWORD error = low == INVALID_FILE_SIZE ? GetLastError() : ERROR_SUCCESS;
-            call.Note(error);
-            return error;
-        });
-    });
-    return call.Return(low);
+    Call call(__func__, file);
+    return LowHalf(call, file, [&](HANDLE open) { return GetFileSize(open, size_high); });
 }
 
 BOOL WINAPI CeGetFileTime(HANDLE file, LPFILETIME creation, LPFILETIME last_access, LPFILETIME last_write) {
-    Call call(Function::kGetFileTime, file);
+    Call call(__func__, file);
     return call.RunBool([&] {
-        return OnFile(call, file, [&](FileObject& open) -> DWORD {
-            return GetFileTime(open.file.get(), creation, last_access, last_write) ? ERROR_SUCCESS
-                                                                                   : GetLastError();
+        return OnFile(call, file, [&](FileObject& open) {
+            return LastErrorUnless(GetFileTime(open.file.Get(), creation, last_access, last_write));
         });
     });
 }
@@ -227,14 +232,14 @@ BOOL WINAPI CeGetFileTime(HANDLE file, LPFILETIME creation, LPFILETIME last_acce
 // Needs a handle with GENERIC_WRITE. A last-write time set so outlives later writes through the handle.
 BOOL WINAPI CeSetFileTime(HANDLE file, const FILETIME* creation, const FILETIME* last_access,
                           const FILETIME* last_write) {
-    Call call(Function::kSetFileTime, file);
+    Call call(__func__, file);
     return call.RunBool([&] {
         return OnFile(call, file, [&](FileObject& open) -> DWORD {
             const std::scoped_lock one_change(open.mutex);
             if ((open.access & GENERIC_WRITE) == 0) {
                 return ERROR_ACCESS_DENIED;
             }
-            if (!SetFileTime(open.file.get(), creation, last_access, last_write)) {
+            if (!SetFileTime(open.file.Get(), creation, last_access, last_write)) {
                 return GetLastError();
             }
             if (IsTime(last_write)) {

@@ -1,11 +1,201 @@
-// Searches and whole listings.
+// Searches and whole listings. A pattern is a device path whose last name may hold "*" and "?"; "*.*" means
+// every name, as it always did. Names are matched as they stand, never by a short name that the PC's file
+// system keeps beside them. Left out are "." and "..", links, names that no device path can hold and whatever
+// would lie at a path of 260 characters or more: nothing could be done with them.
+#include <algorithm>
+#include <cwchar>
+
 #include "folder_device/call.h"
-#include "folder_device/entry_points.h"
-#include "folder_device/listing.h"
+#include "folder_device/device_path.h"
+#include "platform/text_case.h"
 
 using namespace folder_device;
 
 namespace {
+
+struct SearchObject : Object {
+    SearchObject(std::wstring pattern, std::vector<rapi::FindData> entries)
+        : Object(std::move(pattern)), found(std::move(entries)) {}
+
+    const std::vector<rapi::FindData> found;
+    std::size_t next = 1;  // CeFindFirstFile gave out the first.
+};
+
+// The PC's other attributes (links, offline files, indexing) mean something else on a device, or nothing.
+constexpr DWORD kDeviceAttributes = FILE_ATTRIBUTE_READONLY | FILE_ATTRIBUTE_HIDDEN | FILE_ATTRIBUTE_SYSTEM |
+                                    FILE_ATTRIBUTE_DIRECTORY | FILE_ATTRIBUTE_ARCHIVE |
+                                    FILE_ATTRIBUTE_TEMPORARY | FILE_ATTRIBUTE_COMPRESSED;
+
+// Whether the name matches a pattern with "*" and "?".
+bool MatchesPattern(std::wstring_view name, std::wstring_view pattern) {
+    std::size_t n = 0;
+    std::size_t p = 0;
+    std::size_t star = std::wstring_view::npos;  // The last "*" and where its match ends so far.
+    std::size_t star_end = 0;
+    while (n < name.size()) {
+        if (p < pattern.size() && pattern[p] == L'*') {
+            star = p++;
+            star_end = n;
+        } else if (p < pattern.size() &&
+                   (pattern[p] == L'?' || orvane::SameIgnoringCase(pattern[p], name[n]))) {
+            ++p;
+            ++n;
+        } else if (star != std::wstring_view::npos) {
+            p = star + 1;
+            n = ++star_end;
+        } else {
+            return false;
+        }
+    }
+    return pattern.find_first_not_of(L'*', p) == std::wstring_view::npos;
+}
+
+struct Pattern {
+    std::wstring folder;  // Without a trailing "\": empty for the root.
+    std::wstring name;
+    bool wild = false;
+
+    bool Matches(std::wstring_view entry) const {
+        return wild ? name == L"*.*" || MatchesPattern(entry, name) : orvane::EqualIgnoringCase(entry, name);
+    }
+};
+
+DWORD ParsePattern(const wchar_t* text, Pattern& pattern) {
+    if (text == nullptr) {
+        return ERROR_INVALID_PARAMETER;
+    }
+    const std::wstring_view path(text, wcsnlen(text, MAX_PATH));
+    if (path.size() >= MAX_PATH) {
+        return ERROR_FILENAME_EXCED_RANGE;
+    }
+    if (!path.starts_with(L'\\')) {
+        return ERROR_INVALID_NAME;
+    }
+    const std::size_t last = path.find_last_of(L'\\');
+    pattern.folder = path.substr(0, last);
+    pattern.name = path.substr(last + 1);
+    if (pattern.name.empty()) {
+        return ERROR_FILE_NOT_FOUND;
+    }
+    pattern.wild = pattern.name.find_first_of(L"*?") != std::wstring::npos;
+    if (pattern.wild) {
+        // With its wildcards read as letters the pattern must be a name; a dot may end it.
+        std::wstring letters = pattern.name + L"x";
+        std::replace(letters.begin(), letters.end(), L'*', L'x');
+        std::replace(letters.begin(), letters.end(), L'?', L'x');
+        if (!IsDeviceName(letters)) {
+            return ERROR_INVALID_NAME;
+        }
+    }
+    return ERROR_SUCCESS;
+}
+
+void Append(const std::wstring& folder, const WIN32_FIND_DATAW& entry, std::vector<rapi::FindData>& found) {
+    rapi::FindData& record = found.emplace_back();
+    const DWORD attributes = entry.dwFileAttributes & kDeviceAttributes;
+    record.attributes = attributes != 0 ? attributes : FILE_ATTRIBUTE_NORMAL;
+    record.creation_time = entry.ftCreationTime;
+    record.last_access_time = entry.ftLastAccessTime;
+    record.last_write_time = entry.ftLastWriteTime;
+    record.size_high = entry.nFileSizeHigh;
+    record.size_low = entry.nFileSizeLow;
+    // A number that stays with the path.
+    record.object_id = static_cast<DWORD>(orvane::HashIgnoringCase(folder + L"\\" + entry.cFileName));
+    std::wcscpy(record.name, entry.cFileName);
+}
+
+// The entry as the search tells of it, if it is one for a device and the pattern wants it.
+void AppendIfWanted(const Pattern& pattern, const WIN32_FIND_DATAW& entry,
+                    std::vector<rapi::FindData>& found) {
+    const std::wstring_view name = entry.cFileName;
+    if ((entry.dwFileAttributes & FILE_ATTRIBUTE_REPARSE_POINT) == 0 && IsDeviceName(name) &&
+        pattern.folder.size() + 1 + name.size() < MAX_PATH && pattern.Matches(name)) {
+        Append(pattern.folder, entry, found);
+    }
+}
+
+DWORD SearchFolder(const Pattern& pattern, const Location& folder, std::vector<rapi::FindData>& found) {
+    if (!folder.IsFolder()) {
+        return ERROR_PATH_NOT_FOUND;
+    }
+    WIN32_FIND_DATAW entry;
+    const std::wstring all = folder.pc_path + (folder.IsRoot() ? L"*" : L"\\*");
+    const orvane::UniqueFind search(FindFirstFileExW(
+        all.c_str(), FindExInfoBasic, &entry, FindExSearchNameMatch, nullptr, FIND_FIRST_EX_LARGE_FETCH));
+    if (!search) {
+        const DWORD error = GetLastError();
+        return error == ERROR_FILE_NOT_FOUND ? ERROR_SUCCESS : error;  // A drive's root may be quite empty.
+    }
+    do {
+        AppendIfWanted(pattern, entry, found);
+    } while (FindNextFileW(search.Get(), &entry));
+    const DWORD error = GetLastError();
+    return error == ERROR_NO_MORE_FILES ? ERROR_SUCCESS : error;
+}
+
+DWORD SearchName(const Pattern& pattern, const Location& file, std::vector<rapi::FindData>& found) {
+    if (!file.Exists()) {
+        return ERROR_SUCCESS;
+    }
+    WIN32_FIND_DATAW entry;
+    const orvane::UniqueFind search(FindFirstFileW(file.pc_path.c_str(), &entry));
+    if (!search) {
+        return GetLastError();
+    }
+    AppendIfWanted(pattern, entry, found);
+    return ERROR_SUCCESS;
+}
+
+void AppendMadeUp(const Settings& settings, const Pattern& pattern, std::vector<rapi::FindData>& found) {
+    for (const ExtraEntry& extra : settings.extra_entries) {
+        const std::wstring folder = extra.folder.size() == 1 ? L"" : extra.folder;
+        if (!orvane::EqualIgnoringCase(folder, pattern.folder) || !pattern.Matches(extra.name)) {
+            continue;
+        }
+        WIN32_FIND_DATAW entry{};
+        entry.dwFileAttributes = extra.is_folder ? FILE_ATTRIBUTE_DIRECTORY : FILE_ATTRIBUTE_ARCHIVE;
+        GetSystemTimeAsFileTime(&entry.ftLastWriteTime);
+        entry.ftCreationTime = entry.ftLastAccessTime = entry.ftLastWriteTime;
+        entry.nFileSizeHigh = static_cast<DWORD>(extra.size >> 32U);
+        entry.nFileSizeLow = static_cast<DWORD>(extra.size & MAXDWORD);
+        extra.name.copy(entry.cFileName, MAX_PATH - 1);
+        Append(pattern.folder, entry, found);
+        if (extra.unterminated) {
+            const std::wstring unit = extra.name.empty() ? L"x" : extra.name;
+            for (std::size_t i = 0; i < MAX_PATH; ++i) {
+                found.back().name[i] = unit[i % unit.size()];
+            }
+        }
+    }
+}
+
+// Appends every entry that the pattern finds, in the order of the PC's file system, then the made-up
+// entries of the settings. Returns 0, also when nothing was found, or the error: that of the folder's
+// path (device_path.h), ERROR_INVALID_NAME for a pattern that no name can match, ERROR_FILE_NOT_FOUND for a
+// pattern that ends in "\".
+DWORD FindEntries(const Settings& settings, const wchar_t* pattern_text, std::vector<rapi::FindData>& found) {
+    Pattern pattern;
+    DWORD error = ParsePattern(pattern_text, pattern);
+    if (error != ERROR_SUCCESS) {
+        return error;
+    }
+    Location location;
+    if (pattern.wild) {
+        error = Locate(settings.root, pattern.folder.empty() ? L"\\" : pattern.folder.c_str(), location);
+        if (error == ERROR_SUCCESS) {
+            error = SearchFolder(pattern, location, found);
+        }
+    } else {
+        error = Locate(settings.root, pattern_text, location);
+        if (error == ERROR_SUCCESS) {
+            error = SearchName(pattern, location, found);
+        }
+    }
+    if (error == ERROR_SUCCESS) {
+        AppendMadeUp(settings, pattern, found);
+    }
+    return error;
+}
 
 // Leaves only the fields that were asked for; the others are zero.
 void KeepFields(DWORD flags, rapi::FindData& record) {
@@ -43,7 +233,7 @@ DWORD FindAll(Call& call, LPCWSTR pattern, DWORD flags, DWORD& count, rapi::Find
             KeepFields(flags, record);
         }
     }
-    count = settings.found_count.value_or(static_cast<DWORD>(found.size()));
+    count = static_cast<DWORD>(settings.found_count.value_or(found.size()));
     if (!found.empty() && !settings.found_null) {
         buffer = call.TheDevice().buffers.Add(std::move(found));
     }
@@ -54,9 +244,8 @@ DWORD FindAll(Call& call, LPCWSTR pattern, DWORD flags, DWORD& count, rapi::Find
 
 // Finds nothing: INVALID_HANDLE_VALUE with ERROR_FILE_NOT_FOUND.
 HANDLE WINAPI CeFindFirstFile(LPCWSTR pattern, rapi::FindData* found) {
-    Call call(Function::kFindFirstFile, pattern);
-    HANDLE result = INVALID_HANDLE_VALUE;
-    call.Run([&]() -> DWORD {
+    Call call(__func__, pattern);
+    return call.RunFor(INVALID_HANDLE_VALUE, [&](HANDLE& result) -> DWORD {
         if (found == nullptr) {
             return ERROR_INVALID_PARAMETER;
         }
@@ -71,14 +260,13 @@ HANDLE WINAPI CeFindFirstFile(LPCWSTR pattern, rapi::FindData* found) {
         result = call.TheDevice().handles.Add(std::make_shared<SearchObject>(pattern, std::move(entries)));
         return ERROR_SUCCESS;
     });
-    return call.Return(result);
 }
 
 // After the last entry: FALSE with ERROR_NO_MORE_FILES.
 BOOL WINAPI CeFindNextFile(HANDLE search, rapi::FindData* found) {
-    Call call(Function::kFindNextFile, search);
+    Call call(__func__, search);
     return call.RunBool([&]() -> DWORD {
-        const auto open = call.TheDevice().handles.FindKind<SearchObject>(search);
+        const auto open = call.TheDevice().handles.Find<SearchObject>(search);
         if (open == nullptr) {
             return ERROR_INVALID_HANDLE;
         }
@@ -95,19 +283,27 @@ BOOL WINAPI CeFindNextFile(HANDLE search, rapi::FindData* found) {
 }
 
 BOOL WINAPI CeFindClose(HANDLE search) {
-    Call call(Function::kFindClose, search);
+    Call call(__func__, search);
     return call.RunBool([&] { return call.TheDevice().handles.Close<SearchObject>(search); });
 }
 
 // Nothing found in a folder that is there is TRUE with a count of 0 and a null buffer.
 BOOL WINAPI CeFindAllFiles(LPCWSTR pattern, DWORD flags, LPDWORD found_count, rapi::FindData** found) {
-    Call call(Function::kFindAllFiles, pattern, flags);
-    return call.RunBool([&]() -> DWORD {
+    Call call(__func__, pattern, flags);
+    DWORD count = 0;
+    rapi::FindData* buffer = nullptr;
+    const BOOL done = call.RunBool([&]() -> DWORD {
         if (found_count == nullptr || found == nullptr) {
             return ERROR_INVALID_PARAMETER;
         }
-        *found_count = 0;
-        *found = nullptr;
-        return FindAll(call, pattern, flags, *found_count, *found);
+        return FindAll(call, pattern, flags, count, buffer);
     });
+    if (found_count != nullptr && found != nullptr) {
+        *found_count = done ? count : 0;
+        *found = done ? buffer : nullptr;
+    }
+    if (!done) {
+        call.TheDevice().buffers.Free(buffer);  // The reply is lost, and with it the listing.
+    }
+    return done;
 }

@@ -1,17 +1,12 @@
 // Files and folders by name: make, remove, delete, rename, copy, and the space that is left.
 #include "folder_device/call.h"
-#include "folder_device/device_clock.h"
 #include "folder_device/device_path.h"
-#include "folder_device/entry_points.h"
-#include "folder_device/text.h"
+#include "folder_device/device_times.h"
+#include "platform/text_case.h"
 
 using namespace folder_device;
 
 namespace {
-
-DWORD LastErrorUnless(BOOL done) {
-    return done ? ERROR_SUCCESS : GetLastError();
-}
 
 DWORD RemoveFolder(const Location& folder) {
     if (folder.IsRoot()) {
@@ -50,7 +45,7 @@ DWORD Rename(const Location& from, const Location& to) {
         return ERROR_FILE_NOT_FOUND;
     }
     // The same name in other letters is a rename like any other.
-    if (to.Exists() && !EqualNoCase(from.device_path, to.device_path)) {
+    if (to.Exists() && !orvane::EqualIgnoringCase(from.device_path, to.device_path)) {
         return ERROR_ALREADY_EXISTS;
     }
     return LastErrorUnless(MoveFileExW(from.pc_path.c_str(), to.pc_path.c_str(), 0));
@@ -69,7 +64,8 @@ DWORD CheckCopy(const Location& from, const Location& to, bool fail_if_exists) {
     if (to.IsReadOnly()) {
         return ERROR_ACCESS_DENIED;
     }
-    return EqualNoCase(from.device_path, to.device_path) ? ERROR_SHARING_VIOLATION : ERROR_SUCCESS;
+    return orvane::EqualIgnoringCase(from.device_path, to.device_path) ? ERROR_SHARING_VIOLATION
+                                                                       : ERROR_SUCCESS;
 }
 
 DWORD CopyDeviceFile(Call& call, const Location& from, const Location& to, bool fail_if_exists) {
@@ -126,7 +122,7 @@ DWORD OnPaths(const Call& call, LPCWSTR from, LPCWSTR to, Work work) {
 // The folder above must exist. ERROR_ALREADY_EXISTS where a folder or a file stands. Security is not
 // looked at.
 BOOL WINAPI CeCreateDirectory(LPCWSTR path, LPSECURITY_ATTRIBUTES /*security*/) {
-    Call call(Function::kCreateDirectory, path);
+    Call call(__func__, path);
     return call.RunBool([&] {
         return OnPath(call, path, [&](const Location& folder) -> DWORD {
             if (folder.Exists()) {
@@ -143,13 +139,13 @@ BOOL WINAPI CeCreateDirectory(LPCWSTR path, LPSECURITY_ATTRIBUTES /*security*/) 
 
 // Only an empty folder goes.
 BOOL WINAPI CeRemoveDirectory(LPCWSTR path) {
-    Call call(Function::kRemoveDirectory, path);
+    Call call(__func__, path);
     return call.RunBool([&] { return OnPath(call, path, &RemoveFolder); });
 }
 
 // Not a folder, not a read-only file, not an open one.
 BOOL WINAPI CeDeleteFile(LPCWSTR path) {
-    Call call(Function::kDeleteFile, path);
+    Call call(__func__, path);
     return call.RunBool([&] {
         return OnPath(call, path, [&](const Location& file) { return DeleteDeviceFile(call, file); });
     });
@@ -157,13 +153,13 @@ BOOL WINAPI CeDeleteFile(LPCWSTR path) {
 
 // Renames or moves a file or a folder with all it holds; nothing is overwritten.
 BOOL WINAPI CeMoveFile(LPCWSTR existing_path, LPCWSTR new_path) {
-    Call call(Function::kMoveFile, existing_path, new_path);
+    Call call(__func__, existing_path, new_path);
     return call.RunBool([&] { return OnPaths(call, existing_path, new_path, &Rename); });
 }
 
 // Copies a file with its last-write time and attributes.
 BOOL WINAPI CeCopyFile(LPCWSTR existing_file, LPCWSTR new_file, BOOL fail_if_exists) {
-    Call call(Function::kCopyFile, existing_file, new_file, static_cast<DWORD>(fail_if_exists));
+    Call call(__func__, existing_file, new_file, static_cast<DWORD>(fail_if_exists));
     return call.RunBool([&] {
         return OnPaths(call, existing_file, new_file, [&](const Location& from, const Location& to) {
             return CopyDeviceFile(call, from, to, fail_if_exists != FALSE);
@@ -175,7 +171,7 @@ BOOL WINAPI CeCopyFile(LPCWSTR existing_file, LPCWSTR new_file, BOOL fail_if_exi
 // null.
 BOOL WINAPI CeGetDiskFreeSpaceEx(LPCWSTR folder, PULARGE_INTEGER free_to_caller, PULARGE_INTEGER total,
                                  PULARGE_INTEGER free) {
-    Call call(Function::kGetDiskFreeSpaceEx, folder);
+    Call call(__func__, folder);
     return call.RunBool([&] {
         return OnPath(call, folder != nullptr ? folder : L"\\", [&](const Location& location) {
             ULARGE_INTEGER space[3] = {};

@@ -9,17 +9,15 @@
 #include <cstdint>
 #include <memory>
 #include <mutex>
-#include <optional>
 #include <string>
 #include <unordered_map>
 #include <vector>
 
-#include "folder_device/owned_handle.h"
-#include "folder_device/registry_text.h"
 #include "rapi/remote_api.h"
 
 namespace folder_device {
 
+// What is open. The kinds (files, searches, keys) are known to those who open them only.
 struct Object {
     explicit Object(std::wstring opened_path) : path(std::move(opened_path)) {}
     Object(const Object&) = delete;
@@ -27,55 +25,40 @@ struct Object {
     virtual ~Object() = default;
 
     const std::wstring path;  // Device path, pattern or key that was opened.
-    std::mutex mutex;         // Guards what the kinds below change after they are made.
-};
-
-struct FileObject : Object {
-    FileObject(std::wstring opened_path, OwnedHandle opened_file, DWORD granted_access)
-        : Object(std::move(opened_path)), file(std::move(opened_file)), access(granted_access) {}
-
-    const OwnedHandle file;
-    const DWORD access;
-    // Set through this handle, and then kept against later writes through it.
-    std::optional<FILETIME> explicit_last_write;
-};
-
-struct SearchObject : Object {
-    SearchObject(std::wstring pattern, std::vector<rapi::FindData> entries)
-        : Object(std::move(pattern)), found(std::move(entries)) {}
-
-    const std::vector<rapi::FindData> found;
-    std::size_t next = 1;  // CeFindFirstFile gave out the first.
-};
-
-struct KeyObject : Object {
-    KeyObject(std::wstring key, std::shared_ptr<const RegistryText> text)
-        : Object(std::move(key)), registry(std::move(text)) {}
-
-    const std::shared_ptr<const RegistryText> registry;
+    std::mutex mutex;         // Guards what the kinds change after they are made.
 };
 
 class HandleTable {
   public:
-    HANDLE Add(std::shared_ptr<Object> object);
-    // The object of any kind; null for a number that is not an open handle.
-    std::shared_ptr<Object> Find(HANDLE handle);
-    // The object of that kind, else null.
-    template <class Kind>
-    std::shared_ptr<Kind> FindKind(HANDLE handle) {
-        return std::dynamic_pointer_cast<Kind>(Find(handle));
+    HANDLE Add(std::shared_ptr<Object> object) {
+        const std::scoped_lock lock(mutex_);
+        next_ += 4;
+        objects_.emplace(next_, std::move(object));
+        return reinterpret_cast<HANDLE>(next_);
+    }
+    // The object of that kind; null for a number that is not an open handle of such a one.
+    template <class Kind = Object>
+    std::shared_ptr<Kind> Find(HANDLE handle) {
+        const std::scoped_lock lock(mutex_);
+        const auto found = objects_.find(reinterpret_cast<std::uintptr_t>(handle));
+        return found == objects_.end() ? nullptr : std::dynamic_pointer_cast<Kind>(found->second);
     }
     // Closes the handle if it is open and of that kind; 0 or ERROR_INVALID_HANDLE.
     template <class Kind>
     DWORD Close(HANDLE handle) {
-        const std::shared_ptr<Kind> object = FindKind<Kind>(handle);
-        return object != nullptr && Remove(handle) ? ERROR_SUCCESS : ERROR_INVALID_HANDLE;
+        const std::shared_ptr<Kind> closed = Find<Kind>(handle);  // Ends after the lock: closing takes time.
+        const std::scoped_lock lock(mutex_);
+        return closed != nullptr && objects_.erase(reinterpret_cast<std::uintptr_t>(handle)) != 0
+                   ? ERROR_SUCCESS
+                   : ERROR_INVALID_HANDLE;
     }
-    void CloseAll();
+    void CloseAll() {
+        std::unordered_map<std::uintptr_t, std::shared_ptr<Object>> closed;
+        const std::scoped_lock lock(mutex_);
+        closed.swap(objects_);
+    }
 
   private:
-    bool Remove(HANDLE handle);
-
     std::mutex mutex_;
     std::unordered_map<std::uintptr_t, std::shared_ptr<Object>> objects_;
     // Far from the small numbers that the PC's own handles are.
@@ -86,9 +69,17 @@ class HandleTable {
 class BufferTable {
   public:
     // Takes the records over and gives their address.
-    rapi::FindData* Add(std::vector<rapi::FindData> records);
+    rapi::FindData* Add(std::vector<rapi::FindData> records) {
+        rapi::FindData* const buffer = records.data();
+        const std::scoped_lock lock(mutex_);
+        buffers_.emplace(buffer, std::move(records));
+        return buffer;
+    }
     // False for an address that was not given out or is freed already.
-    bool Free(const void* buffer);
+    bool Free(const void* buffer) {
+        const std::scoped_lock lock(mutex_);
+        return buffers_.erase(buffer) != 0;
+    }
 
   private:
     std::mutex mutex_;

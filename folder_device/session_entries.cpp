@@ -4,7 +4,6 @@
 
 #include "folder_device/call.h"
 #include "folder_device/device_path.h"
-#include "folder_device/entry_points.h"
 
 using namespace folder_device;
 
@@ -24,6 +23,13 @@ HRESULT ConnectionResult(const Call& call) {
     return S_OK;
 }
 
+// A device that has vanished and leaves its callers waiting is not found by a connection either.
+DWORD ConnectDelay(const Call& call) {
+    const Settings& settings = call.TheSettings();
+    const bool silent = settings.vanish_delay != 0 && call.TheConfiguration().faults.Vanished();
+    return silent ? INFINITE : settings.connect_delay;
+}
+
 HRESULT OpenSession(const Call& call, rapi::InitRecord* record) {
     if (record == nullptr || record->size != sizeof(rapi::InitRecord)) {
         return E_INVALIDARG;
@@ -35,7 +41,7 @@ HRESULT OpenSession(const Call& call, rapi::InitRecord* record) {
     if (FAILED(settings.init_result)) {
         return settings.init_result;
     }
-    auto connection = Connection::Begin(*record, ConnectionResult(call), settings.connect_delay);
+    auto connection = Connection::Begin(*record, ConnectionResult(call), ConnectDelay(call));
     if (connection == nullptr) {
         return E_OUTOFMEMORY;
     }
@@ -72,39 +78,39 @@ HRESULT WINAPI CeRapiInitEx(rapi::InitRecord* record) {
             return S_OK;
         },
         static_cast<HRESULT>(E_OUTOFMEMORY));
-    Call call(Function::kRapiInitEx);
+    Call call(__func__);
     return call.RunLocal([&] { return FAILED(read) ? read : OpenSession(call, record); });
 }
 
 // Takes the thread's youngest session away, whatever became of its connection; E_FAIL when it has none.
 HRESULT WINAPI CeRapiUninit() {
-    Call call(Function::kRapiUninit);
+    Call call(__func__);
     return call.RunLocal([&] { return call.TheDevice().CloseSession() ? S_OK : E_FAIL; });
 }
 
 // S_OK when the thread's last call reached the device, else how the transport or the session failed it.
 HRESULT WINAPI CeRapiGetError() {
-    Call call(Function::kRapiGetError);
-    return call.Return(call.TheThread().rapi_error);
+    Call call(__func__);
+    return call.Return(Errors().transport);
 }
 
 // The error of the thread's last failed call, in a session and outside.
 DWORD WINAPI CeGetLastError() {
-    Call call(Function::kGetLastError);
-    return call.Return(call.TheThread().last_error);
+    Call call(__func__);
+    return call.Return(Errors().device);
 }
 
 // Frees what CeFindAllFiles gave, in a session or outside. Null is nothing to free; E_INVALIDARG for
 // anything else that is not such a buffer, so also for one that is freed already.
 HRESULT WINAPI CeRapiFreeBuffer(LPVOID buffer) {
-    Call call(Function::kRapiFreeBuffer, buffer);
+    Call call(__func__, buffer);
     return call.RunLocal(
         [&] { return buffer == nullptr || call.TheDevice().buffers.Free(buffer) ? S_OK : E_INVALIDARG; });
 }
 
 // The version of the platform that handhelds of the kind run: 5.1, platform 3 (Windows CE).
 BOOL WINAPI CeGetVersionEx(rapi::OsVersionInfo* version) {
-    Call call(Function::kGetVersionEx);
+    Call call(__func__);
     return call.RunBool([&]() -> DWORD {
         if (version == nullptr || version->size != sizeof(rapi::OsVersionInfo)) {
             return ERROR_INVALID_PARAMETER;
@@ -120,7 +126,7 @@ BOOL WINAPI CeGetVersionEx(rapi::OsVersionInfo* version) {
 HRESULT WINAPI CeRapiInvoke(LPCWSTR dll_path, LPCWSTR function_name, DWORD input_size, BYTE* /*input*/,
                             DWORD* output_size, BYTE** output, rapi::IRAPIStream** stream,
                             DWORD /*reserved*/) {
-    Call call(Function::kRapiInvoke, dll_path, function_name, input_size);
+    Call call(__func__, dll_path, function_name, input_size);
     if (output_size != nullptr) {
         *output_size = 0;
     }

@@ -1,165 +1,89 @@
 #include "folder_device/settings.h"
 
 #include <algorithm>
-#include <iterator>
-#include <limits>
 
-#include "folder_device/ini_text.h"
-#include "folder_device/text.h"
+#include "platform/paths.h"
+#include "platform/text_case.h"
+
+// Where the DLL is loaded: every linker for Windows puts this name at a module's first byte.
+extern "C" IMAGE_DOS_HEADER __ImageBase;
 
 namespace folder_device {
 
 namespace {
 
-enum Setting : std::size_t {
-    kRoot,
-    kRegistry,
-    kTrace,
-    kCapacity,
-    kClockOffset,
-    kCallDelay,
-    kConnectDelay,
-    kInitResult,
-    kConnectResult,
-    kRefuse,
-    kVanish,
-    kExtraEntries,
-    kFoundCount,
-    kFoundNull,
-};
+HMODULE ThisDll() {
+    return reinterpret_cast<HMODULE>(&__ImageBase);
+}
 
-constexpr const wchar_t* kNames[] = {L"ROOT",           L"REGISTRY",   L"TRACE",         L"CAPACITY",
-                                     L"CLOCK_OFFSET",   L"CALL_DELAY", L"CONNECT_DELAY", L"INIT_RESULT",
-                                     L"CONNECT_RESULT", L"REFUSE",     L"VANISH",        L"EXTRA_ENTRIES",
-                                     L"FOUND_COUNT",    L"FOUND_NULL"};
-static_assert(std::size(kNames) == kSettingCount);
+const std::wstring& DllFolder() {
+    static const std::wstring folder = [] {
+        std::wstring path(0x8000, L'\0');
+        path.resize(GetModuleFileNameW(ThisDll(), path.data(), static_cast<DWORD>(path.size())));
+        return path.substr(0, path.find_last_of(L'\\'));
+    }();
+    return folder;
+}
 
-std::optional<std::wstring> ReadEnvironment(const wchar_t* setting) {
-    const std::wstring name = std::wstring(L"FOLDER_DEVICE_") + setting;
+std::optional<std::wstring> FromEnvironment(const std::wstring& name) {
+    const DWORD size = GetEnvironmentVariableW(name.c_str(), nullptr, 0);
+    if (size == 0) {
+        return std::nullopt;
+    }
+    std::wstring text(size, L'\0');
+    const DWORD length = GetEnvironmentVariableW(name.c_str(), text.data(), size);
+    text.resize(std::min(length, size - 1));
+    return text;
+}
+
+std::wstring FromIni(const IniText& ini, std::wstring_view name) {
     std::wstring text;
-    for (;;) {
-        SetLastError(ERROR_SUCCESS);
-        const DWORD size =
-            GetEnvironmentVariableW(name.c_str(), text.data(), static_cast<DWORD>(text.size()));
-        if (size == 0 && GetLastError() == ERROR_ENVVAR_NOT_FOUND) {
-            return std::nullopt;
-        }
-        const bool complete = size < text.size() || size == 0;
-        text.resize(size);
-        if (complete) {
-            return text;
+    for (const IniSection& section : ini) {
+        if (orvane::EqualIgnoringCase(section.name, L"folder_device")) {
+            text = FindValue(section, name).value_or(text);
         }
     }
+    return text;
 }
 
-bool IsAbsolute(const std::wstring& path) {
-    return path.starts_with(L"\\\\") || (path.size() >= 2 && path[1] == L':');
-}
-
-std::wstring FullPath(const std::wstring& path, const std::wstring& dll_folder) {
-    std::wstring from = IsAbsolute(path) ? path : dll_folder + L"\\" + path;
-    if (from.size() == 2) {
-        from += L'\\';  // "E:" alone would be the drive's current folder.
-    }
-    std::wstring full(GetFullPathNameW(from.c_str(), 0, nullptr, nullptr), L'\0');
-    full.resize(GetFullPathNameW(from.c_str(), static_cast<DWORD>(full.size()), full.data(), nullptr));
-    return full;
-}
-
-// The form that is not held to 260 characters and whose names the system takes as they stand.
-std::wstring ExtendedPath(const std::wstring& full_path) {
-    std::wstring path = full_path;
-    if (path.starts_with(L"\\\\") && !path.starts_with(L"\\\\?\\") && !path.starts_with(L"\\\\.\\")) {
-        path = L"\\\\?\\UNC" + path.substr(1);
-    } else if (!path.starts_with(L"\\\\")) {
-        path = L"\\\\?\\" + path;
-    }
-    while (!path.empty() && path.back() == L'\\') {
-        path.pop_back();
-    }
-    return path;
-}
-
-// Reads one setting each into its place; `ok` tells in the end whether all texts were understood.
-class Reader {
-  public:
-    explicit Reader(const SettingTexts& texts) : texts_(texts) {}
-
-    void Number(Setting setting, std::uint64_t limit, std::optional<std::uint64_t>& value) {
-        if (!texts_[setting].empty()) {
-            const auto number = ParseNumber(texts_[setting]);
-            ok_ = ok_ && number && *number <= limit;
-            value = number;
-        }
-    }
-    template <class T>
-    void Number(Setting setting, T& value) {
-        std::optional<std::uint64_t> number;
-        Number(setting, std::numeric_limits<std::make_unsigned_t<T>>::max(), number);
-        if (number) {
-            value = static_cast<T>(*number);
-        }
-    }
-    void Seconds(Setting setting, std::int64_t& ticks) {
-        // A thousand years either way keep every sum far inside a FILETIME.
-        constexpr std::uint64_t kLimit = 1000ULL * 366 * 86400;
-        std::wstring_view text = texts_[setting];
-        const bool negative = text.starts_with(L'-');
-        if (negative || text.starts_with(L'+')) {
-            text.remove_prefix(1);
-        } else if (text.empty()) {
-            return;
-        }
-        const auto number = ParseNumber(text);
-        ok_ = ok_ && number && *number <= kLimit;
-        ticks = static_cast<std::int64_t>(ok_ ? *number : 0) * (negative ? -10'000'000 : 10'000'000);
-    }
-    template <class Item, class Parse>
-    void List(Setting setting, std::vector<Item>& items, Parse parse) {
-        for (const std::wstring_view piece : Split(texts_[setting], L';')) {
-            if (Trim(piece).empty()) {
-                continue;
-            }
-            std::optional<Item> item = parse(piece);
-            ok_ = ok_ && item.has_value();
-            items.push_back(item.value_or(Item{}));
-        }
-    }
-    bool Ok() const { return ok_; }
-
-  private:
-    const SettingTexts& texts_;
-    bool ok_ = true;
-};
-
-// `Function[#n][@path]=error`, where the function may be "*".
-std::optional<RefuseRule> ParseRefuse(std::wstring_view piece) {
-    RefuseRule rule;
-    const std::wstring_view text = Trim(piece);
+// `Function[#n][@path]=value`, where the function may be "*" and is one of those that the DLL exports.
+std::optional<CallRule> ParseRule(std::wstring_view text) {
+    CallRule rule;
     const std::size_t equals = text.rfind(L'=');
     if (equals == std::wstring_view::npos) {
         return std::nullopt;
     }
-    const auto error = ParseNumber(Trim(text.substr(equals + 1)));
-    std::wstring_view target = Trim(text.substr(0, equals));
-    if (!error || *error == 0 || *error > MAXDWORD) {
-        return std::nullopt;
-    }
-    rule.error = static_cast<DWORD>(*error);
+    const auto value = ParseNumber(Trim(text.substr(equals + 1)));
+    std::wstring_view target = text.substr(0, equals);
     if (const std::size_t at = target.find(L'@'); at != std::wstring_view::npos) {
         rule.path = Trim(target.substr(at + 1));
-        target = Trim(target.substr(0, at));
+        target = target.substr(0, at);
     }
     if (const std::size_t hash = target.find(L'#'); hash != std::wstring_view::npos) {
-        const auto nth = ParseNumber(target.substr(hash + 1));
-        if (!nth || *nth == 0) {
+        rule.nth = ParseNumber(Trim(target.substr(hash + 1))).value_or(0);
+        if (rule.nth == 0) {
             return std::nullopt;
         }
-        rule.nth = *nth;
-        target = Trim(target.substr(0, hash));
+        target = target.substr(0, hash);
     }
-    rule.function = FunctionOf(target);
-    return rule.function || target == L"*" ? std::optional(rule) : std::nullopt;
+    rule.function = ToUtf8(Trim(target));
+    if (rule.function == "*") {
+        rule.function.clear();
+    } else if (GetProcAddress(ThisDll(), rule.function.c_str()) == nullptr) {
+        return std::nullopt;
+    }
+    rule.value = static_cast<DWORD>(value.value_or(0));
+    return value && *value <= MAXDWORD ? std::optional(rule) : std::nullopt;
+}
+
+std::optional<CallRule> ParseRefusal(std::wstring_view text) {
+    std::optional<CallRule> rule = ParseRule(text);
+    return rule && rule->value != ERROR_SUCCESS ? rule : std::nullopt;
+}
+
+std::optional<CallRule> ParseByteCount(std::wstring_view text) {
+    std::optional<CallRule> rule = ParseRule(text);
+    return rule && (rule->function == "CeReadFile" || rule->function == "CeWriteFile") ? rule : std::nullopt;
 }
 
 // `folder|name[|option,option]`; the name is taken with every blank.
@@ -190,59 +114,114 @@ std::optional<ExtraEntry> ParseExtraEntry(std::wstring_view piece) {
 
 }  // namespace
 
-std::optional<SettingTexts> ReadSettingTexts(const std::wstring& dll_folder) {
-    const std::optional<IniText> ini = ReadIniFile(dll_folder + L"\\folder_device.ini");
-    if (!ini) {
-        return std::nullopt;
-    }
+SettingTexts SettingTexts::Read() {
     SettingTexts texts;
-    for (std::size_t i = 0; i < kSettingCount; ++i) {
-        for (const IniSection& section : *ini) {
-            const std::wstring* text =
-                EqualNoCase(section.name, L"folder_device") ? FindValue(section, kNames[i]) : nullptr;
-            texts[i] = text != nullptr ? *text : texts[i];
-        }
-        texts[i] = ReadEnvironment(kNames[i]).value_or(texts[i]);
-    }
+    texts.ini_ = ReadIniFile(DllFolder() + L"\\folder_device.ini");
+    texts.understood_ = texts.ini_.has_value();  // What it would say must not be taken for unsaid.
     return texts;
 }
 
-std::optional<Settings> ParseSettings(const SettingTexts& texts, const std::wstring& dll_folder) {
-    Settings settings;
-    Reader reader(texts);
-    settings.root = ExtendedPath(FullPath(texts[kRoot].empty() ? L"device" : texts[kRoot], dll_folder));
-    settings.registry_file =
-        FullPath(texts[kRegistry].empty() ? L"folder_device_registry.ini" : texts[kRegistry], dll_folder);
-    if (!texts[kTrace].empty()) {
-        settings.trace_file = FullPath(texts[kTrace], dll_folder);
+const std::wstring& SettingTexts::Text(const wchar_t* name) {
+    std::wstring& text = texts_[name];
+    if (ini_) {
+        text = FromEnvironment(std::wstring(L"FOLDER_DEVICE_") + name).value_or(FromIni(*ini_, name));
     }
-    // Half of the range, so that sums with file sizes cannot overflow.
-    reader.Number(kCapacity, std::numeric_limits<std::uint64_t>::max() / 2, settings.capacity);
-    reader.Seconds(kClockOffset, settings.clock_offset);
-    reader.Number(kCallDelay, settings.call_delay);
-    if (texts[kConnectDelay] == L"never") {
-        settings.connect_delay = INFINITE;
-    } else {
-        reader.Number(kConnectDelay, settings.connect_delay);
+    return text;
+}
+
+std::wstring SettingTexts::Path(const wchar_t* name, const wchar_t* otherwise) {
+    std::wstring path = Text(name);
+    if (path.empty()) {
+        path = otherwise;
     }
-    reader.Number(kInitResult, settings.init_result);
-    reader.Number(kConnectResult, settings.connect_result);
-    reader.List(kRefuse, settings.refuse, ParseRefuse);
-    reader.Number(kVanish, settings.vanish_at);
-    reader.List(kExtraEntries, settings.extra_entries, ParseExtraEntry);
-    std::optional<std::uint64_t> found_count;
-    reader.Number(kFoundCount, MAXDWORD, found_count);
-    if (found_count) {
-        settings.found_count = static_cast<DWORD>(*found_count);
+    if (path.empty()) {
+        return path;
     }
-    std::optional<std::uint64_t> found_null;
-    reader.Number(kFoundNull, 1, found_null);
-    settings.found_null = found_null == 1U;
+    if (!path.starts_with(L"\\\\") && (path.size() < 2 || path[1] != L':')) {
+        path = DllFolder() + L"\\" + path;
+    } else if (path.size() == 2) {
+        path += L'\\';  // "E:" alone would be the drive's current folder.
+    }
+    std::wstring full(GetFullPathNameW(path.c_str(), 0, nullptr, nullptr), L'\0');
+    full.resize(GetFullPathNameW(path.c_str(), static_cast<DWORD>(full.size()), full.data(), nullptr));
+    return full;
+}
+
+std::optional<std::uint64_t> SettingTexts::Number(const wchar_t* name, std::uint64_t limit) {
+    const std::wstring& text = Text(name);
+    const auto number = ParseNumber(text);
+    understood_ = understood_ && (text.empty() || (number && *number <= limit));
+    return number;
+}
+
+DWORD SettingTexts::Dword(const wchar_t* name) {
+    return static_cast<DWORD>(Number(name, MAXDWORD).value_or(0));
+}
+
+DWORD SettingTexts::Delay(const wchar_t* name) {
+    return Text(name) == L"never" ? INFINITE : Dword(name);
+}
+
+std::int64_t SettingTexts::Seconds(const wchar_t* name) {
+    // A thousand years either way keep every sum far inside a FILETIME.
+    constexpr std::uint64_t kLimit = 1000ULL * 366 * 86400;
+    std::wstring_view text = Text(name);
+    if (text.empty()) {
+        return 0;
+    }
+    const bool negative = text.front() == L'-';
+    if (negative || text.front() == L'+') {
+        text.remove_prefix(1);
+    }
+    const auto seconds = ParseNumber(text);
+    if (!seconds || *seconds > kLimit) {
+        understood_ = false;
+        return 0;
+    }
+    return static_cast<std::int64_t>(*seconds) * (negative ? -10'000'000 : 10'000'000);
+}
+
+HRESULT SettingTexts::Failure(const wchar_t* name) {
+    const auto result = static_cast<HRESULT>(Dword(name));
     // A success that is not S_OK would look like a fault that is set and does nothing.
-    if (settings.init_result > 0 || settings.connect_result > 0) {
-        return std::nullopt;
+    understood_ = understood_ && result <= 0;
+    return result;
+}
+
+template <class Item, class Parse>
+std::vector<Item> SettingTexts::List(const wchar_t* name, Parse parse) {
+    std::vector<Item> items;
+    for (const std::wstring_view piece : Split(Text(name), L';')) {
+        if (!Trim(piece).empty()) {
+            const std::optional<Item> item = parse(piece);
+            understood_ = understood_ && item.has_value();
+            items.push_back(item.value_or(Item{}));
+        }
     }
-    return reader.Ok() ? std::optional(std::move(settings)) : std::nullopt;
+    return items;
+}
+
+std::vector<CallRule> SettingTexts::Refusals(const wchar_t* name) {
+    return List<CallRule>(name, ParseRefusal);
+}
+
+std::vector<CallRule> SettingTexts::ByteCounts(const wchar_t* name) {
+    return List<CallRule>(name, ParseByteCount);
+}
+
+std::vector<ExtraEntry> SettingTexts::Entries(const wchar_t* name) {
+    return List<ExtraEntry>(name, ParseExtraEntry);
+}
+
+// The form that is not held to 260 characters and whose names the system takes as they stand.
+std::wstring Settings::RootPath(std::wstring path) {
+    if (!path.starts_with(L"\\\\")) {
+        path = L"\\\\?\\" + path;
+    } else if (!path.starts_with(L"\\\\?\\") && !path.starts_with(L"\\\\.\\")) {
+        path = L"\\\\?\\UNC" + path.substr(1);
+    }
+    path.resize(orvane::WithoutTrailingBackslashes(path).size());
+    return path;
 }
 
 }  // namespace folder_device

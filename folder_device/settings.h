@@ -5,27 +5,23 @@
 
 #include <windows.h>
 
-#include <array>
 #include <cstdint>
+#include <limits>
+#include <map>
 #include <optional>
 #include <string>
 #include <vector>
 
-#include "folder_device/functions.h"
+#include "folder_device/ini_text.h"
 
 namespace folder_device {
 
-inline constexpr std::size_t kSettingCount = 14;
-// The texts of all settings, in the order of the names in settings.cpp. Two equal arrays mean the same
-// configuration, so the counters of faults go on.
-using SettingTexts = std::array<std::wstring, kSettingCount>;
-
-// One refusal: `Function#n@path=error`.
-struct RefuseRule {
-    std::optional<Function> function;  // None: every function that reaches the device.
-    std::uint64_t nth = 0;             // Counted from 1 among the calls that match; 0: every one of them.
-    std::wstring path;                 // Empty: on any path.
-    DWORD error = 0;                   // A Win32 code, or an HRESULT for the functions that return one.
+// One rule for calls: `Function#n@path=value`.
+struct CallRule {
+    std::string function;   // As exported. Empty: every function that reaches the device.
+    std::uint64_t nth = 0;  // Counted from 1 among the calls that match; 0: every one of them.
+    std::wstring path;      // Empty: on any path.
+    DWORD value = 0;  // An error, or an HRESULT for the functions that return one; or a number of bytes.
 };
 
 // One made-up entry of a listing: `folder|name|options`.
@@ -37,27 +33,76 @@ struct ExtraEntry {
     std::uint64_t size = 0;
 };
 
-struct Settings {
-    std::wstring root;  // In the "\\?\" form, without a trailing "\".
-    std::wstring registry_file;
-    std::wstring trace_file;                // Empty: no trace.
-    std::optional<std::uint64_t> capacity;  // Bytes.
-    std::int64_t clock_offset = 0;          // 100-ns units, added to the PC's clock.
-    DWORD call_delay = 0;                   // Milliseconds before each call that reaches the device.
-    DWORD connect_delay = 0;                // Milliseconds; INFINITE: the connection never comes about.
-    HRESULT init_result = S_OK;             // A failure here is CeRapiInitEx's own answer.
-    HRESULT connect_result = S_OK;          // What the connection ends in.
-    std::vector<RefuseRule> refuse;
-    std::uint64_t vanish_at = 0;  // The call at which the device vanishes; 0: never.
-    std::vector<ExtraEntry> extra_entries;
-    std::optional<DWORD> found_count;  // What CeFindAllFiles claims to have found.
-    bool found_null = false;           // CeFindAllFiles gives no buffer.
+// Looks settings up by name. It keeps every text that was asked for, and whether all of them, and the file
+// that they may stand in, were understood.
+class SettingTexts {
+  public:
+    // Before anything is read: all texts are empty, and that is not understood.
+    SettingTexts() = default;
+    // Looks in the environment and in the ini file as it is now.
+    static SettingTexts Read();
+
+    bool Understood() const { return understood_; }
+    // Two equal ones mean the same configuration, so that the counters of faults go on.
+    bool operator==(const SettingTexts& other) const { return texts_ == other.texts_; }
+
+    const std::wstring& Text(const wchar_t* name);
+    // A full path, relative ones from the folder of the DLL; empty when there is no text and no default.
+    std::wstring Path(const wchar_t* name, const wchar_t* otherwise);
+    std::optional<std::uint64_t> Number(const wchar_t* name, std::uint64_t limit);
+    DWORD Dword(const wchar_t* name);
+    // Milliseconds; INFINITE for "never".
+    DWORD Delay(const wchar_t* name);
+    // Signed seconds, in 100-ns units.
+    std::int64_t Seconds(const wchar_t* name);
+    // An HRESULT that is a failure, else S_OK.
+    HRESULT Failure(const wchar_t* name);
+    // Rules whose value is an error, and those for CeReadFile and CeWriteFile whose value counts bytes.
+    std::vector<CallRule> Refusals(const wchar_t* name);
+    std::vector<CallRule> ByteCounts(const wchar_t* name);
+    std::vector<ExtraEntry> Entries(const wchar_t* name);
+
+  private:
+    template <class Item, class Parse>
+    std::vector<Item> List(const wchar_t* name, Parse parse);
+
+    std::optional<IniText> ini_;
+    std::map<std::wstring, std::wstring> texts_;
+    bool understood_ = false;
 };
 
-// Reads all texts: the environment, else the ini file in `dll_folder`. Nothing when the file is there and
-// cannot be read: what it would say must not be taken for unsaid.
-std::optional<SettingTexts> ReadSettingTexts(const std::wstring& dll_folder);
-// Takes the texts apart. Relative paths are below `dll_folder`. Nothing when a text cannot be understood.
-std::optional<Settings> ParseSettings(const SettingTexts& texts, const std::wstring& dll_folder);
+// All of them: what is read here is all there is. `texts` is the first, because the others come out of it.
+struct Settings {
+    explicit Settings(SettingTexts source) : texts(std::move(source)) {}
+
+    SettingTexts texts;
+    // In the "\\?\" form, without a trailing "\".
+    std::wstring root = RootPath(texts.Path(L"ROOT", L"device"));
+    std::wstring registry_file = texts.Path(L"REGISTRY", L"folder_device_registry.ini");
+    std::wstring trace_file = texts.Path(L"TRACE", L"");
+    // Bytes. Half of the range, so that sums with file sizes cannot overflow.
+    std::optional<std::uint64_t> capacity =
+        texts.Number(L"CAPACITY", std::numeric_limits<std::uint64_t>::max() / 2);
+    std::int64_t clock_offset = texts.Seconds(L"CLOCK_OFFSET");
+    DWORD call_delay = texts.Dword(L"CALL_DELAY");
+    DWORD connect_delay = texts.Delay(L"CONNECT_DELAY");
+    HRESULT init_result = texts.Failure(L"INIT_RESULT");
+    HRESULT connect_result = texts.Failure(L"CONNECT_RESULT");
+    std::vector<CallRule> refuse = texts.Refusals(L"REFUSE");
+    std::vector<CallRule> lose_reply = texts.Refusals(L"LOSE_REPLY");
+    std::vector<CallRule> fall_short = texts.ByteCounts(L"SHORT");
+    // Numbers of calls that reach the device, counted from 1; 0: no such call.
+    DWORD fail_call = texts.Dword(L"FAIL_CALL");
+    DWORD lose_call = texts.Dword(L"LOSE_CALL");
+    DWORD end_process = texts.Dword(L"END_PROCESS");
+    DWORD vanish = texts.Dword(L"VANISH");
+    DWORD vanish_delay = texts.Dword(L"VANISH_DELAY");
+    std::vector<ExtraEntry> extra_entries = texts.Entries(L"EXTRA_ENTRIES");
+    std::optional<std::uint64_t> found_count = texts.Number(L"FOUND_COUNT", MAXDWORD);
+    bool found_null = texts.Number(L"FOUND_NULL", 1) == 1U;
+
+  private:
+    static std::wstring RootPath(std::wstring full_path);
+};
 
 }  // namespace folder_device

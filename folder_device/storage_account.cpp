@@ -2,7 +2,7 @@
 
 #include <vector>
 
-#include "folder_device/owned_handle.h"
+#include "platform/handles.h"
 
 namespace folder_device {
 
@@ -17,24 +17,21 @@ std::uint64_t CountBytes(const std::wstring& root) {
     std::uint64_t bytes = 0;
     std::vector<std::wstring> folders{root};
     while (!folders.empty()) {
-        const std::wstring folder = std::move(folders.back());
+        const std::wstring folder = std::move(folders.back()) + L"\\";
         folders.pop_back();
         WIN32_FIND_DATAW entry;
-        const auto search =
-            Own<OwnedFind>(FindFirstFileExW((folder + L"\\*").c_str(), FindExInfoBasic, &entry,
-                                            FindExSearchNameMatch, nullptr, FIND_FIRST_EX_LARGE_FETCH));
-        if (!search) {
-            continue;
-        }
-        do {
+        const orvane::UniqueFind search(FindFirstFileExW((folder + L"*").c_str(), FindExInfoBasic, &entry,
+                                                         FindExSearchNameMatch, nullptr,
+                                                         FIND_FIRST_EX_LARGE_FETCH));
+        for (bool more = static_cast<bool>(search); more; more = FindNextFileW(search.Get(), &entry)) {
             const std::wstring_view name = entry.cFileName;
             if ((entry.dwFileAttributes & FILE_ATTRIBUTE_DIRECTORY) == 0) {
                 bytes += Join(entry.nFileSizeHigh, entry.nFileSizeLow);
             } else if (name != L"." && name != L".." &&
                        (entry.dwFileAttributes & FILE_ATTRIBUTE_REPARSE_POINT) == 0) {
-                folders.push_back(folder + L"\\" + entry.cFileName);
+                folders.push_back(folder + entry.cFileName);
             }
-        } while (FindNextFileW(search.get(), &entry));
+        }
     }
     return bytes;
 }

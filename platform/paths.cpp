@@ -27,10 +27,6 @@ bool IsPcDeviceName(std::wstring_view name) {
     return is_port && kPortDigits.find(stem[3]) != std::wstring_view::npos;
 }
 
-bool IsSafePcName(std::wstring_view name) {
-    return IsPathComponent(name) && name.back() != L'.' && name.back() != L' ' && !IsPcDeviceName(name);
-}
-
 }  // namespace
 
 std::wstring_view WithoutTrailingBackslashes(std::wstring_view path) {
@@ -61,6 +57,10 @@ bool IsPathComponent(std::wstring_view name) {
            std::none_of(name.begin(), name.end(), [](wchar_t unit) {
                return unit < L' ' || kForbidden.find(unit) != std::wstring_view::npos;
            });
+}
+
+bool IsSafePcName(std::wstring_view name) {
+    return IsPathComponent(name) && name.back() != L'.' && name.back() != L' ' && !IsPcDeviceName(name);
 }
 
 bool IsSafePcRelativePath(std::wstring_view relative) {

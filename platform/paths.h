@@ -31,9 +31,12 @@ std::wstring_view ParentPath(std::wstring_view path);
 // characters and of < > : " / \ | ? *. Names listed by a device are not trusted before they pass this.
 bool IsPathComponent(std::wstring_view name);
 
-// Whether every component of `relative` (with or without a leading "\") is the name of an ordinary file or
-// folder on the PC: a path component that does not end in a dot or a blank (the PC would strip it and mean
-// another file) and is not one of the PC's device names (CON, NUL, COM1 ..., with any extension).
+// Whether `name` can be that of an ordinary file or folder on the PC: a path component that does not end in a
+// dot or a blank (the PC would strip it and mean another file) and is not one of the PC's device names (CON,
+// NUL, COM1 ..., with any extension).
+bool IsSafePcName(std::wstring_view name);
+
+// Whether every component of `relative` (with or without a leading "\") is such a name.
 bool IsSafePcRelativePath(std::wstring_view relative);
 
 }  // namespace orvane

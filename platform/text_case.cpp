@@ -33,6 +33,11 @@ const FoldTable& Folding() {
 
 }  // namespace
 
+bool SameIgnoringCase(wchar_t a, wchar_t b) {
+    const FoldTable& folding = Folding();
+    return folding[a] == folding[b];
+}
+
 bool EqualIgnoringCase(std::wstring_view a, std::wstring_view b) {
     const FoldTable& folding = Folding();
     return std::equal(a.begin(), a.end(), b.begin(), b.end(), [&folding](wchar_t left, wchar_t right) {

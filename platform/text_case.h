@@ -9,6 +9,7 @@
 
 namespace orvane {
 
+bool SameIgnoringCase(wchar_t a, wchar_t b);
 bool EqualIgnoringCase(std::wstring_view a, std::wstring_view b);
 
 // Equal texts, without regard to case, have equal hashes.

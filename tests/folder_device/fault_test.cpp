@@ -13,11 +13,17 @@ TEST_F(Fault, SettingsThatCannotBeUnderstoodOpenNoSession) {
         const wchar_t* name;
         const wchar_t* text;
     } cases[] = {
-        {L"CAPACITY", L"12k"},          {L"CLOCK_OFFSET", L"1.5"},
-        {L"CALL_DELAY", L"4294967296"}, {L"CONNECT_DELAY", L"Never"},
-        {L"REFUSE", L"CeWritFile=5"},   {L"REFUSE", L"CeWriteFile#3"},
-        {L"EXTRA_ENTRIES", L"\\Jobs"},  {L"EXTRA_ENTRIES", L"\\Jobs|a|hidden"},
-        {L"FOUND_NULL", L"2"},          {L"TRACE", L"Z:\\no\\such\\folder\\trace.txt"},
+        {L"CAPACITY", L"12k"},
+        {L"CLOCK_OFFSET", L"1.5"},
+        {L"CALL_DELAY", L"4294967296"},
+        {L"CONNECT_DELAY", L"Never"},
+        {L"REFUSE", L"CeWritFile=5"},
+        {L"REFUSE", L"CeWriteFile#3"},
+        {L"SHORT", L"CeCopyFile=5"},
+        {L"EXTRA_ENTRIES", L"\\Jobs"},
+        {L"EXTRA_ENTRIES", L"\\Jobs|a|hidden"},
+        {L"FOUND_NULL", L"2"},
+        {L"TRACE", L"Z:\\no\\such\\folder\\trace.txt"},
     };
     device_.CloseSessions();
     for (const auto& [name, text] : cases) {
@@ -72,6 +78,95 @@ TEST_F(Fault, AVanishedDeviceStaysAway) {
     device_.Clear(L"VANISH");
     EXPECT_EQ(Connect(), S_OK);
     EXPECT_TRUE(CeDeleteFile(L"\\a.txt"));
+}
+
+TEST_F(Fault, ASilentDeviceKeepsItsCallersWaiting) {
+    device_.Set(L"VANISH", L"1");
+    device_.Set(L"VANISH_DELAY", L"150");
+    Reconnect();
+    const ULONGLONG begin = GetTickCount64();
+    EXPECT_EQ(ErrorOf(CeCreateDirectory(L"\\a", nullptr)), DWORD{ERROR_DEVICE_NOT_CONNECTED});
+    EXPECT_GE(GetTickCount64() - begin, 140U);  // A clock of 10 ms may show a little less.
+    device_.CloseSessions();
+    rapi::InitRecord record{sizeof(rapi::InitRecord), nullptr, S_OK};
+    ASSERT_EQ(CeRapiInitEx(&record), S_OK);
+    EXPECT_EQ(WaitForSingleObject(record.init_event, 300), DWORD{WAIT_TIMEOUT});
+}
+
+TEST_F(Fault, ACallMayFallShortOrLoseItsReply) {
+    device_.Set(L"SHORT", L"CeWriteFile#2=3; CeReadFile@\\a.txt=2");
+    device_.Set(L"LOSE_REPLY",
+                L"CeWriteFile#3=1117;CeCreateFile@\\lost.txt=1117;CeFindAllFiles#1=5;CeReadFile#2=5");
+    Reconnect();
+    const HANDLE file = Open(L"\\a.txt", GENERIC_READ | GENERIC_WRITE, CREATE_NEW);
+    DWORD moved = 0;
+    for (const auto& [error, bytes] : {std::pair{0U, 5U}, {0U, 3U}, {1117U, 0U}, {0U, 5U}}) {
+        EXPECT_EQ(ErrorOf(CeWriteFile(file, "12345", 5, &moved, nullptr)), error);
+        EXPECT_EQ(moved, bytes);
+    }
+    CeSetFilePointer(file, 0, nullptr, FILE_BEGIN);
+    char bytes[8] = {};
+    for (const auto& [error, count] : {std::pair{0U, 2U}, {5U, 0U}, {0U, 2U}}) {
+        EXPECT_EQ(ErrorOf(CeReadFile(file, bytes, sizeof(bytes), &moved, nullptr)), error);
+        EXPECT_EQ(moved, count);
+    }
+    EXPECT_STREQ(bytes, "51") << "what the lost reply held is passed over";
+    EXPECT_EQ(ErrorOf(Open(L"\\lost.txt", GENERIC_WRITE, CREATE_NEW)), DWORD{ERROR_IO_DEVICE});
+    EXPECT_EQ(Names(L"\\*"), std::nullopt);
+    EXPECT_EQ(Names(L"\\*"), (StringList{L"a.txt", L"lost.txt"}));
+    device_.CloseSessions();
+    EXPECT_EQ(ReadTextFile(device_.PcPath(L"\\a.txt")), "123451231234512345");
+}
+
+TEST_F(Fault, TheCallOfThatNumberIsStruck) {
+    const struct {
+        const wchar_t* setting;
+        DWORD error;
+        StringList made;
+    } cases[] = {{L"FAIL_CALL", ERROR_ACCESS_DENIED, {L"1\\", L"3\\"}},
+                 {L"LOSE_CALL", ERROR_ACCESS_DENIED, {L"1\\", L"2\\", L"3\\"}}};
+    for (const auto& [setting, error, made] : cases) {
+        SCOPED_TRACE(::testing::PrintToString(setting));
+        device_.Set(setting, L"2");
+        Reconnect();
+        EXPECT_TRUE(CeCreateDirectory(L"\\1", nullptr));
+        EXPECT_EQ(ErrorOf(CeCreateDirectory(L"\\2", nullptr)), error);
+        EXPECT_TRUE(CeCreateDirectory(L"\\3", nullptr));
+        EXPECT_EQ(ListTree(device_.Root()), made);
+        device_.Clear(setting);
+        Reconnect();
+        for (const wchar_t* path : {L"\\1", L"\\2", L"\\3"}) {
+            CeRemoveDirectory(path);
+        }
+    }
+}
+
+// Runs in a child process only, with the settings that it inherits.
+TEST(FaultChild, DISABLED_MakesThreeFolders) {
+    rapi::InitRecord record{sizeof(rapi::InitRecord), nullptr, S_OK};
+    ASSERT_EQ(CeRapiInitEx(&record), S_OK);
+    for (const wchar_t* path : {L"\\1", L"\\2", L"\\3"}) {
+        CeCreateDirectory(path, nullptr);
+    }
+}
+
+TEST_F(Fault, TheProcessEndsBeforeTheCallOfThatNumber) {
+    device_.Set(L"END_PROCESS", L"2");
+    wchar_t program[MAX_PATH];
+    GetModuleFileNameW(nullptr, program, MAX_PATH);
+    std::wstring command = L"tests --gtest_also_run_disabled_tests --gtest_filter=FaultChild.*";
+    STARTUPINFOW start{};
+    start.cb = sizeof(start);
+    PROCESS_INFORMATION child{};
+    ASSERT_TRUE(CreateProcessW(program, command.data(), nullptr, nullptr, FALSE, 0, nullptr, nullptr, &start,
+                               &child));
+    EXPECT_EQ(WaitForSingleObject(child.hProcess, 20000), WAIT_OBJECT_0);
+    DWORD code = 0;
+    GetExitCodeProcess(child.hProcess, &code);
+    CloseHandle(child.hProcess);
+    CloseHandle(child.hThread);
+    EXPECT_EQ(code, 99U);
+    EXPECT_EQ(ListTree(device_.Root()), StringList{L"1\\"});
 }
 
 // The file beside the DLL, which the test must not find and does not leave behind.

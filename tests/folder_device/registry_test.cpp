@@ -11,9 +11,8 @@ TEST_F(DeviceRegistry, HasTheKeysAndValuesOfItsFile) {
         "[HKCU\\Software\\Maker]\r\n"
         "DataDirectory = \\My Documents\\J\xC3\xB6"
         "bs\r\n"
-        "Number=dword:0000002A\r\n"
-        "Bytes=hex:01 ff\r\n"
-        "Broken=hex:zz\r\n"
+        "Quoted=\" 7\"\r\n"
+        "@=unnamed\r\n"
         "[HKEY_LOCAL_MACHINE\\Ident]\r\n");
     Reconnect();
     HKEY key = nullptr;
@@ -24,32 +23,24 @@ TEST_F(DeviceRegistry, HasTheKeysAndValuesOfItsFile) {
     ASSERT_EQ(CeRegOpenKeyEx(HKEY_CURRENT_USER, L"Software", 0, 0, &above), 0);
     ASSERT_EQ(CeRegOpenKeyEx(above, L"Maker", 0, 0, &key), 0);
     EXPECT_EQ(CeRegCloseKey(above), 0);
-    const wchar_t folder[] = L"\\My Documents\\J\u00F6bs";
     const struct {
         const wchar_t* name;
-        DWORD type;
-        std::string data;
-    } cases[] = {
-        {L"datadirectory", REG_SZ, std::string(reinterpret_cast<const char*>(folder), sizeof(folder))},
-        {L"Number", REG_DWORD, std::string("\x2A\0\0\0", 4)},
-        {L"Bytes", REG_BINARY, "\x01\xFF"},
-    };
-    for (const auto& [name, type, data] : cases) {
+        std::wstring text;
+    } cases[] = {{L"datadirectory", L"\\My Documents\\J\u00F6bs"}, {L"Quoted", L" 7"}, {L"", L"unnamed"}};
+    for (const auto& [name, text] : cases) {
         SCOPED_TRACE(::testing::PrintToString(name));
-        std::string buffer(64, '?');
-        DWORD found_type = 99;
-        BYTE* const bytes = reinterpret_cast<BYTE*>(buffer.data());
-        DWORD size = static_cast<DWORD>(data.size() - 1);
-        EXPECT_EQ(CeRegQueryValueEx(key, name, nullptr, &found_type, bytes, &size), ERROR_MORE_DATA);
-        EXPECT_EQ(size, data.size());
-        EXPECT_EQ(buffer, std::string(64, '?'));
-        EXPECT_EQ(CeRegQueryValueEx(key, name, nullptr, &found_type, bytes, &size), 0);
-        EXPECT_EQ(found_type, type);
-        EXPECT_EQ(buffer.substr(0, size), data);
+        wchar_t buffer[64] = L"?";
+        BYTE* const bytes = reinterpret_cast<BYTE*>(buffer);
+        DWORD type = 99;
+        DWORD size = static_cast<DWORD>(text.size() * sizeof(wchar_t));  // No room for the terminator.
+        EXPECT_EQ(CeRegQueryValueEx(key, name, nullptr, &type, bytes, &size), ERROR_MORE_DATA);
+        EXPECT_EQ(size, (text.size() + 1) * sizeof(wchar_t));
+        EXPECT_STREQ(buffer, L"?");
+        EXPECT_EQ(CeRegQueryValueEx(key, name, nullptr, &type, bytes, &size), 0);
+        EXPECT_EQ(type, DWORD{REG_SZ});
+        EXPECT_EQ(buffer, text);
     }
-    for (const wchar_t* missing : {L"None", L"Broken"}) {
-        EXPECT_EQ(CeRegQueryValueEx(key, missing, nullptr, nullptr, nullptr, nullptr), ERROR_FILE_NOT_FOUND);
-    }
+    EXPECT_EQ(CeRegQueryValueEx(key, L"None", nullptr, nullptr, nullptr, nullptr), ERROR_FILE_NOT_FOUND);
 }
 
 }  // namespace

@@ -7,7 +7,7 @@
 #include <cstdint>
 #include <string>
 
-#include "folder_device/owned_handle.h"
+#include "platform/handles.h"
 
 namespace folder_device {
 
@@ -24,12 +24,12 @@ inline FILETIME DeviceNow(std::int64_t offset) {
 // Opens the file for its attributes only, which no share mode forbids, and by a handle of its own: times set
 // through a handle hold against later writes through that handle only.
 inline void StampNew(const std::wstring& pc_path, std::int64_t offset, bool written) {
-    const auto file = Own<OwnedHandle>(CreateFileW(
-        pc_path.c_str(), FILE_WRITE_ATTRIBUTES, FILE_SHARE_READ | FILE_SHARE_WRITE | FILE_SHARE_DELETE,
-        nullptr, OPEN_EXISTING, FILE_FLAG_BACKUP_SEMANTICS, nullptr));
+    const orvane::UniqueFile file(CreateFileW(pc_path.c_str(), FILE_WRITE_ATTRIBUTES,
+                                              FILE_SHARE_READ | FILE_SHARE_WRITE | FILE_SHARE_DELETE, nullptr,
+                                              OPEN_EXISTING, FILE_FLAG_BACKUP_SEMANTICS, nullptr));
     if (file) {
         const FILETIME now = DeviceNow(offset);
-        SetFileTime(file.get(), &now, &now, written && offset != 0 ? &now : nullptr);
+        SetFileTime(file.Get(), &now, &now, written && offset != 0 ? &now : nullptr);
     }
 }
 
