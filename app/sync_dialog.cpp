@@ -49,7 +49,7 @@ CWendlowDlg::CWendlowDlg()
       background_(CreateSolidBrush(kBackground)),
       icon_(LoadIconW(ResourceModule(), MAKEINTRESOURCEW(IDI_APPLICATION_ICON))),
       settings_(LoadSettings()) {
-    RefreshSettingsBlock(settings_, settings_block_);
+    settings_block_ = RefreshSettingsBlock(settings_);
 }
 
 bool CWendlowDlg::HasRunningWorker() const {
@@ -71,7 +71,7 @@ bool CWendlowDlg::OnInitDialog() {
 
     task_.reports.SetTarget(Handle(), WM_SYNC_NOTIFY);
 
-    if (settings_.start_file_view != 0) {
+    if (settings_.start_file_view) {
         // The program is a file viewer then; this dialog never comes into view.
         stay_hidden_ = true;
         OnFileView();
@@ -235,22 +235,10 @@ void CWendlowDlg::FillTask(JobTable pc, JobTable device) {
     task_.info_text.clear();
     task_.pc = {std::move(pc), std::wstring(WithoutTrailingBackslashes(settings_.sync_path_dt))};
     task_.device = {std::move(device), std::wstring(WithoutTrailingBackslashes(settings_.sync_path_ce))};
-    // Sync_img_files and Sync_all_files play no part in a synchronization: images go with the bitmaps.
-    task_.types = {.qvj = settings_.sync_qvj_files != 0,
-                   .tn3 = settings_.sync_tn3_files != 0,
-                   .rd3 = settings_.sync_rd3_files != 0,
-                   .pt3 = settings_.sync_pt3_files != 0,
-                   .ln3 = settings_.sync_ln3_files != 0,
-                   .jpg = settings_.sync_jpg_files != 0,
-                   .bmp = settings_.sync_bmp_files != 0,
-                   .img = settings_.sync_bmp_files != 0,
-                   .xml = settings_.sync_xml_files != 0,
-                   .tp3 = settings_.sync_tp3_files != 0,
-                   .wkf = settings_.sync_wkf_files != 0,
-                   .txt = settings_.sync_txt_files != 0};
-    task_.overwrite_old_files = settings_.overwrite_old_files != 0;
-    task_.overwrite_bkp = settings_.overwrite_bkp != 0;
-    task_.overwrite_warn = settings_.overwrite_warn != 0;
+    task_.types = SynchronizedTypes(settings_.types);
+    task_.overwrite_old_files = settings_.overwrite_old_files;
+    task_.overwrite_bkp = settings_.overwrite_bkp;
+    task_.overwrite_warn = settings_.overwrite_warn;
 }
 
 void CWendlowDlg::ShowStart() {
@@ -289,7 +277,7 @@ void CWendlowDlg::OnSettings() {
     if (auto saved = RunOptions(Handle(), settings_block_)) {
         settings_ = std::move(*saved);
     }
-    RefreshSettingsBlock(settings_, settings_block_);
+    settings_block_ = RefreshSettingsBlock(settings_);
 }
 
 // The view's settings come back in the block alone: what it stored in the registry reaches this dialog's own

@@ -9,6 +9,7 @@
 #include "device/file_copy.h"
 #include "platform/handles.h"
 #include "qelutils/xlate.h"
+#include "selection/copy_rules.h"
 #include "selection/entry_copy.h"
 #include "ui/dialog.h"
 

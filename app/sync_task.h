@@ -8,7 +8,7 @@
 #include <string>
 #include <string_view>
 
-#include "selection/copy_rules.h"
+#include "jobs/file_types.h"
 #include "selection/job_table.h"
 #include "ui/report_queue.h"
 
@@ -49,8 +49,7 @@ struct SyncTask {
     std::atomic<HANDLE> copy_cancel_event = nullptr;
     // Read by the worker before each row.
     std::atomic<bool> cancelled = false;
-    // The types that take part; ".img" files follow the bitmap setting in both passes.
-    FileTypes types;
+    FileTypes types;  // Those that take part.
     bool overwrite_old_files = false;
     bool overwrite_bkp = false;
     bool overwrite_warn = false;

@@ -16,15 +16,9 @@ namespace {
 // Runs the std::function that lParam points to on the window's thread.
 constexpr UINT kRunFunction = WM_APP + 100;
 
-SyncSettingsBlock BenchSettings() {
-    SyncSettingsBlock block;
-    RefreshSettingsBlock(LoadSettings(), block);
-    return block;
-}
-
 class MeasuredView : public CCeFileTransfDlg {
   public:
-    MeasuredView() : CCeFileTransfDlg(BenchSettings(), true, nullptr) {}
+    MeasuredView() : CCeFileTransfDlg(RefreshSettingsBlock(LoadSettings()), true, nullptr) {}
 
     bool IsReady() const { return ready_; }
     // The time that the last listing took from its delivery to the filled list.

@@ -33,29 +33,4 @@ bool ShouldSkipCopy(bool overwrite, const FILETIME& source_write_time, std::wstr
 // the side behind them.
 std::wstring ReplaceQuestion(std::wstring_view target_display, std::wstring_view source_display);
 
-// The file types that take part, one flag each.
-struct FileTypes {
-    bool qvj = false;
-    bool tn3 = false;
-    bool rd3 = false;
-    bool pt3 = false;
-    bool ln3 = false;
-    bool jpg = false;
-    bool bmp = false;
-    bool img = false;
-    bool xml = false;
-    bool tp3 = false;
-    bool wkf = false;
-    bool txt = false;
-};
-
-// Whether the last four characters of the name (the whole name if it has no more) are the extension, in any
-// case, of a type that takes part.
-bool PassesExtensionFilter(std::wstring_view name, const FileTypes& types);
-
-// Whether the name is that of a ".wkf" job file. The name without its four-character extension is then that
-// of the companion folder.
-bool HasCompanionFolder(std::wstring_view name);
-std::wstring_view CompanionFolder(std::wstring_view name);
-
 }  // namespace orvane

@@ -3,8 +3,8 @@
 #include "device/device_path.h"
 #include "device/ensure_folder.h"
 #include "device/folder_copy.h"
+#include "jobs/file_types.h"
 #include "platform/paths.h"
-#include "selection/copy_rules.h"
 #include "selection/job_table.h"
 
 namespace orvane {

@@ -1,7 +1,6 @@
 #include "settings/options_dialog.h"
 
 #include <algorithm>
-#include <array>
 
 #include "browse/browse_dialog.h"
 #include "browse/folder_dialog.h"
@@ -12,65 +11,33 @@ namespace orvane {
 
 namespace {
 
-using S = SyncSettings;
-
-struct Box {
-    int id;
-    std::int32_t S::*flag;
+// What a click on a type's box does to "All files.": the box of the type `read`, unticked, clears it; ticked
+// together with all others but the `overlooked`, it ticks it.
+struct AllFilesRule {
+    std::size_t read;
+    FileTypes overlooked;
 };
 
-// The type boxes in the order in which they stand in the dialog.
-enum Type : unsigned { kQvj, kTn3, kRd3, kPt3, kLn3, kJpg, kBmp, kImg, kXml, kTp3, kWkf, kTxt, kTypeCount };
-
-constexpr unsigned Bit(Type type) {
-    return 1U << type;
+// That the boxes differ is meant: the bitmaps' does nothing, those behind it overlook the bitmaps, and the
+// one for ".txt" looks at the ".wkf" box in place of itself.
+std::optional<AllFilesRule> RuleOf(std::size_t clicked) {
+    constexpr std::size_t kBmp = RowOfType(L".bmp");
+    constexpr std::size_t kTxt = RowOfType(L".txt");
+    if (clicked == kBmp) {
+        return std::nullopt;
+    }
+    const std::size_t read = clicked == kTxt ? RowOfType(L".wkf") : clicked;
+    return AllFilesRule{read, FileTypes().set(kBmp, clicked > kBmp).set(kTxt, clicked == kTxt)};
 }
-
-constexpr unsigned kEveryType = (1U << kTypeCount) - 1;
-constexpr unsigned kNoHandler = 0;
-
-// What a click on a type box does to "All files.": the box `own`, unticked, clears it; ticked together with
-// all of `required`, it ticks it. That the handlers differ, and that the one for ".txt" looks at the ".wkf"
-// box, is meant.
-struct TypeBox {
-    Box box;
-    Type own;
-    unsigned required;
-};
-
-constexpr std::array<TypeBox, kTypeCount> kTypeBoxes = {{
-    {{IDC_OPTIONS_QVJ, &S::sync_qvj_files}, kQvj, kEveryType},
-    {{IDC_OPTIONS_TN3, &S::sync_tn3_files}, kTn3, kEveryType},
-    {{IDC_OPTIONS_RD3, &S::sync_rd3_files}, kRd3, kEveryType},
-    {{IDC_OPTIONS_PT3, &S::sync_pt3_files}, kPt3, kEveryType},
-    {{IDC_OPTIONS_LN3, &S::sync_ln3_files}, kLn3, kEveryType},
-    {{IDC_OPTIONS_JPG, &S::sync_jpg_files}, kJpg, kEveryType},
-    {{IDC_OPTIONS_BMP, &S::sync_bmp_files}, kBmp, kNoHandler},
-    {{IDC_OPTIONS_IMG, &S::sync_img_files}, kImg, kEveryType & ~Bit(kBmp)},
-    {{IDC_OPTIONS_XML, &S::sync_xml_files}, kXml, kEveryType & ~Bit(kBmp)},
-    {{IDC_OPTIONS_TP3, &S::sync_tp3_files}, kTp3, kEveryType & ~Bit(kBmp)},
-    {{IDC_OPTIONS_WKF, &S::sync_wkf_files}, kWkf, kEveryType & ~Bit(kBmp)},
-    {{IDC_OPTIONS_TXT, &S::sync_txt_files}, kWkf, kEveryType & ~(Bit(kBmp) | Bit(kTxt))},
-}};
-
-constexpr std::array<Box, 5> kOtherBoxes = {{
-    {IDC_OPTIONS_ALL_FILES, &S::sync_all_files},
-    {IDC_OPTIONS_OVERWRITE, &S::overwrite_old_files},
-    {IDC_OPTIONS_WARN, &S::overwrite_warn},
-    {IDC_OPTIONS_BACKUP, &S::overwrite_bkp},
-    {IDC_OPTIONS_START_FILE_VIEW, &S::start_file_view},
-}};
 
 // Matches no file, so that only folders are listed.
 constexpr const wchar_t* kNoFilePattern = L"*.asdfdfsasdf";
 
 SyncSettings InitialValues(const SyncSettingsBlock& block) {
     SyncSettings values = SettingsOf(block);
-    if (values.overwrite_old_files == 0) {
-        values.overwrite_warn = 0;
-        values.overwrite_bkp = 0;
-    }
-    values.start_file_view = ReadStartFileView() ? 1 : 0;
+    values.overwrite_warn &= values.overwrite_old_files;
+    values.overwrite_bkp &= values.overwrite_old_files;
+    values.start_file_view = ReadStartFileView();
     return values;
 }
 
@@ -79,17 +46,19 @@ SyncSettings InitialValues(const SyncSettingsBlock& block) {
 COptionsDlg::COptionsDlg(const SyncSettingsBlock& block, HWND parent)
     : Dialog(IDD_OPTIONS, parent),
       values_(InitialValues(block)),
-      auto_start_at_start_(ReadAutoStart() ? 1 : 0),
+      auto_start_at_start_(ReadAutoStart()),
       auto_start_(auto_start_at_start_) {}
 
 void COptionsDlg::DoDataExchange(ui::DataExchange& exchange) {
     exchange.Text(IDC_OPTIONS_PC_FOLDER, values_.sync_path_dt);
     exchange.Text(IDC_OPTIONS_DEVICE_FOLDER, values_.sync_path_ce);
-    for (const TypeBox& type : kTypeBoxes) {
-        exchange.Check(type.box.id, values_.*type.box.flag);
+    for (std::size_t row = 0; row < kFileTypes.size(); ++row) {
+        bool takes_part = values_.types[row];
+        exchange.Check(kFileTypes[row].box, takes_part);
+        values_.types[row] = takes_part;
     }
-    for (const Box& box : kOtherBoxes) {
-        exchange.Check(box.id, values_.*box.flag);
+    for (const FlagSetting& setting : kFlagSettings) {
+        exchange.Check(setting.box, values_.*setting.flag);
     }
     exchange.Check(IDC_OPTIONS_AUTO_START, auto_start_);
 }
@@ -114,11 +83,11 @@ bool COptionsDlg::OnClicked(int id) {
             return true;
         case IDC_OPTIONS_SELECT_ALL:
             UpdateData(true);  // Showing the values must not undo what was typed.
-            TickAllTypes(1);
+            TickAllTypes(true);
             return true;
         case IDC_OPTIONS_ALL_FILES:
             UpdateData(true);
-            TickAllTypes(values_.sync_all_files);
+            TickAllTypes(values_.all_files);
             return true;
         case IDC_OPTIONS_OVERWRITE:
             OnOverwrite();
@@ -129,43 +98,38 @@ bool COptionsDlg::OnClicked(int id) {
 }
 
 bool COptionsDlg::OnTypeBox(int id) {
-    const auto* type = std::find_if(kTypeBoxes.begin(), kTypeBoxes.end(),
-                                    [id](const TypeBox& candidate) { return candidate.box.id == id; });
-    if (type == kTypeBoxes.end() || type->required == kNoHandler) {
+    const auto type = std::ranges::find(kFileTypes, id, &FileType::box);
+    if (type == kFileTypes.end()) {
+        return false;
+    }
+    const auto rule = RuleOf(static_cast<std::size_t>(type - kFileTypes.begin()));
+    if (!rule) {
         return false;
     }
     UpdateData(true);
-    unsigned ticked = 0;
-    for (unsigned i = 0; i < kTypeCount; ++i) {
-        ticked |= (values_.*kTypeBoxes[i].box.flag != 0 ? 1U : 0U) << i;
-    }
-    if ((ticked & Bit(type->own)) == 0) {
-        values_.sync_all_files = 0;
-    } else if ((ticked & type->required) == type->required) {
-        values_.sync_all_files = 1;
+    if (!values_.types[rule->read]) {
+        values_.all_files = false;
+    } else if ((values_.types | rule->overlooked).all()) {
+        values_.all_files = true;
     }
     UpdateData(false);
     return true;
 }
 
-void COptionsDlg::TickAllTypes(std::int32_t value) {
-    for (const TypeBox& type : kTypeBoxes) {
-        values_.*type.box.flag = value;
-    }
+void COptionsDlg::TickAllTypes(bool tick) {
+    values_.types = tick ? FileTypes().set() : FileTypes();
     UpdateData(false);
 }
 
 void COptionsDlg::OnOverwrite() {
     UpdateData(true);
-    if (values_.overwrite_old_files == 0) {
-        values_.overwrite_bkp = 0;  // The warn box keeps its tick.
-    }
+    values_.overwrite_bkp &= values_.overwrite_old_files;  // The warn box keeps its tick.
     EnableOverwriteBoxes();
     UpdateData(false);
 }
 
 void COptionsDlg::EnableOverwriteBoxes() {
-    const BOOL enable = values_.overwrite_old_files != 0;
+    const BOOL enable = values_.overwrite_old_files;
     EnableWindow(Item(IDC_OPTIONS_WARN), enable);
     EnableWindow(Item(IDC_OPTIONS_BACKUP), enable);
 }

@@ -3,7 +3,6 @@
 
 #include <windows.h>
 
-#include <cstdint>
 #include <optional>
 
 #include "settings/settings_store.h"
@@ -21,7 +20,7 @@ class COptionsDlg : public ui::Dialog {
     const SyncSettings& Values() const { return values_; }
     // Whether the program is to start when a device connects: the box after OK, the entry as it was found
     // after Cancel.
-    bool AutoStart() const { return auto_start_ != 0; }
+    bool AutoStart() const { return auto_start_; }
 
   protected:
     bool OnInitDialog() override;
@@ -32,14 +31,14 @@ class COptionsDlg : public ui::Dialog {
   private:
     bool OnTypeBox(int id);
     void OnOverwrite();
-    void TickAllTypes(std::int32_t value);
+    void TickAllTypes(bool tick);
     void EnableOverwriteBoxes();
     void OnBrowseDevice();
     void OnBrowsePc();
 
     SyncSettings values_;
-    const std::int32_t auto_start_at_start_;
-    std::int32_t auto_start_;
+    const bool auto_start_at_start_;
+    bool auto_start_;
 };
 
 // Runs the options dialog on the block. After OK all settings are written and returned; after OK and Cancel

@@ -2,6 +2,7 @@
 
 #include <shlobj.h>
 
+#include <algorithm>
 #include <array>
 
 #include "device/connect.h"
@@ -9,7 +10,6 @@
 #include "platform/handles.h"
 #include "platform/paths.h"
 #include "platform/resources.h"
-#include "res/ids.h"
 #include "settings/registry_strings.h"
 
 namespace orvane {
@@ -24,43 +24,62 @@ constexpr std::size_t kModuleNameChars = 512;
 constexpr std::array<UINT, 3> kDeviceFolders = {IDS_DEVICE_FOLDER_1, IDS_DEVICE_FOLDER_2,
                                                 IDS_DEVICE_FOLDER_3};
 
-struct FlagSetting {
-    UINT name_id;
-    bool on_when_missing;
-    std::int32_t SyncSettings::*flag;
-    std::wstring SyncSettingsBlock::*text;  // Null for the one that the block leaves out.
+// A flag as the registry and the block hold it: a file type or another setting.
+struct StoredFlag {
+    UINT setting = 0;
+    bool on_when_missing = false;
+    std::size_t type = 0;                // The row of the type,
+    bool SyncSettings::*flag = nullptr;  // unless this is set.
+
+    bool Get(const SyncSettings& settings) const {
+        return flag != nullptr ? settings.*flag : settings.types[type];
+    }
+    void Set(SyncSettings& settings, bool on) const {
+        if (flag != nullptr) {
+            settings.*flag = on;
+        } else {
+            settings.types[type] = on;
+        }
+    }
 };
 
-using S = SyncSettings;
-using B = SyncSettingsBlock;
+// In the order in which they are read: the other flags stand behind the bitmaps, the last of the types that
+// there were when they came.
+constexpr auto kReadOrder = [] {
+    std::array<StoredFlag, kFileTypes.size() + kFlagSettings.size()> order{};
+    auto next = order.begin();
+    for (std::size_t row = 0; row < kFileTypes.size(); ++row) {
+        *next++ = {kFileTypes[row].setting, kFileTypes[row].on_when_missing, row};
+        if (row == RowOfType(L".bmp")) {
+            for (const FlagSetting& setting : kFlagSettings) {
+                *next++ = {.setting = setting.setting, .flag = setting.flag};
+            }
+        }
+    }
+    return order;
+}();
 
-// In the order in which they are written.
-constexpr std::array<FlagSetting, 17> kFlags = {{
-    {IDS_SYNC_QVJ_FILES, true, &S::sync_qvj_files, &B::sync_qvj_files},
-    {IDS_SYNC_TN3_FILES, false, &S::sync_tn3_files, &B::sync_tn3_files},
-    {IDS_SYNC_RD3_FILES, false, &S::sync_rd3_files, &B::sync_rd3_files},
-    {IDS_SYNC_PT3_FILES, false, &S::sync_pt3_files, &B::sync_pt3_files},
-    {IDS_SYNC_LN3_FILES, false, &S::sync_ln3_files, &B::sync_ln3_files},
-    {IDS_SYNC_JPG_FILES, false, &S::sync_jpg_files, &B::sync_jpg_files},
-    {IDS_SYNC_BMP_FILES, false, &S::sync_bmp_files, &B::sync_bmp_files},
-    {IDS_SYNC_ALL_FILES, false, &S::sync_all_files, &B::sync_all_files},
-    {IDS_OVERWRITE_OLD_FILES, false, &S::overwrite_old_files, &B::overwrite_old_files},
-    {IDS_OVERWRITE_BKP, false, &S::overwrite_bkp, &B::overwrite_bkp},
-    {IDS_OVERWRITE_WARN, false, &S::overwrite_warn, &B::overwrite_warn},
-    {IDS_START_FILE_VIEW, false, &S::start_file_view, nullptr},
-    {IDS_SYNC_IMG_FILES, false, &S::sync_img_files, &B::sync_img_files},
-    {IDS_SYNC_XML_FILES, false, &S::sync_xml_files, &B::sync_xml_files},
-    {IDS_SYNC_TP3_FILES, false, &S::sync_tp3_files, &B::sync_tp3_files},
-    {IDS_SYNC_WKF_FILES, true, &S::sync_wkf_files, &B::sync_wkf_files},
-    {IDS_SYNC_TXT_FILES, false, &S::sync_txt_files, &B::sync_txt_files},
-}};
+// The order in which they are written and stand in the block has the backup before the warning; that the two
+// orders differ is meant.
+constexpr auto kWriteOrder = [] {
+    auto order = kReadOrder;
+    const auto find = [&order](UINT setting) {
+        return std::ranges::find(order, setting, &StoredFlag::setting);
+    };
+    std::iter_swap(find(IDS_OVERWRITE_WARN), find(IDS_OVERWRITE_BKP));
+    return order;
+}();
 
-// The order in which they are read has the backup and the warning the other way round.
-constexpr std::array<std::size_t, kFlags.size()> kReadOrder = {0,  1, 2,  3,  4,  5,  6,  7, 8,
-                                                               10, 9, 11, 12, 13, 14, 15, 16};
+constexpr bool IsInBlock(const StoredFlag& stored) {
+    return stored.setting != IDS_START_FILE_VIEW;
+}
 
-std::wstring FlagText(std::int32_t flag) {
-    return flag == 1 ? L"1" : L"0";
+std::wstring FlagText(bool on) {
+    return on ? L"1" : L"0";
+}
+
+bool IsOn(const std::wstring& text) {
+    return text == L"1";
 }
 
 bool ReadSetting(UINT name_id, std::wstring& text) {
@@ -128,14 +147,13 @@ SyncSettings LoadSettings() {
     SyncSettings settings;
     settings.sync_path_dt = LoadPcFolder();
     settings.sync_path_ce = LoadDeviceFolder();
-    for (const std::size_t index : kReadOrder) {
-        const FlagSetting& setting = kFlags[index];
+    for (const StoredFlag& stored : kReadOrder) {
         std::wstring text;
-        if (!ReadSetting(setting.name_id, text)) {
-            text = setting.on_when_missing ? L"1" : L"0";
-            WriteSetting(setting.name_id, text);
+        if (!ReadSetting(stored.setting, text)) {
+            text = FlagText(stored.on_when_missing);
+            WriteSetting(stored.setting, text);
         }
-        settings.*setting.flag = IsOn(text) ? 1 : 0;
+        stored.Set(settings, IsOn(text));
     }
     return settings;
 }
@@ -150,27 +168,29 @@ void SaveSettings(SyncSettings& settings) {
         settings.sync_path_ce = with_one_backslash(settings.sync_path_ce);
         WriteSetting(IDS_SYNC_PATH_CE, settings.sync_path_ce);
     }
-    for (const FlagSetting& setting : kFlags) {
-        WriteSetting(setting.name_id, FlagText(settings.*setting.flag));
+    for (const StoredFlag& stored : kWriteOrder) {
+        WriteSetting(stored.setting, FlagText(stored.Get(settings)));
     }
 }
 
-void RefreshSettingsBlock(const SyncSettings& settings, SyncSettingsBlock& block) {
-    block.sync_path_dt = settings.sync_path_dt;
-    block.sync_path_ce = settings.sync_path_ce;
-    for (const FlagSetting& setting : kFlags) {
-        if (setting.text != nullptr) {
-            block.*setting.text = FlagText(settings.*setting.flag);
+SyncSettingsBlock RefreshSettingsBlock(const SyncSettings& settings) {
+    SyncSettingsBlock block{settings.sync_path_dt, settings.sync_path_ce};
+    auto text = block.begin() + 2;
+    for (const StoredFlag& stored : kWriteOrder) {
+        if (IsInBlock(stored)) {
+            *text++ = FlagText(stored.Get(settings));
         }
     }
+    return block;
 }
 
 SyncSettings SettingsOf(const SyncSettingsBlock& block) {
-    SyncSettings settings;
-    settings.sync_path_dt = block.sync_path_dt;
-    settings.sync_path_ce = block.sync_path_ce;
-    for (const FlagSetting& setting : kFlags) {
-        settings.*setting.flag = setting.text != nullptr && IsOn(block.*setting.text) ? 1 : 0;
+    SyncSettings settings{.sync_path_dt = block[0], .sync_path_ce = block[1], .types = {}};
+    auto text = block.begin() + 2;
+    for (const StoredFlag& stored : kWriteOrder) {
+        if (IsInBlock(stored)) {
+            stored.Set(settings, IsOn(*text++));
+        }
     }
     return settings;
 }

@@ -5,60 +5,46 @@
 
 #include <windows.h>
 
-#include <cstdint>
+#include <array>
 #include <string>
+
+#include "jobs/file_types.h"
 
 namespace orvane {
 
-// The settings in memory. A flag is 1 for on, 0 for off.
+// The settings in memory.
 struct SyncSettings {
     std::wstring sync_path_dt;  // PC job folder.
     std::wstring sync_path_ce;  // Device job folder; empty when no device was attached at the start.
-    std::int32_t sync_qvj_files = 0;
-    std::int32_t sync_tn3_files = 0;
-    std::int32_t sync_rd3_files = 0;
-    std::int32_t sync_pt3_files = 0;
-    std::int32_t sync_ln3_files = 0;
-    std::int32_t sync_jpg_files = 0;
-    std::int32_t sync_bmp_files = 0;
-    std::int32_t sync_all_files = 0;
-    std::int32_t sync_img_files = 0;
-    std::int32_t sync_xml_files = 0;
-    std::int32_t sync_tp3_files = 0;
-    std::int32_t sync_wkf_files = 0;
-    std::int32_t sync_txt_files = 0;
-    std::int32_t overwrite_old_files = 0;
-    std::int32_t start_file_view = 0;
-    std::int32_t overwrite_bkp = 0;
-    std::int32_t overwrite_warn = 0;
+    FileTypes types;            // Those that the user chose.
+    // The hidden box "All files." of the options dialog. No filter looks at it: that nothing but the types of
+    // the table is ever copied is meant.
+    bool all_files = false;
+    bool overwrite_old_files = false;
+    bool overwrite_warn = false;
+    bool overwrite_bkp = false;
+    bool start_file_view = false;
 };
 
-// The settings as texts, a flag as "1" or "0"; only the exact text "1" means on. Start_File_View is not
-// among them.
-struct SyncSettingsBlock {
-    std::wstring sync_path_dt;
-    std::wstring sync_path_ce;
-    std::wstring sync_qvj_files;
-    std::wstring sync_tn3_files;
-    std::wstring sync_rd3_files;
-    std::wstring sync_pt3_files;
-    std::wstring sync_ln3_files;
-    std::wstring sync_jpg_files;
-    std::wstring sync_bmp_files;
-    std::wstring sync_all_files;
-    std::wstring overwrite_old_files;
-    std::wstring overwrite_bkp;
-    std::wstring overwrite_warn;
-    std::wstring sync_img_files;
-    std::wstring sync_xml_files;
-    std::wstring sync_tp3_files;
-    std::wstring sync_wkf_files;
-    std::wstring sync_txt_files;
+// A setting besides folders and types, with its value in the registry and its box in the options dialog. It
+// is off when the registry does not say.
+struct FlagSetting {
+    UINT setting;
+    int box;
+    bool SyncSettings::*flag;
 };
 
-inline bool IsOn(const std::wstring& text) {
-    return text == L"1";
-}
+inline constexpr auto kFlagSettings = std::to_array<FlagSetting>({
+    {IDS_SYNC_ALL_FILES, IDC_OPTIONS_ALL_FILES, &SyncSettings::all_files},
+    {IDS_OVERWRITE_OLD_FILES, IDC_OPTIONS_OVERWRITE, &SyncSettings::overwrite_old_files},
+    {IDS_OVERWRITE_WARN, IDC_OPTIONS_WARN, &SyncSettings::overwrite_warn},
+    {IDS_OVERWRITE_BKP, IDC_OPTIONS_BACKUP, &SyncSettings::overwrite_bkp},
+    {IDS_START_FILE_VIEW, IDC_OPTIONS_START_FILE_VIEW, &SyncSettings::start_file_view},
+});
+
+// The settings as texts, to be handed to a dialog: the PC's folder, the device's, and each flag as "1" or
+// "0", in the order in which flags are written. Start_File_View is not among them.
+using SyncSettingsBlock = std::array<std::wstring, 2 + kFileTypes.size() + kFlagSettings.size() - 1>;
 
 // Reads all settings of the current user and writes back a default for every one that is missing. Opens a
 // device session for the device job folder, which may take as long as ConnectDevice waits: without a device
@@ -71,8 +57,9 @@ SyncSettings LoadSettings();
 // one from, and storing it would make the device's root the job folder. (The root itself is "\".)
 void SaveSettings(SyncSettings& settings);
 
-void RefreshSettingsBlock(const SyncSettings& settings, SyncSettingsBlock& block);
-// The other way round; Start_File_View, which the block leaves out, is off.
+SyncSettingsBlock RefreshSettingsBlock(const SyncSettings& settings);
+// The other way round; only the exact text "1" means on, and Start_File_View, which the block leaves out, is
+// off.
 SyncSettings SettingsOf(const SyncSettingsBlock& block);
 
 // Start_File_View as the registry holds it now.

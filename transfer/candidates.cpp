@@ -6,12 +6,11 @@
 #include "platform/file_time.h"
 #include "platform/text_case.h"
 #include "qelutils/text_format.h"
+#include "selection/copy_rules.h"
 
 namespace orvane {
 
 namespace {
-
-constexpr std::size_t kExtensionChars = 4;
 
 struct NameHash {
     std::size_t operator()(std::wstring_view name) const { return HashIgnoringCase(name); }
@@ -27,30 +26,6 @@ std::wstring DateText(const FILETIME& time) {
 }
 
 }  // namespace
-
-Comparison NewComparison(const SyncSettingsBlock& settings) {
-    Comparison comparison;
-    comparison.types = {
-        .qvj = IsOn(settings.sync_qvj_files),
-        .tn3 = IsOn(settings.sync_tn3_files),
-        .rd3 = IsOn(settings.sync_rd3_files),
-        .pt3 = IsOn(settings.sync_pt3_files),
-        .ln3 = IsOn(settings.sync_ln3_files),
-        .jpg = IsOn(settings.sync_jpg_files),
-        .bmp = IsOn(settings.sync_bmp_files),
-        .img = IsOn(settings.sync_img_files),
-        .xml = IsOn(settings.sync_xml_files),
-        .tp3 = IsOn(settings.sync_tp3_files),
-        .wkf = IsOn(settings.sync_wkf_files),
-        .txt = IsOn(settings.sync_txt_files),
-    };
-    comparison.overwrite_old_files = IsOn(settings.overwrite_old_files);
-    return comparison;
-}
-
-bool IsListedType(std::wstring_view name, const FileTypes& types) {
-    return name.size() > kExtensionChars && PassesExtensionFilter(name, types);
-}
 
 bool BuildCandidates(const Comparison& comparison, const JobTable& source, const JobTable& target,
                      std::vector<sFileDate>& candidates) {

@@ -6,9 +6,8 @@
 #include <vector>
 
 #include "controls/sorted_list_record.h"
-#include "selection/copy_rules.h"
+#include "jobs/file_types.h"
 #include "selection/job_table.h"
-#include "settings/settings_store.h"
 
 namespace orvane {
 
@@ -18,18 +17,12 @@ using sFileDate = SortedListRecord;
 
 // What the two lists are made from.
 struct Comparison {
-    JobTable pc;
-    JobTable device;
-    FileTypes types;           // Those that are listed; ".img" follows a flag of its own here.
+    JobTable pc{};
+    JobTable device{};
+    FileTypes types;           // Those that are listed.
     bool overwrite_old_files;  // Whether an older file on the other side may be replaced.
     bool stopped = false;      // Ends a build.
 };
-
-Comparison NewComparison(const SyncSettingsBlock& settings);
-
-// Whether a file of that name, taken without "\" in front, may be listed at all. A name of four characters
-// or fewer cannot carry an extension.
-bool IsListedType(std::wstring_view name, const FileTypes& types);
 
 // Collects into `candidates` (emptied first) the files of `source`, in its order and unticked, that would be
 // copied to the side of `target`. Both are tables of `comparison`. False when the build was stopped.

@@ -64,9 +64,9 @@ bool CCeFileTransfDlg::Page::AllTicked() const {
                        [](const sFileDate& entry) { return entry.ticked; });
 }
 
-CCeFileTransfDlg::CCeFileTransfDlg(SyncSettingsBlock settings, bool date_check_done, HWND parent)
+CCeFileTransfDlg::CCeFileTransfDlg(const SyncSettingsBlock& settings, bool date_check_done, HWND parent)
     : ui::Dialog(IDD_TRANSFER, parent),
-      settings_(std::move(settings)),
+      settings_(SettingsOf(settings)),
       date_check_done_(date_check_done),
       pages_{Page{.list_id = IDC_TRANSFER_PC_LIST,
                   .from_id = IDC_TRANSFER_PC_FROM,
@@ -226,7 +226,7 @@ void CCeFileTransfDlg::OnRefresh() {
 
 // False when the device was not read (the lists stay empty then) or a build was stopped.
 bool CCeFileTransfDlg::ReadListings() {
-    Comparison comparison = NewComparison(settings_);
+    Comparison comparison = {.types = settings_.types, .overwrite_old_files = settings_.overwrite_old_files};
     {
         FileNode device_root;
         if (!device_tree_.ReadDirectly(WithTrailingBackslash(settings_.sync_path_ce), {}, device_root,
@@ -275,7 +275,7 @@ void CCeFileTransfDlg::OnPageChanged(int number) {
     EnableItem(IDC_TRANSFER_COPY, has_items);
     EnableItem(page.all_id, has_items);
     if (!has_items) {
-        page.all_ticked = 0;
+        page.all_ticked = false;
         UpdateData(false);
     }
     EnableItem(IDC_TRANSFER_SYNCHRONIZE, AnyCandidates());
@@ -307,7 +307,7 @@ void CCeFileTransfDlg::OnListItemsDrawn(HWND list) {
     }
     UpdateData(true);
     for (Page& page : pages_) {
-        page.all_ticked = page.AllTicked() ? 1 : 0;
+        page.all_ticked = page.AllTicked();
     }
     EnableItem(IDC_TRANSFER_COPY, drawn->HasTicked());
     if (pages_[kPcPage].HasTicked() || pages_[kDevicePage].HasTicked()) {
@@ -319,13 +319,13 @@ void CCeFileTransfDlg::OnListItemsDrawn(HWND list) {
 void CCeFileTransfDlg::OnSelectAll(Page& page) {
     UpdateData(true);
     for (sFileDate& entry : page.candidates) {
-        entry.ticked = page.all_ticked != 0;
+        entry.ticked = page.all_ticked;
     }
     page.list.SetItems(page.candidates);
 }
 
 void CCeFileTransfDlg::OnSettings() {
-    SyncSettingsBlock changed = settings_;
+    SyncSettings changed = settings_;
     if (!RunOptions(changed)) {
         return;
     }
@@ -338,11 +338,9 @@ void CCeFileTransfDlg::OnSettings() {
     }
 }
 
-bool CCeFileTransfDlg::RunOptions(SyncSettingsBlock& settings) {
-    const auto saved = orvane::RunOptions(Handle(), settings);
-    if (saved) {
-        RefreshSettingsBlock(*saved, settings);
-    }
+bool CCeFileTransfDlg::RunOptions(SyncSettings& settings) {
+    const auto saved = orvane::RunOptions(Handle(), RefreshSettingsBlock(settings));
+    settings = saved.value_or(settings);
     return saved.has_value();
 }
 
@@ -399,14 +397,13 @@ bool CCeFileTransfDlg::CopyFiles(int number, const std::vector<std::wstring>& na
     Page& page = pages_[static_cast<std::size_t>(number)];
     const auto direction = static_cast<CopyDirection>(number);
     CopyProgress progress(direction);
-    const TransferOutcome outcome =
-        CopySelectedFiles({.direction = direction,
-                           .pc_folder = settings_.sync_path_dt,
-                           .device_folder = settings_.sync_path_ce,
-                           .names = names,
-                           .warn_before_replacing = IsOn(settings_.overwrite_warn),
-                           .stop_event = device_tree_.StopEvent()},
-                          progress);
+    const TransferOutcome outcome = CopySelectedFiles({.direction = direction,
+                                                       .pc_folder = settings_.sync_path_dt,
+                                                       .device_folder = settings_.sync_path_ce,
+                                                       .names = names,
+                                                       .warn_before_replacing = settings_.overwrite_warn,
+                                                       .stop_event = device_tree_.StopEvent()},
+                                                      progress);
     // Before anything can paint the list, which shows the entries where they lie.
     RemoveCandidates(page.candidates, outcome.copied);
     page.list.SetItems(page.candidates);
@@ -437,7 +434,7 @@ void CCeFileTransfDlg::FinishCopy(Page& page) {
     }
     EnableItem(page.all_id, has_items);
     if (!has_items) {
-        page.all_ticked = 0;
+        page.all_ticked = false;
     }
     UpdateData(false);
 }

@@ -27,10 +27,10 @@ inline constexpr UINT kListingReady = WM_USER + 1;
 class CCeFileTransfDlg : public ui::Dialog {
   public:
     // `date_check_done` leaves the clock check out.
-    CCeFileTransfDlg(SyncSettingsBlock settings, bool date_check_done, HWND parent);
+    CCeFileTransfDlg(const SyncSettingsBlock& settings, bool date_check_done, HWND parent);
 
     // The settings as they are now; the caller takes them back when the dialog has ended.
-    const SyncSettingsBlock& Settings() const { return settings_; }
+    SyncSettingsBlock Settings() const { return RefreshSettingsBlock(settings_); }
 
   protected:
     bool OnInitDialog() override;
@@ -39,7 +39,7 @@ class CCeFileTransfDlg : public ui::Dialog {
     void DoDataExchange(ui::DataExchange& exchange) override;
 
     // Lets the user change the settings and stores them. True when `settings` may have changed.
-    virtual bool RunOptions(SyncSettingsBlock& settings);
+    virtual bool RunOptions(SyncSettings& settings);
 
   private:
     // A page with its list. Its number is that of the tab and of the direction in which its files go.
@@ -50,7 +50,7 @@ class CCeFileTransfDlg : public ui::Dialog {
         int all_id;
         USortedListCtrl list{};
         std::vector<sFileDate> candidates{};
-        int all_ticked = 0;  // The "Select all file(s)" value.
+        bool all_ticked = false;  // The "Select all file(s)" value.
 
         bool HasTicked() const;
         bool AllTicked() const;
@@ -86,7 +86,7 @@ class CCeFileTransfDlg : public ui::Dialog {
     // EnableWindow, without leaving the keyboard focus on a disabled control.
     void EnableItem(int id, bool enable);
 
-    SyncSettingsBlock settings_;
+    SyncSettings settings_;
     const bool date_check_done_;
     DeviceTreeReader device_tree_;  // Its stop event serves all operations on the device.
     int current_page_ = -1;

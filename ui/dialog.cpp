@@ -41,11 +41,11 @@ void DataExchange::Text(int id, std::wstring& value) const {
     }
 }
 
-void DataExchange::Check(int id, int& value) const {
+void DataExchange::Check(int id, bool& value) const {
     if (save_) {
-        value = IsDlgButtonChecked(dialog_, id) == BST_CHECKED ? 1 : 0;
+        value = IsDlgButtonChecked(dialog_, id) == BST_CHECKED;
     } else {
-        CheckDlgButton(dialog_, id, value != 0 ? BST_CHECKED : BST_UNCHECKED);
+        CheckDlgButton(dialog_, id, value ? BST_CHECKED : BST_UNCHECKED);
     }
 }
 

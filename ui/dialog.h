@@ -16,8 +16,8 @@ class DataExchange {
     DataExchange(HWND dialog, bool save) : dialog_(dialog), save_(save) {}
 
     void Text(int id, std::wstring& value) const;
-    // A check box; 1 for ticked, 0 for not.
-    void Check(int id, int& value) const;
+    // A check box; true for ticked.
+    void Check(int id, bool& value) const;
 
   private:
     HWND dialog_;

@@ -6,7 +6,8 @@
 
 #include "app/application.h"
 #include "app/sync_dialog.h"
-#include "res/ids.h"
+#include "jobs/file_types.h"
+#include "platform/resources.h"
 #include "settings/registry_strings.h"
 
 namespace orvane::testing {
@@ -81,9 +82,8 @@ void SyncTest::SetUp() {
     MakeFolder(OnDevice(L""));
     Setting(L"SyncPath_DT", pc_.Path() + L"\\");
     Setting(L"SyncPath_CE", L"\\Jobs\\");
-    for (const wchar_t* type :
-         {L"qvj", L"tn3", L"rd3", L"pt3", L"ln3", L"jpg", L"bmp", L"img", L"xml", L"tp3", L"wkf", L"txt"}) {
-        Setting(std::wstring(L"Sync_") + type + L"_files", L"1");
+    for (const FileType& type : kFileTypes) {
+        Setting(ResourceString(type.setting), L"1");
     }
     Setting(L"Overwrite_old_files", L"1");
 }

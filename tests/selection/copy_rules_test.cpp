@@ -108,33 +108,5 @@ TEST(ShouldSkipCopy, AsksOnlyForWhatWouldBeReplaced) {
     }
 }
 
-TEST(ExtensionFilter, GivesEveryTypeAFlagOfItsOwn) {
-    using T = FileTypes;
-    const std::pair<const wchar_t*, bool T::*> types[] = {
-        {L"\\a.QVJ", &T::qvj},   {L"\\a.tn3", &T::tn3},      {L"\\x\\a.Rd3", &T::rd3},
-        {L"\\a.b.pt3", &T::pt3}, {L"\\\u00E4.lN3", &T::ln3}, {L"\\a.jpg", &T::jpg},
-        {L".bmp", &T::bmp},      {L"\\.img", &T::img},       {L"\\a.XML", &T::xml},
-        {L"\\a.tp3", &T::tp3},   {L"a.wkf", &T::wkf},        {L"\\a.qvj.txt", &T::txt}};
-    FileTypes all;
-    for (const auto& [own, flag] : types) {
-        FileTypes one;
-        one.*flag = all.*flag = true;
-        for (const auto& [name, other] : types) {
-            EXPECT_EQ(PassesExtensionFilter(name, one), flag == other) << own << " " << name;
-        }
-    }
-    for (const wchar_t* name : {L"", L"\\qvj", L"\\a.jpeg", L"\\a.qvj ", L"\\a.qvj.001", L"\\a.\u0131mg"}) {
-        EXPECT_FALSE(PassesExtensionFilter(name, all)) << name;
-    }
-}
-
-TEST(CompanionFolder, BelongsToJobFilesWithANameOnly) {
-    EXPECT_TRUE(HasCompanionFolder(L"\\x\\Job 1.WKF"));
-    EXPECT_EQ(CompanionFolder(L"\\x\\Job 1.WKF"), L"\\x\\Job 1");
-    for (const wchar_t* name : {L"\\Job.qvj", L"\\Jobwkf", L".wkf", L""}) {
-        EXPECT_FALSE(HasCompanionFolder(name)) << name;
-    }
-}
-
 }  // namespace
 }  // namespace orvane

@@ -1,7 +1,5 @@
 #include "settings/options_dialog.h"
 
-#include <bitset>
-
 #include "res/ids.h"
 #include "tests/settings/settings_values.h"
 #include "tests/support/dialog_script.h"
@@ -13,37 +11,20 @@ namespace {
 using testing::Press;
 
 const std::wstring kAutoStartKey = L"SOFTWARE\\Microsoft\\Windows CE Services\\AutoStartOnConnect";
-constexpr std::size_t kCount = kFlags.size();
+const Flags kAll = Named({L"Sync_all_files"});
+const Flags kOverwrite = Named({L"Overwrite_old_files"});
+const Flags kWarn = Named({L"Overwrite_warn"});
+const Flags kDependent = Named({L"Overwrite_warn", L"Overwrite_bkp"});
+const Flags kTypes = Those([](std::size_t i) { return i < kFileTypes.size(); });
 
-using Boxes = std::bitset<kCount>;
-
-template <class Condition>
-Boxes Those(Condition condition) {
-    Boxes boxes;
-    for (std::size_t i = 0; i < kCount; ++i) {
-        boxes[i] = condition(i);
-    }
-    return boxes;
-}
-
-Boxes Named(std::wstring_view names) {
-    return Those([&](std::size_t i) { return names.find(kFlags[i].name) != std::wstring_view::npos; });
-}
-
-const Boxes kAll = Named(L"all");
-const Boxes kOverwrite = Named(L"old");
-const Boxes kWarn = Named(L"warn");
-const Boxes kDependent = Named(L"warn bkp");
-const Boxes kTypes = Named(L"qvj tn3 rd3 pt3 ln3 jpg bmp img xml tp3 wkf txt");
-
-Boxes Ticked(HWND dialog) {
-    return Those([&](std::size_t i) { return IsDlgButtonChecked(dialog, kFlags[i].box) == BST_CHECKED; });
+Flags Ticked(HWND dialog) {
+    return Those([&](std::size_t i) { return IsDlgButtonChecked(dialog, BoxOf(i)) == BST_CHECKED; });
 }
 
 // Without telling the dialog.
-void Tick(HWND dialog, const Boxes& boxes) {
+void Tick(HWND dialog, const Flags& boxes) {
     for (std::size_t i = 0; i < kCount; ++i) {
-        CheckDlgButton(dialog, kFlags[i].box, boxes[i] ? BST_CHECKED : BST_UNCHECKED);
+        CheckDlgButton(dialog, BoxOf(i), boxes[i] ? BST_CHECKED : BST_UNCHECKED);
     }
 }
 
@@ -81,15 +62,14 @@ class OptionsDialog : public ::testing::Test {
     ~OptionsDialog() override { DestroyWindow(owner_); }
 
     // What the dialog begins with. It does not look at the folders that are stored.
-    void Set(const Boxes& ticked, const std::wstring& pc_folder = L"C:\\") {
-        SyncSettings stored{.sync_path_dt = L"C:\\stored", .sync_path_ce = L"\\stored"};
-        for (std::size_t i = 0; i < kCount; ++i) {
-            stored.*kFlags[i].flag = ticked[i] ? 1 : 0;
-        }
-        SaveSettings(stored);
-        RefreshSettingsBlock(stored, block_);
-        block_.sync_path_dt = pc_folder;
-        block_.sync_path_ce = L"\\Jobs\\";
+    void Set(const Flags& ticked, const std::wstring& pc_folder = L"C:\\") {
+        SyncSettings settings = With(ticked);
+        settings.sync_path_dt = L"C:\\stored";
+        settings.sync_path_ce = L"\\stored";
+        SaveSettings(settings);
+        settings.sync_path_dt = pc_folder;
+        settings.sync_path_ce = L"\\Jobs\\";
+        block_ = RefreshSettingsBlock(settings);
     }
     void Run(const std::function<void(HWND)>& script) {
         testing::RunWithScript([&] { return RunOptions(owner_, block_) ? IDOK : IDCANCEL; }, script);
@@ -102,60 +82,85 @@ class OptionsDialog : public ::testing::Test {
                                   GetModuleHandleW(nullptr), nullptr);
 };
 
-TEST_F(OptionsDialog, TypeBoxesDecideOnAllFiles) {
-    // Boxes with handlers of a kind, the box that these read if not the clicked one, the ones they overlook.
+TEST_F(OptionsDialog, TheBoxOfATypeDecidesOnAllFiles) {
+    // After a click: the boxes that are unticked, and what becomes of "All files." when it was on or off.
+    enum AllFiles { kCleared, kTicked, kLeft };
     const struct {
-        Boxes clicked, read, overlooked;
-    } handlers[] = {{Named(L"qvj tn3 rd3 pt3 ln3 jpg"), {}, {}},
-                    {Named(L"img xml tp3 wkf"), {}, Named(L"bmp")},
-                    {Named(L"txt"), Named(L"wkf"), Named(L"bmp txt")}};
+        const wchar_t* clicked;
+        std::vector<const wchar_t*> unticked;
+        AllFiles all;
+    } cases[] = {
+        {L".qvj", {}, kTicked},
+        {L".qvj", {L".qvj"}, kCleared},
+        {L".qvj", {L".bmp"}, kLeft},
+        {L".jpg", {}, kTicked},
+        {L".jpg", {L".jpg"}, kCleared},
+        {L".jpg", {L".bmp"}, kLeft},
+        {L".jpg", {L".txt"}, kLeft},
+        {L".bmp", {}, kLeft},
+        {L".bmp", {L".bmp"}, kLeft},
+        {L".img", {L".bmp"}, kTicked},
+        {L".img", {L".img"}, kCleared},
+        {L".img", {L".qvj"}, kLeft},
+        {L".wkf", {L".bmp"}, kTicked},
+        {L".wkf", {L".bmp", L".txt"}, kLeft},
+        {L".txt", {L".bmp", L".txt"}, kTicked},
+        {L".txt", {L".wkf"}, kCleared},
+        {L".txt", {L".tp3"}, kLeft},
+    };
+    const auto row = [](std::wstring_view extension) {
+        return static_cast<std::size_t>(std::ranges::find(kFileTypes, extension, &FileType::extension) -
+                                        kFileTypes.begin());
+    };
     COptionsDlg dialog(block_, owner_);
     ASSERT_TRUE(dialog.Create());
-    // Every type is clicked with any other one unticked or none, in all combinations with "All files.".
-    for (std::size_t run = 0; run < 4 * kCount * kCount; ++run) {
-        const std::size_t clicked = run / 4 / kCount;
-        const Boxes all_before = (run & 1U) != 0 ? kAll : Boxes();
-        const Boxes types = Boxes(kTypes).reset(run / 4 % kCount).set(clicked, (run & 2U) != 0);
-        Boxes all = all_before;
-        for (const auto& handler : handlers) {
-            if (handler.clicked[clicked]) {
-                const Boxes read = handler.read.any() ? handler.read : Boxes().set(clicked);
-                const bool ticks = (types | handler.overlooked) == kTypes;
-                all = (types & read).none() ? Boxes() : ticks ? kAll : all_before;
+    for (const auto& c : cases) {
+        for (const Flags& all_before : {kAll, Flags()}) {
+            Flags types = kTypes;
+            for (const wchar_t* unticked : c.unticked) {
+                types.reset(row(unticked));
             }
-        }
-        if (kTypes[clicked]) {
-            Tick(dialog.Handle(), (types | all_before).flip(clicked));
-            Click(dialog.Handle(), kFlags[clicked].box);
-            EXPECT_EQ(Ticked(dialog.Handle()), types | all) << kFlags[clicked].name << " " << all_before;
+            Tick(dialog.Handle(), (types | all_before).flip(row(c.clicked)));
+            Click(dialog.Handle(), BoxOf(row(c.clicked)));
+            const Flags all = c.all == kTicked ? kAll : c.all == kLeft ? all_before : Flags();
+            EXPECT_EQ(Ticked(dialog.Handle()), types | all) << (&c - cases);
         }
     }
 }
 
-TEST_F(OptionsDialog, SelectAllAndAllFilesTickEveryType) {
-    Set(Named(L"bmp") | kWarn | kOverwrite);
+TEST_F(OptionsDialog, EveryTypeHasABoxThatNamesIt) {
     COptionsDlg dialog(block_, owner_);
     ASSERT_TRUE(dialog.Create());
-    for (const Boxes& expected : {kTypes, kTypes | kAll, Boxes()}) {
+    for (const FileType& type : kFileTypes) {
+        EXPECT_EQ(testing::ItemText(dialog.Handle(), type.box),
+                  L"Copy *" + std::wstring(type.extension) + L" files.");
+    }
+}
+
+TEST_F(OptionsDialog, SelectAllAndAllFilesTickEveryType) {
+    Set(kWarn | kOverwrite);
+    COptionsDlg dialog(block_, owner_);
+    ASSERT_TRUE(dialog.Create());
+    for (const Flags& expected : {kTypes, kTypes | kAll, Flags()}) {
         Click(dialog.Handle(), expected == kTypes ? IDC_OPTIONS_SELECT_ALL : IDC_OPTIONS_ALL_FILES);
         EXPECT_EQ(Ticked(dialog.Handle()), expected | kWarn | kOverwrite);
     }
 }
 
 TEST_F(OptionsDialog, WarningAndBackupDependOnOverwriting) {
-    for (const Boxes& at_start : {kDependent, kDependent | kOverwrite}) {
+    for (const Flags& at_start : {kDependent, kDependent | kOverwrite}) {
         Set(at_start);
         COptionsDlg dialog(block_, owner_);
         ASSERT_TRUE(dialog.Create());
         bool on = at_start != kDependent;
-        EXPECT_EQ(Ticked(dialog.Handle()), on ? at_start : Boxes());
+        EXPECT_EQ(Ticked(dialog.Handle()), on ? at_start : Flags());
         for (int clicks = 0; clicks < 2; ++clicks, on = !on) {
             EXPECT_EQ(IsWindowEnabled(GetDlgItem(dialog.Handle(), IDC_OPTIONS_WARN)) != FALSE, on);
             EXPECT_EQ(IsWindowEnabled(GetDlgItem(dialog.Handle(), IDC_OPTIONS_BACKUP)) != FALSE, on);
             Click(dialog.Handle(), IDC_OPTIONS_OVERWRITE);
         }
         // Of two that were ticked the warning stays so.
-        EXPECT_EQ(Ticked(dialog.Handle()), on ? kWarn | kOverwrite : Boxes());
+        EXPECT_EQ(Ticked(dialog.Handle()), on ? kWarn | kOverwrite : Flags());
     }
 }
 
@@ -166,8 +171,8 @@ TEST_F(OptionsDialog, OkStoresAndCancelDoesNot) {
     for (std::size_t run = 0; run < 2 * kCount; ++run) {
         const bool ok = run % 2 == 0;
         const auto& [typed, stored] = folders[run / 2 % folders.size()];
-        const Boxes box = Boxes(1) << run / 2;
-        const Boxes ticked = (box & kDependent).any() ? box | kOverwrite : box;
+        const Flags box = Flags(1) << run / 2;
+        const Flags ticked = (box & kDependent).any() ? box | kOverwrite : box;
         Set(ticked);
         Run([&](HWND dialog) {
             EXPECT_EQ(Ticked(dialog), ticked);
@@ -176,8 +181,7 @@ TEST_F(OptionsDialog, OkStoresAndCancelDoesNot) {
             Tick(dialog, ticked ^ kOverwrite);
             Press(dialog, ok ? IDOK : IDCANCEL);
         });
-        const Boxes stored_boxes = Those([](std::size_t i) { return Stored(kFlags[i].value) == L"1"; });
-        EXPECT_EQ(stored_boxes, ok ? ticked ^ kOverwrite : ticked);
+        EXPECT_EQ(StoredFlags(), ok ? ticked ^ kOverwrite : ticked);
         EXPECT_EQ(Stored(L"SyncPath_DT"), ok ? L"C:\\typed\\" : L"C:\\stored\\");
         EXPECT_EQ(Stored(L"SyncPath_CE"), ok ? stored : L"\\stored\\");
     }
@@ -213,11 +217,11 @@ TEST_F(OptionsDialog, OnlyAChosenPcFolderDropsWhatWasTyped) {
     Run([&](HWND dialog) {
         const std::wstring& pc = pc_folder.Path();
         const std::wstring typed = L"C:\\a \\jobs\\north\\b";
-        const Boxes both = kWarn | kOverwrite;
+        const Flags both = kWarn | kOverwrite;
         const struct {
             int browse, button;
             std::wstring start, folders;
-            Boxes ticked;
+            Flags ticked;
         } runs[] = {{IDC_OPTIONS_PC_BROWSE, IDCANCEL, pc, typed, both},
                     {IDC_OPTIONS_PC_BROWSE, IDOK, pc, pc + L" \\Jobs\\", kOverwrite},
                     {IDC_OPTIONS_DEVICE_BROWSE, IDCANCEL, L"\\Jobs\\North\\", typed, both},

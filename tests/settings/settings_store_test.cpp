@@ -1,3 +1,4 @@
+#include <gmock/gmock.h>
 #include <shlobj.h>
 
 #include "tests/settings/settings_values.h"
@@ -19,45 +20,38 @@ TEST_F(SettingsStore, WritesTheDefaultsAtTheFirstStart) {
     EXPECT_EQ(LoadSettings().sync_path_dt, folder);
     EXPECT_EQ(Stored(L"SyncPath_DT"), folder);
     EXPECT_EQ(Stored(L"SyncPath_CE"), L"(none)");
-    for (const Flag& flag : kFlags) {
-        const bool on =
-            flag.flag == &SyncSettings::sync_qvj_files || flag.flag == &SyncSettings::sync_wkf_files;
-        EXPECT_EQ(Stored(flag.value), on ? L"1" : L"0") << flag.name;
-    }
+    EXPECT_EQ(StoredFlags(), Named({L"Sync_qvj_files", L"Sync_wkf_files"}));
+    EXPECT_EQ(Stored(L"Sync_txt_files"), L"0");
 }
 
 TEST_F(SettingsStore, KeepsEveryFlagInAValueAndATextOfItsOwn) {
-    for (const Flag& on : kFlags) {
-        SyncSettings saved;
-        saved.*on.flag = 1;
+    const Flags no_text = Named({L"Start_File_View"});
+    for (std::size_t i = 0; i < kCount; ++i) {
+        const Flags on = Flags().set(i);
+        SyncSettings saved = With(on);
         SaveSettings(saved);
-        const SyncSettings loaded = LoadSettings();
-        SyncSettingsBlock block;
-        RefreshSettingsBlock(loaded, block);
-        const std::wstring* text = &block.sync_qvj_files;
-        for (const Flag& flag : kFlags) {
-            const bool is_on = on.flag == flag.flag;
-            EXPECT_EQ(Stored(flag.value), is_on ? L"1" : L"0") << on.name << " " << flag.name;
-            EXPECT_EQ(loaded.*flag.flag, is_on ? 1 : 0) << on.name << " " << flag.name;
-            if (flag.flag != &SyncSettings::start_file_view) {
-                EXPECT_EQ(*text++, is_on ? L"1" : L"0") << on.name << " " << flag.name;
-            }
-        }
+        EXPECT_EQ(StoredFlags(), on) << ValueOf(i);
+        EXPECT_EQ(FlagsOf(LoadSettings()), on) << ValueOf(i);
+        EXPECT_EQ(FlagsOf(SettingsOf(RefreshSettingsBlock(saved))), on & ~no_text) << ValueOf(i);
     }
+    const SyncSettingsBlock block = RefreshSettingsBlock(With(Named(
+        {L"Sync_bmp_files", L"Sync_all_files", L"Overwrite_bkp", L"Sync_img_files", L"Sync_txt_files"})));
+    EXPECT_THAT(block, ::testing::ElementsAre(L"", L"", L"0", L"0", L"0", L"0", L"0", L"0", L"1", L"1", L"0",
+                                              L"1", L"0", L"1", L"0", L"0", L"0", L"1"));
 }
 
 TEST_F(SettingsStore, TakesOnlyTheTextOneForOnAndReplacesWhatCannotBeRead) {
     for (const wchar_t* text : {L"true", L" 1", L"11", L"2", L""}) {
         Store(L"Sync_qvj_files", text);
         Store(L"Start_File_View", text);
-        EXPECT_EQ(LoadSettings().sync_qvj_files, 0) << text;
+        EXPECT_FALSE(LoadSettings().types[RowOfType(L".qvj")]) << text;
         EXPECT_FALSE(ReadStartFileView()) << text;
         EXPECT_EQ(Stored(L"Sync_qvj_files"), text) << "not a missing value";
     }
     Store(L"SyncPath_DT", std::wstring(509, L'x'));
     EXPECT_EQ(LoadSettings().sync_path_dt, std::wstring(509, L'x'));
     Store(L"Sync_qvj_files", std::wstring(510, L'1'));
-    EXPECT_EQ(LoadSettings().sync_qvj_files, 1);
+    EXPECT_TRUE(LoadSettings().types[RowOfType(L".qvj")]);
     EXPECT_EQ(Stored(L"Sync_qvj_files"), L"1");
 }
 

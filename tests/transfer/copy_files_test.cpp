@@ -65,7 +65,7 @@ TEST_F(TransferTest, CopyAllTakesTheTickedAndSynchronizeEverything) {
 }
 
 TEST_F(TransferTest, ReplacesOnlyWhatTheUserAllows) {
-    settings_.overwrite_warn = L"1";
+    settings_.overwrite_warn = true;
     PutOnPc(L"close.qvj", 10);
     PutOnPc(L"kept.qvj", 11);
     PutOnPc(L"new.qvj", 11);

@@ -4,7 +4,6 @@
 namespace orvane::testing {
 
 TEST_F(TransferTest, ListsWhatEachSideLacks) {
-    settings_.sync_img_files = L"1";
     for (const wchar_t* name : {L"new.qvj", L"notes.doc", L".qvj", L"picture.bmp", L"picture.IMG"}) {
         PutOnPc(name);
     }
@@ -20,7 +19,7 @@ TEST_F(TransferTest, ListsWhatEachSideLacks) {
         EXPECT_EQ(run.Column(IDC_TRANSFER_PC_LIST, 2), (Names{L"1", L"1", L"1"}));
         EXPECT_EQ(run.Column(IDC_TRANSFER_DEVICE_LIST), (Names{L"a.TN3", L"Job1\\pic.jpg"}));
     }
-    settings_.overwrite_old_files = L"0";
+    settings_.overwrite_old_files = false;
     const TransferRun run(settings_);
     EXPECT_EQ(run.Column(IDC_TRANSFER_PC_LIST), (Names{L"new.qvj", L"picture.IMG"}));
 }
@@ -85,7 +84,7 @@ TEST_F(TransferTest, NewFoldersAreListedAtOnce) {
     TempFolder other;
     WriteTextFile(other / L"b.qvj", "");
     bool accept = false;
-    const TransferRun run(settings_, true, [&](SyncSettingsBlock& settings) {
+    const TransferRun run(settings_, true, [&](SyncSettings& settings) {
         settings.sync_path_dt = other.Path() + L"\\";
         return accept;
     });

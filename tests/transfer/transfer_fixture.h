@@ -24,13 +24,15 @@ namespace orvane::testing {
 
 using Names = std::vector<std::wstring>;
 // Stands for the options dialog.
-using Options = std::function<bool(SyncSettingsBlock&)>;
+using Options = std::function<bool(SyncSettings&)>;
 
 class TestedDialog : public CCeFileTransfDlg {
   public:
-    TestedDialog(const SyncSettingsBlock& settings, bool date_check_done, Options options,
+    TestedDialog(const SyncSettings& settings, bool date_check_done, Options options,
                  std::atomic<HWND>& opened)
-        : CCeFileTransfDlg(settings, date_check_done, nullptr), options_(options), opened_(opened) {}
+        : CCeFileTransfDlg(RefreshSettingsBlock(settings), date_check_done, nullptr),
+          options_(options),
+          opened_(opened) {}
 
   protected:
     bool OnInitDialog() override {
@@ -38,7 +40,7 @@ class TestedDialog : public CCeFileTransfDlg {
         opened_ = Handle();
         return set_focus;
     }
-    bool RunOptions(SyncSettingsBlock& settings) override { return options_(settings); }
+    bool RunOptions(SyncSettings& settings) override { return options_(settings); }
 
   private:
     const Options options_;
@@ -49,7 +51,7 @@ class TestedDialog : public CCeFileTransfDlg {
 class TransferRun {
   public:
     // Starts the dialog and returns when its lists are filled or it has ended.
-    explicit TransferRun(const SyncSettingsBlock& settings, bool date_check_done = true, Options options = {})
+    explicit TransferRun(const SyncSettings& settings, bool date_check_done = true, Options options = {})
         : thread_([=, this] {
               TestedDialog dialog(settings, date_check_done, options, window_);
               result_ = dialog.DoModal();
@@ -125,8 +127,8 @@ class TransferTest : public ::testing::Test {
         MakeFolder(OnDevice(L""));
         settings_.sync_path_dt = pc_.Path() + L"\\";
         settings_.sync_path_ce = L"\\Jobs\\";
-        settings_.sync_qvj_files = settings_.sync_tn3_files = settings_.sync_jpg_files = L"1";
-        settings_.sync_wkf_files = settings_.sync_txt_files = settings_.overwrite_old_files = L"1";
+        settings_.types.set().reset(RowOfType(L".bmp"));
+        settings_.overwrite_old_files = true;
     }
 
     std::wstring OnPc(const std::wstring& name) const { return pc_ / name; }
@@ -141,7 +143,7 @@ class TransferTest : public ::testing::Test {
 
     FolderDevice device_;
     TempFolder pc_;
-    SyncSettingsBlock settings_;
+    SyncSettings settings_;
     const FILETIME noon_ = UtcTime(2024, 3, 1, 12);
 };
 
