@@ -1,7 +1,8 @@
 // The device's registry, read only: a text file of sections (ini_text.h), one for each key, named by its full
 // path below HKEY_CURRENT_USER or HKEY_LOCAL_MACHINE (or HKCU and HKLM), with a line for each value. Values
 // are texts, REG_SZ, given out with their terminator; one in double quotes loses these and is taken as it
-// stands. The value without a name is "@". A file that cannot be read is an empty registry.
+// stands, one with the opening quote only is kept without a terminator, as a device may. The value without a
+// name is "@". A file that cannot be read is an empty registry.
 //
 // The functions answer the error itself and set it as the device error.
 #include <algorithm>
@@ -57,14 +58,18 @@ bool HasKey(const IniText& registry, std::wstring_view key) {
     });
 }
 
+// The text with the terminator that it is kept with.
 std::optional<std::wstring> FindText(const KeyObject& key, std::wstring_view name) {
     for (const IniSection& section : *key.registry) {
         if (!orvane::EqualIgnoringCase(section.name, key.path)) {
             continue;
         }
         if (const std::optional<std::wstring> text = FindValue(section, name)) {
-            const bool quoted = text->size() >= 2 && text->front() == L'"' && text->back() == L'"';
-            return quoted ? text->substr(1, text->size() - 2) : text;
+            if (!text->starts_with(L'"')) {
+                return *text + L'\0';
+            }
+            const bool closed = text->size() >= 2 && text->back() == L'"';
+            return closed ? text->substr(1, text->size() - 2) + L'\0' : text->substr(1);
         }
     }
     return std::nullopt;
@@ -78,7 +83,7 @@ struct QueryResult {
 };
 
 DWORD GiveText(const std::wstring& text, const QueryResult& result) {
-    const DWORD size = static_cast<DWORD>((text.size() + 1) * sizeof(wchar_t));
+    const DWORD size = static_cast<DWORD>(text.size() * sizeof(wchar_t));
     const DWORD room = result.data_size != nullptr ? *result.data_size : 0;
     if (result.type != nullptr) {
         *result.type = REG_SZ;

@@ -81,10 +81,7 @@ TEST_F(DeviceTree, ThatIsStoppedTellsNobodyAndCanBeReadAgain) {
 
 TEST_F(DeviceTree, ComesWithTheProductFolders) {
     // A text in the registry that fills its value, without a terminator.
-    std::string full = "hex(1):";
-    for (int i = 0; i < 130; ++i) {
-        full += "64 00 ";
-    }
+    const std::string full = '"' + std::string(130, 'd');
     const struct {
         std::string values;
         std::wstring data;
@@ -92,8 +89,8 @@ TEST_F(DeviceTree, ComesWithTheProductFolders) {
     } cases[] = {
         {"DataDirectory=\\D\nLibraryDirectory=\\L", L"\\D", L"\\L"},
         {"LibraryDirectory=\\L", L"", L"\\L"},
-        {"DataDirectory=" + full + "\nLibraryDirectory=" + full + "64 00", std::wstring(130, L'd'), L""},
-        {"DataDirectory=hex(1):64 00 00 00 64 00\nLibraryDirectory=hex(1):", L"d", L""},
+        {"DataDirectory=" + full + "\nLibraryDirectory=" + full + "d", std::wstring(130, L'd'), L""},
+        {"DataDirectory=\"d\nLibraryDirectory=\"", L"d", L""},
         {"", L"", L""},
     };
     for (const auto& c : cases) {
