@@ -115,6 +115,7 @@ class Call {
     Device& TheDevice() const { return device_; }
     const Settings& TheSettings() const { return configuration_->settings; }
     Configuration& TheConfiguration() const { return *configuration_; }
+    const DeviceTimes& Times() const { return configuration_->times; }
 
     // Passes the gate and carries out `body`, which answers a Win32 code. Gives that code or the gate's.
     template <class Body>

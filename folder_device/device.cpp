@@ -26,13 +26,14 @@ void Device::ReadSettings() {
         !configuration->IsUsable() || !(configuration->settings.texts == Settings(texts).texts)) {
         configuration = std::make_shared<Configuration>(std::move(texts));
     }
+    configuration->times.LookAtVolume();
     storage.Recount(configuration->settings.root, configuration->settings.capacity);
     configuration_ = std::move(configuration);
 }
 
-void Device::OpenSession(std::shared_ptr<Connection> connection) {
+bool Device::OpenSession(rapi::InitRecord& record, HRESULT result, DWORD delay) {
     const std::scoped_lock lock(settings_mutex_);
-    sessions.Open(std::move(connection));
+    return sessions.Open(record, result, delay);
 }
 
 bool Device::CloseSession() {
@@ -64,7 +65,6 @@ BOOL WINAPI DllMain(HINSTANCE /*module*/, DWORD reason, LPVOID process_ends) {
             break;
         case DLL_PROCESS_DETACH:
             if (process_ends == nullptr) {
-                the_device->sessions.EndAll();
                 delete the_device;
             }
             break;

@@ -11,6 +11,7 @@
 #include <memory>
 #include <mutex>
 
+#include "folder_device/device_times.h"
 #include "folder_device/faults.h"
 #include "folder_device/handle_table.h"
 #include "folder_device/sessions.h"
@@ -33,6 +34,7 @@ struct Configuration {
 
     const Settings settings;
     Faults faults{settings};
+    DeviceTimes times{settings.root, settings.clock_offset};
     Trace trace{settings.trace_file};
 };
 
@@ -44,8 +46,8 @@ class Device {
     // Reads the settings and counts the storage anew if no session is open in the process. Throws when memory
     // runs out, and the settings stay what they were.
     void ReadSettings();
-    // Adds a session to the calling thread, and takes the youngest one away: false when it has none.
-    void OpenSession(std::shared_ptr<Connection> connection);
+    // As those of Sessions, in one step with what follows from them.
+    bool OpenSession(rapi::InitRecord& record, HRESULT result, DWORD delay);
     bool CloseSession();
 
     Sessions sessions;

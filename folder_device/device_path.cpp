@@ -13,15 +13,10 @@ namespace {
 
 constexpr std::size_t kMaxNameLength = 255;
 
-bool HasUnpairedSurrogate(std::wstring_view name) {
-    for (std::size_t i = 0; i < name.size(); ++i) {
-        if (IS_HIGH_SURROGATE(name[i]) && i + 1 < name.size() && IS_LOW_SURROGATE(name[i + 1])) {
-            ++i;
-        } else if (IS_HIGH_SURROGATE(name[i]) || IS_LOW_SURROGATE(name[i])) {
-            return true;
-        }
-    }
-    return false;
+// Whether the surrogates go in pairs: no other text can be told in UTF-8.
+bool IsWellFormed(std::wstring_view name) {
+    return WideCharToMultiByte(CP_UTF8, WC_ERR_INVALID_CHARS, name.data(), static_cast<int>(name.size()),
+                               nullptr, 0, nullptr, nullptr) != 0;
 }
 
 DWORD CheckSyntax(std::wstring_view path) {
@@ -69,7 +64,7 @@ DWORD CheckExisting(const std::wstring& pc_path, DWORD attributes) {
 }  // namespace
 
 bool IsDeviceName(std::wstring_view name) {
-    return name.size() <= kMaxNameLength && orvane::IsSafePcName(name) && !HasUnpairedSurrogate(name);
+    return name.size() <= kMaxNameLength && orvane::IsSafePcName(name) && IsWellFormed(name);
 }
 
 DWORD Locate(const std::wstring& root, const wchar_t* path, Location& location) {

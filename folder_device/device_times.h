@@ -1,36 +1,63 @@
-// The device's own clock: the PC's, set wrong by the setting CLOCK_OFFSET. The times that the PC's file
-// system gives to new files are replaced by this clock's; those of written files where the two differ.
+// The times of the device's files. Its own clock is the PC's, set wrong by the setting CLOCK_OFFSET; the
+// times that the PC's file system gives to new files are replaced by this clock's, those of written files
+// where the two differ.
+//
+// The PC keeps times in UTC but for volumes of kind FAT, whose files have local times. These the system
+// converts by the offset that is in force now, so that each of them would move by an hour when summer time
+// begins and ends. The device converts by the offset that was in force at the file's date. (exFAT keeps each
+// time with its offset: nothing is to be done.)
 #pragma once
 
 #include <windows.h>
 
 #include <cstdint>
+#include <map>
+#include <mutex>
 #include <string>
-
-#include "platform/handles.h"
 
 namespace folder_device {
 
-inline FILETIME DeviceNow(std::int64_t offset) {
-    FILETIME now;
-    GetSystemTimeAsFileTime(&now);
-    const auto ticks = (static_cast<std::int64_t>(now.dwHighDateTime) << 32) + now.dwLowDateTime + offset;
-    return {static_cast<DWORD>(ticks & 0xFFFFFFFF), static_cast<DWORD>(ticks >> 32)};
-}
+class DeviceTimes {
+  public:
+    DeviceTimes(std::wstring root, std::int64_t clock_offset)
+        : root_(std::move(root)), offset_(clock_offset) {}
 
-// Gives what was just made or emptied at `pc_path` the device's time as creation and last access: the PC's
-// file system lets a file that is made again within seconds, or emptied, keep its old creation time. As last
-// write too if the file is `written` and the clock is wrong; with the PC's own time that is right already.
-// Opens the file for its attributes only, which no share mode forbids, and by a handle of its own: times set
-// through a handle hold against later writes through that handle only.
-inline void StampNew(const std::wstring& pc_path, std::int64_t offset, bool written) {
-    const orvane::UniqueFile file(CreateFileW(pc_path.c_str(), FILE_WRITE_ATTRIBUTES,
-                                              FILE_SHARE_READ | FILE_SHARE_WRITE | FILE_SHARE_DELETE, nullptr,
-                                              OPEN_EXISTING, FILE_FLAG_BACKUP_SEMANTICS, nullptr));
-    if (file) {
-        const FILETIME now = DeviceNow(offset);
-        SetFileTime(file.Get(), &now, &now, written && offset != 0 ? &now : nullptr);
-    }
+    // Looks at what kind of volume the root is on, while no session is open: a card may have been changed.
+    void LookAtVolume();
+
+    // A time in UTC as the PC is to be given it for a file below the root, and the other way. "None" (zero)
+    // and "leave it" (all bits set) stay what they are.
+    FILETIME ForPc(const FILETIME& time) const;
+    FILETIME FromPc(const FILETIME& shown) const;
+
+    // Gives what was just made or emptied at `pc_path` the device's time as creation and last access: the
+    // PC's file system lets a file that is made again within seconds, or emptied, keep its old creation time.
+    // As last write too if the file is `written` and the clock is wrong; with the PC's own time that is right
+    // already. Opens the file for its attributes only, which no share mode forbids, and by a handle of its
+    // own: times set through a handle hold against later writes through that handle only.
+    void StampNew(const std::wstring& pc_path, bool written) const;
+
+    bool ClockIsWrong() const { return offset_ != 0; }
+    // The device's present time, as the PC is to be given it.
+    FILETIME Now() const;
+
+  private:
+    // The zone's rules in the year of the time.
+    TIME_ZONE_INFORMATION RulesAt(const FILETIME& time) const;
+
+    const std::wstring root_;
+    const std::int64_t offset_;  // In 100-ns units.
+    std::wstring volume_;
+    bool volume_is_fixed_ = false;
+    bool keeps_local_time_ = false;
+    mutable std::mutex mutex_;
+    mutable std::map<WORD, TIME_ZONE_INFORMATION> rules_;  // By year: the system takes its time to tell.
+};
+
+// Whether it is a time at all, neither "none" nor "leave it".
+inline bool IsTime(const FILETIME& time) {
+    return (time.dwLowDateTime != 0 || time.dwHighDateTime != 0) &&
+           (time.dwLowDateTime != MAXDWORD || time.dwHighDateTime != MAXDWORD);
 }
 
 }  // namespace folder_device

@@ -1,7 +1,6 @@
 // Files by handle: open, read, write, move, measure, time, close.
 #include "folder_device/call.h"
 #include "folder_device/device_path.h"
-#include "folder_device/device_times.h"
 
 using namespace folder_device;
 
@@ -49,9 +48,8 @@ DWORD CheckOpen(const OpenRequest& request, const Location& file) {
 }
 
 DWORD OpenDeviceFile(Call& call, const OpenRequest& request, HANDLE& result) {
-    const Settings& settings = call.TheSettings();
     Location file;
-    DWORD error = Locate(settings.root, request.path, file);
+    DWORD error = Locate(call.TheSettings().root, request.path, file);
     if (error == ERROR_SUCCESS) {
         error = CheckOpen(request, file);
     }
@@ -72,7 +70,7 @@ DWORD OpenDeviceFile(Call& call, const OpenRequest& request, HANDLE& result) {
     const bool existed = request.creation == OPEN_EXISTING || request.creation == TRUNCATE_EXISTING ||
                          note == ERROR_ALREADY_EXISTS;
     if (!existed || Truncates(request.creation)) {
-        StampNew(file.pc_path, settings.clock_offset, true);
+        call.Times().StampNew(file.pc_path, true);
     }
     call.Note(existed && request.creation != OPEN_EXISTING && request.creation != TRUNCATE_EXISTING
                   ? ERROR_ALREADY_EXISTS
@@ -95,14 +93,6 @@ DWORD SizesOfWrite(HANDLE file, DWORD wanted, std::uint64_t& old_size, std::uint
     return ERROR_SUCCESS;
 }
 
-// A write gives the file the device's time, unless a time was set through this handle before.
-void StampWritten(FileObject& file, std::int64_t offset) {
-    if (file.explicit_last_write || offset != 0) {
-        const FILETIME time = file.explicit_last_write.value_or(DeviceNow(offset));
-        SetFileTime(file.file.Get(), nullptr, nullptr, &time);
-    }
-}
-
 DWORD WriteDeviceFile(Call& call, FileObject& file, LPCVOID buffer, DWORD wanted, DWORD& written) {
     const std::scoped_lock one_write(file.mutex);
     StorageChange change(call.TheDevice().storage);
@@ -121,16 +111,30 @@ DWORD WriteDeviceFile(Call& call, FileObject& file, LPCVOID buffer, DWORD wanted
         return GetLastError();
     }
     change.Book(old_size, new_size);
-    if (written != 0) {
-        StampWritten(file, call.TheSettings().clock_offset);
+    // A write gives the file the device's time, unless a time was set through this handle before.
+    if (written != 0 && (file.explicit_last_write || call.Times().ClockIsWrong())) {
+        const FILETIME time = file.explicit_last_write.value_or(call.Times().Now());
+        SetFileTime(file.file.Get(), nullptr, nullptr, &time);
     }
     return ERROR_SUCCESS;
 }
 
-// Neither "leave as it is" (zero) nor "never change" (all bits set).
-bool IsTime(const FILETIME* time) {
-    return time != nullptr && (time->dwLowDateTime != 0 || time->dwHighDateTime != 0) &&
-           (time->dwLowDateTime != MAXDWORD || time->dwHighDateTime != MAXDWORD);
+DWORD SetTimes(const Call& call, FileObject& file, const FILETIME* const (&times)[3]) {
+    const std::scoped_lock one_change(file.mutex);
+    if ((file.access & GENERIC_WRITE) == 0) {
+        return ERROR_ACCESS_DENIED;
+    }
+    FILETIME for_pc[3] = {};
+    for (std::size_t i = 0; i < 3; ++i) {
+        for_pc[i] = times[i] != nullptr ? call.Times().ForPc(*times[i]) : FILETIME{};  // None stays as it is.
+    }
+    if (!SetFileTime(file.file.Get(), &for_pc[0], &for_pc[1], &for_pc[2])) {
+        return GetLastError();
+    }
+    if (IsTime(for_pc[2])) {
+        file.explicit_last_write = for_pc[2];
+    }
+    return ERROR_SUCCESS;
 }
 
 // Finds the open file and lets `work` do something with it; ERROR_INVALID_HANDLE when there is none.
@@ -223,8 +227,16 @@ DWORD WINAPI CeGetFileSize(HANDLE file, LPDWORD size_high) {
 BOOL WINAPI CeGetFileTime(HANDLE file, LPFILETIME creation, LPFILETIME last_access, LPFILETIME last_write) {
     Call call(__func__, file);
     return call.RunBool([&] {
-        return OnFile(call, file, [&](FileObject& open) {
-            return LastErrorUnless(GetFileTime(open.file.Get(), creation, last_access, last_write));
+        return OnFile(call, file, [&](FileObject& open) -> DWORD {
+            if (!GetFileTime(open.file.Get(), creation, last_access, last_write)) {
+                return GetLastError();
+            }
+            for (const LPFILETIME time : {creation, last_access, last_write}) {
+                if (time != nullptr) {
+                    *time = call.Times().FromPc(*time);
+                }
+            }
+            return ERROR_SUCCESS;
         });
     });
 }
@@ -234,18 +246,8 @@ BOOL WINAPI CeSetFileTime(HANDLE file, const FILETIME* creation, const FILETIME*
                           const FILETIME* last_write) {
     Call call(__func__, file);
     return call.RunBool([&] {
-        return OnFile(call, file, [&](FileObject& open) -> DWORD {
-            const std::scoped_lock one_change(open.mutex);
-            if ((open.access & GENERIC_WRITE) == 0) {
-                return ERROR_ACCESS_DENIED;
-            }
-            if (!SetFileTime(open.file.Get(), creation, last_access, last_write)) {
-                return GetLastError();
-            }
-            if (IsTime(last_write)) {
-                open.explicit_last_write = *last_write;
-            }
-            return ERROR_SUCCESS;
+        return OnFile(call, file, [&](FileObject& open) {
+            return SetTimes(call, open, {creation, last_access, last_write});
         });
     });
 }

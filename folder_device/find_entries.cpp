@@ -3,6 +3,7 @@
 // system keeps beside them. Left out are "." and "..", links, names that no device path can hold and whatever
 // would lie at a path of 260 characters or more: nothing could be done with them.
 #include <algorithm>
+#include <cstring>
 #include <cwchar>
 
 #include "folder_device/call.h"
@@ -105,45 +106,30 @@ void Append(const std::wstring& folder, const WIN32_FIND_DATAW& entry, std::vect
 }
 
 // The entry as the search tells of it, if it is one for a device and the pattern wants it.
-void AppendIfWanted(const Pattern& pattern, const WIN32_FIND_DATAW& entry,
+void AppendIfWanted(const Call& call, const Pattern& pattern, const WIN32_FIND_DATAW& entry,
                     std::vector<rapi::FindData>& found) {
     const std::wstring_view name = entry.cFileName;
     if ((entry.dwFileAttributes & FILE_ATTRIBUTE_REPARSE_POINT) == 0 && IsDeviceName(name) &&
         pattern.folder.size() + 1 + name.size() < MAX_PATH && pattern.Matches(name)) {
         Append(pattern.folder, entry, found);
+        rapi::FindData& record = found.back();
+        for (FILETIME* time : {&record.creation_time, &record.last_access_time, &record.last_write_time}) {
+            *time = call.Times().FromPc(*time);
+        }
     }
 }
 
-DWORD SearchFolder(const Pattern& pattern, const Location& folder, std::vector<rapi::FindData>& found) {
-    if (!folder.IsFolder()) {
-        return ERROR_PATH_NOT_FOUND;
-    }
+DWORD SearchPc(Call& call, const Pattern& pattern, const std::wstring& path,
+               std::vector<rapi::FindData>& found) {
     WIN32_FIND_DATAW entry;
-    const std::wstring all = folder.pc_path + (folder.IsRoot() ? L"*" : L"\\*");
     const orvane::UniqueFind search(FindFirstFileExW(
-        all.c_str(), FindExInfoBasic, &entry, FindExSearchNameMatch, nullptr, FIND_FIRST_EX_LARGE_FETCH));
-    if (!search) {
-        const DWORD error = GetLastError();
-        return error == ERROR_FILE_NOT_FOUND ? ERROR_SUCCESS : error;  // A drive's root may be quite empty.
+        path.c_str(), FindExInfoBasic, &entry, FindExSearchNameMatch, nullptr, FIND_FIRST_EX_LARGE_FETCH));
+    for (bool more = static_cast<bool>(search); more; more = FindNextFileW(search.Get(), &entry)) {
+        AppendIfWanted(call, pattern, entry, found);
     }
-    do {
-        AppendIfWanted(pattern, entry, found);
-    } while (FindNextFileW(search.Get(), &entry));
     const DWORD error = GetLastError();
-    return error == ERROR_NO_MORE_FILES ? ERROR_SUCCESS : error;
-}
-
-DWORD SearchName(const Pattern& pattern, const Location& file, std::vector<rapi::FindData>& found) {
-    if (!file.Exists()) {
-        return ERROR_SUCCESS;
-    }
-    WIN32_FIND_DATAW entry;
-    const orvane::UniqueFind search(FindFirstFileW(file.pc_path.c_str(), &entry));
-    if (!search) {
-        return GetLastError();
-    }
-    AppendIfWanted(pattern, entry, found);
-    return ERROR_SUCCESS;
+    // A drive's root may be quite empty.
+    return error == ERROR_NO_MORE_FILES || error == ERROR_FILE_NOT_FOUND ? ERROR_SUCCESS : error;
 }
 
 void AppendMadeUp(const Settings& settings, const Pattern& pattern, std::vector<rapi::FindData>& found) {
@@ -173,65 +159,52 @@ void AppendMadeUp(const Settings& settings, const Pattern& pattern, std::vector<
 // entries of the settings. Returns 0, also when nothing was found, or the error: that of the folder's
 // path (device_path.h), ERROR_INVALID_NAME for a pattern that no name can match, ERROR_FILE_NOT_FOUND for a
 // pattern that ends in "\".
-DWORD FindEntries(const Settings& settings, const wchar_t* pattern_text, std::vector<rapi::FindData>& found) {
+DWORD FindEntries(Call& call, const wchar_t* pattern_text, std::vector<rapi::FindData>& found) {
     Pattern pattern;
-    DWORD error = ParsePattern(pattern_text, pattern);
-    if (error != ERROR_SUCCESS) {
+    if (const DWORD error = ParsePattern(pattern_text, pattern); error != ERROR_SUCCESS) {
         return error;
     }
-    Location location;
-    if (pattern.wild) {
-        error = Locate(settings.root, pattern.folder.empty() ? L"\\" : pattern.folder.c_str(), location);
-        if (error == ERROR_SUCCESS) {
-            error = SearchFolder(pattern, location, found);
-        }
-    } else {
-        error = Locate(settings.root, pattern_text, location);
-        if (error == ERROR_SUCCESS) {
-            error = SearchName(pattern, location, found);
-        }
+    Location place;
+    const wchar_t* const folder = pattern.folder.empty() ? L"\\" : pattern.folder.c_str();
+    DWORD error = Locate(call.TheSettings().root, pattern.wild ? folder : pattern_text, place);
+    if (error == ERROR_SUCCESS && pattern.wild) {
+        error = place.IsFolder()
+                    ? SearchPc(call, pattern, place.pc_path + (place.IsRoot() ? L"*" : L"\\*"), found)
+                    : DWORD{ERROR_PATH_NOT_FOUND};
+    } else if (error == ERROR_SUCCESS && place.Exists()) {
+        error = SearchPc(call, pattern, place.pc_path, found);
     }
     if (error == ERROR_SUCCESS) {
-        AppendMadeUp(settings, pattern, found);
+        AppendMadeUp(call.TheSettings(), pattern, found);
     }
     return error;
 }
 
 // Leaves only the fields that were asked for; the others are zero.
 void KeepFields(DWORD flags, rapi::FindData& record) {
-    rapi::FindData kept{};
-    const auto take = [&](DWORD flag, auto member) {
-        if ((flags & flag) != 0) {
-            kept.*member = record.*member;
+    const auto clear = [&](DWORD flag, auto& field) {
+        if ((flags & flag) == 0) {
+            std::memset(&field, 0, sizeof(field));
         }
     };
-    take(rapi::kFindAttributes, &rapi::FindData::attributes);
-    take(rapi::kFindCreationTime, &rapi::FindData::creation_time);
-    take(rapi::kFindLastAccessTime, &rapi::FindData::last_access_time);
-    take(rapi::kFindLastWriteTime, &rapi::FindData::last_write_time);
-    take(rapi::kFindSizeHigh, &rapi::FindData::size_high);
-    take(rapi::kFindSizeLow, &rapi::FindData::size_low);
-    take(rapi::kFindObjectId, &rapi::FindData::object_id);
-    if ((flags & rapi::kFindName) != 0) {
-        std::copy(std::begin(record.name), std::end(record.name), std::begin(kept.name));
-    }
-    record = kept;
+    clear(rapi::kFindAttributes, record.attributes);
+    clear(rapi::kFindCreationTime, record.creation_time);
+    clear(rapi::kFindLastAccessTime, record.last_access_time);
+    clear(rapi::kFindLastWriteTime, record.last_write_time);
+    clear(rapi::kFindSizeHigh, record.size_high);
+    clear(rapi::kFindSizeLow, record.size_low);
+    clear(rapi::kFindObjectId, record.object_id);
+    clear(rapi::kFindName, record.name);
 }
-
-constexpr DWORD kAllFields = rapi::kFindAttributes | rapi::kFindCreationTime | rapi::kFindLastAccessTime |
-                             rapi::kFindLastWriteTime | rapi::kFindSizeHigh | rapi::kFindSizeLow |
-                             rapi::kFindObjectId | rapi::kFindName;
 
 DWORD FindAll(Call& call, LPCWSTR pattern, DWORD flags, DWORD& count, rapi::FindData*& buffer) {
     const Settings& settings = call.TheSettings();
     std::vector<rapi::FindData> found;
-    if (const DWORD error = FindEntries(settings, pattern, found); error != ERROR_SUCCESS) {
+    if (const DWORD error = FindEntries(call, pattern, found); error != ERROR_SUCCESS) {
         return error;
     }
-    if ((flags & kAllFields) != kAllFields) {
-        for (rapi::FindData& record : found) {
-            KeepFields(flags, record);
-        }
+    for (rapi::FindData& record : found) {
+        KeepFields(flags, record);
     }
     count = static_cast<DWORD>(settings.found_count.value_or(found.size()));
     if (!found.empty() && !settings.found_null) {
@@ -250,7 +223,7 @@ HANDLE WINAPI CeFindFirstFile(LPCWSTR pattern, rapi::FindData* found) {
             return ERROR_INVALID_PARAMETER;
         }
         std::vector<rapi::FindData> entries;
-        if (const DWORD error = FindEntries(call.TheSettings(), pattern, entries); error != ERROR_SUCCESS) {
+        if (const DWORD error = FindEntries(call, pattern, entries); error != ERROR_SUCCESS) {
             return error;
         }
         if (entries.empty()) {

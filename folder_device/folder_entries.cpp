@@ -1,7 +1,6 @@
 // Files and folders by name: make, remove, delete, rename, copy, and the space that is left.
 #include "folder_device/call.h"
 #include "folder_device/device_path.h"
-#include "folder_device/device_times.h"
 #include "platform/text_case.h"
 
 using namespace folder_device;
@@ -83,7 +82,7 @@ DWORD CopyDeviceFile(Call& call, const Location& from, const Location& to, bool 
         change.Book(old_size, FileSizeAt(to.pc_path));  // A copy that broke off may have cut the old file.
     }
     if (error == ERROR_SUCCESS) {
-        StampNew(to.pc_path, call.TheSettings().clock_offset, false);
+        call.Times().StampNew(to.pc_path, false);
     }
     return error;
 }
@@ -130,7 +129,7 @@ BOOL WINAPI CeCreateDirectory(LPCWSTR path, LPSECURITY_ATTRIBUTES /*security*/) 
             }
             const DWORD error = LastErrorUnless(CreateDirectoryW(folder.pc_path.c_str(), nullptr));
             if (error == ERROR_SUCCESS) {
-                StampNew(folder.pc_path, call.TheSettings().clock_offset, true);
+                call.Times().StampNew(folder.pc_path, true);
             }
             return error;
         });

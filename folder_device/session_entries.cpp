@@ -41,12 +41,8 @@ HRESULT OpenSession(const Call& call, rapi::InitRecord* record) {
     if (FAILED(settings.init_result)) {
         return settings.init_result;
     }
-    auto connection = Connection::Begin(*record, ConnectionResult(call), ConnectDelay(call));
-    if (connection == nullptr) {
-        return E_OUTOFMEMORY;
-    }
-    call.TheDevice().OpenSession(std::move(connection));
-    return S_OK;
+    return call.TheDevice().OpenSession(*record, ConnectionResult(call), ConnectDelay(call)) ? S_OK
+                                                                                             : E_OUTOFMEMORY;
 }
 
 // Where the device would look for the DLL: at its path, or by its bare name in \Windows and in the root.

@@ -1,10 +1,13 @@
-// The sessions of the process, each with its connection: what CeRapiInitEx starts and CeRapiUninit ends.
+// The sessions of the process: what CeRapiInitEx starts and CeRapiUninit ends. A session belongs to the
+// thread that opened it; all members but AnyInProcess speak of the calling thread's.
+//
+// Threads are told apart by their numbers, and not by data of their own: what the language keeps for a thread
+// may be gone before the DLL hears of the thread's end. A number is used anew only after that.
 #pragma once
 
 #include <windows.h>
 
-#include <atomic>
-#include <memory>
+#include <algorithm>
 #include <mutex>
 #include <vector>
 
@@ -13,56 +16,67 @@
 
 namespace folder_device {
 
-// One session's connection. The record given to CeRapiInitEx belongs to the caller and is written only until
-// the session is closed; the event belongs to the connection and is closed with the session.
-class Connection {
-  public:
-    // Starts a connection that ends in `result` after `delay` milliseconds: at once for 0, never for
-    // INFINITE, else on a thread of its own that keeps the DLL loaded. Null when the system has no event or
-    // thread left.
-    static std::shared_ptr<Connection> Begin(rapi::InitRecord& record, HRESULT result, DWORD delay);
-
-    bool IsUp() const { return up_; }
-    // The session is closed or its thread is gone: the record is not touched again.
-    void End();
-
-  private:
-    struct Delayed;
-
-    static DWORD WINAPI WaitAndComplete(void* parameter);
-    void Complete(HRESULT result);
-
-    std::mutex mutex_;
-    rapi::InitRecord* record_ = nullptr;
-    orvane::UniqueEvent event_;
-    orvane::UniqueEvent ended_;  // Ends the wait of a delayed connection.
-    std::atomic<bool> up_{false};
-};
-
-// A session belongs to the thread that opened it. All members but EndAll speak of the calling thread's.
-//
-// Threads are told apart by their numbers, and not by data of their own: what the language keeps for a thread
-// may be gone before the DLL hears of the thread's end. A number is used anew only after that.
 class Sessions {
   public:
-    void Open(std::shared_ptr<Connection> connection);
+    // Opens one whose connection ends in `result` after `delay` milliseconds: at once for 0, never for
+    // INFINITE. Fills the record, which stays the caller's and is not written later; its event, which is
+    // signalled then, is closed with the session. False when the system has no event left.
+    bool Open(rapi::InitRecord& record, HRESULT result, DWORD delay) {
+        // A timer is an event that signals itself.
+        const bool late = delay != 0 && delay != INFINITE;
+        orvane::UniqueEvent event(late ? CreateWaitableTimerW(nullptr, TRUE, nullptr)
+                                       : CreateEventW(nullptr, TRUE, delay == 0, nullptr));
+        LARGE_INTEGER due;
+        due.QuadPart = static_cast<LONGLONG>(delay) * -10'000;
+        if (!event || (late && !SetWaitableTimer(event.Get(), &due, 0, nullptr, nullptr, FALSE))) {
+            return false;
+        }
+        record.init_event = event.Get();
+        record.init_result = result;
+        const std::scoped_lock lock(mutex_);
+        sessions_.push_back({GetCurrentThreadId(), std::move(event), result});
+        return true;
+    }
     // Ends the youngest one; false when there is none.
-    bool Close();
-    // The thread ends. The lock that this takes is held over nothing but memory.
-    void EndThread();
+    bool Close() {
+        const std::scoped_lock lock(mutex_);
+        const auto youngest = std::find_if(sessions_.rbegin(), sessions_.rend(), OfThisThread);
+        if (youngest == sessions_.rend()) {
+            return false;
+        }
+        sessions_.erase(std::next(youngest).base());
+        return true;
+    }
+    // The thread ends. The lock that this takes is held over nothing but memory and the closing of events.
+    void EndThread() {
+        const std::scoped_lock lock(mutex_);
+        std::erase_if(sessions_, OfThisThread);
+    }
 
-    std::size_t Count() const;
-    // Whether one of them is connected.
-    bool IsConnected() const;
-    // Whether any thread has one.
-    bool AnyInProcess() const;
-    void EndAll();
+    std::size_t Count() const {
+        const std::scoped_lock lock(mutex_);
+        return static_cast<std::size_t>(std::count_if(sessions_.begin(), sessions_.end(), OfThisThread));
+    }
+    // Whether the connection of one of them has come about.
+    bool IsConnected() const {
+        const std::scoped_lock lock(mutex_);
+        return std::any_of(sessions_.begin(), sessions_.end(), [](const Session& session) {
+            return OfThisThread(session) && SUCCEEDED(session.result) &&
+                   orvane::IsSignalled(session.event.Get());
+        });
+    }
+    bool AnyInProcess() const {
+        const std::scoped_lock lock(mutex_);
+        return !sessions_.empty();
+    }
 
   private:
     struct Session {
         DWORD thread;
-        std::shared_ptr<Connection> connection;
+        orvane::UniqueEvent event;
+        HRESULT result;
     };
+    static bool OfThisThread(const Session& session) { return session.thread == GetCurrentThreadId(); }
 
     mutable std::mutex mutex_;
     std::vector<Session> sessions_;  // From the oldest to the youngest.

@@ -76,6 +76,8 @@ std::optional<CallRule> ParseRule(std::wstring_view text) {
     return value && *value <= MAXDWORD ? std::optional(rule) : std::nullopt;
 }
 
+}  // namespace
+
 std::optional<CallRule> ParseRefusal(std::wstring_view text) {
     std::optional<CallRule> rule = ParseRule(text);
     return rule && rule->value != ERROR_SUCCESS ? rule : std::nullopt;
@@ -111,8 +113,6 @@ std::optional<ExtraEntry> ParseExtraEntry(std::wstring_view piece) {
     }
     return entry.folder.starts_with(L'\\') ? std::optional(entry) : std::nullopt;
 }
-
-}  // namespace
 
 SettingTexts SettingTexts::Read() {
     SettingTexts texts;
@@ -186,31 +186,6 @@ HRESULT SettingTexts::Failure(const wchar_t* name) {
     // A success that is not S_OK would look like a fault that is set and does nothing.
     understood_ = understood_ && result <= 0;
     return result;
-}
-
-template <class Item, class Parse>
-std::vector<Item> SettingTexts::List(const wchar_t* name, Parse parse) {
-    std::vector<Item> items;
-    for (const std::wstring_view piece : Split(Text(name), L';')) {
-        if (!Trim(piece).empty()) {
-            const std::optional<Item> item = parse(piece);
-            understood_ = understood_ && item.has_value();
-            items.push_back(item.value_or(Item{}));
-        }
-    }
-    return items;
-}
-
-std::vector<CallRule> SettingTexts::Refusals(const wchar_t* name) {
-    return List<CallRule>(name, ParseRefusal);
-}
-
-std::vector<CallRule> SettingTexts::ByteCounts(const wchar_t* name) {
-    return List<CallRule>(name, ParseByteCount);
-}
-
-std::vector<ExtraEntry> SettingTexts::Entries(const wchar_t* name) {
-    return List<ExtraEntry>(name, ParseExtraEntry);
 }
 
 // The form that is not held to 260 characters and whose names the system takes as they stand.

@@ -33,6 +33,12 @@ struct ExtraEntry {
     std::uint64_t size = 0;
 };
 
+// Nothing for a text that is no such rule: a value that is an error, a number of bytes for CeReadFile or
+// CeWriteFile.
+std::optional<CallRule> ParseRefusal(std::wstring_view text);
+std::optional<CallRule> ParseByteCount(std::wstring_view text);
+std::optional<ExtraEntry> ParseExtraEntry(std::wstring_view text);
+
 // Looks settings up by name. It keeps every text that was asked for, and whether all of them, and the file
 // that they may stand in, were understood.
 class SettingTexts {
@@ -57,15 +63,21 @@ class SettingTexts {
     std::int64_t Seconds(const wchar_t* name);
     // An HRESULT that is a failure, else S_OK.
     HRESULT Failure(const wchar_t* name);
-    // Rules whose value is an error, and those for CeReadFile and CeWriteFile whose value counts bytes.
-    std::vector<CallRule> Refusals(const wchar_t* name);
-    std::vector<CallRule> ByteCounts(const wchar_t* name);
-    std::vector<ExtraEntry> Entries(const wchar_t* name);
+    // What stands between ";", each piece as `parse` takes it.
+    template <class Item>
+    std::vector<Item> List(const wchar_t* name, std::optional<Item> (*parse)(std::wstring_view)) {
+        std::vector<Item> items;
+        for (const std::wstring_view piece : Split(Text(name), L';')) {
+            if (!Trim(piece).empty()) {
+                std::optional<Item> item = parse(piece);
+                understood_ = understood_ && item.has_value();
+                items.push_back(std::move(item).value_or(Item{}));
+            }
+        }
+        return items;
+    }
 
   private:
-    template <class Item, class Parse>
-    std::vector<Item> List(const wchar_t* name, Parse parse);
-
     std::optional<IniText> ini_;
     std::map<std::wstring, std::wstring> texts_;
     bool understood_ = false;
@@ -88,16 +100,16 @@ struct Settings {
     DWORD connect_delay = texts.Delay(L"CONNECT_DELAY");
     HRESULT init_result = texts.Failure(L"INIT_RESULT");
     HRESULT connect_result = texts.Failure(L"CONNECT_RESULT");
-    std::vector<CallRule> refuse = texts.Refusals(L"REFUSE");
-    std::vector<CallRule> lose_reply = texts.Refusals(L"LOSE_REPLY");
-    std::vector<CallRule> fall_short = texts.ByteCounts(L"SHORT");
+    std::vector<CallRule> refuse = texts.List(L"REFUSE", ParseRefusal);
+    std::vector<CallRule> lose_reply = texts.List(L"LOSE_REPLY", ParseRefusal);
+    std::vector<CallRule> fall_short = texts.List(L"SHORT", ParseByteCount);
     // Numbers of calls that reach the device, counted from 1; 0: no such call.
     DWORD fail_call = texts.Dword(L"FAIL_CALL");
     DWORD lose_call = texts.Dword(L"LOSE_CALL");
     DWORD end_process = texts.Dword(L"END_PROCESS");
     DWORD vanish = texts.Dword(L"VANISH");
     DWORD vanish_delay = texts.Dword(L"VANISH_DELAY");
-    std::vector<ExtraEntry> extra_entries = texts.Entries(L"EXTRA_ENTRIES");
+    std::vector<ExtraEntry> extra_entries = texts.List(L"EXTRA_ENTRIES", ParseExtraEntry);
     std::optional<std::uint64_t> found_count = texts.Number(L"FOUND_COUNT", MAXDWORD);
     bool found_null = texts.Number(L"FOUND_NULL", 1) == 1U;
 

@@ -18,7 +18,30 @@ std::optional<SYSTEMTIME> LocalFields(const FILETIME& time) {
     return fields;
 }
 
+using ZoneConversion = decltype(&SystemTimeToTzSpecificLocalTime);
+
+// `convert` knows milliseconds only, so that its shift is found first.
+FILETIME Shifted(const FILETIME& time, const TIME_ZONE_INFORMATION& rules, ZoneConversion convert) {
+    SYSTEMTIME before{};
+    SYSTEMTIME after{};
+    FILETIME from{};
+    FILETIME to{};
+    if (!FileTimeToSystemTime(&time, &before) || !convert(&rules, &before, &after) ||
+        !SystemTimeToFileTime(&before, &from) || !SystemTimeToFileTime(&after, &to)) {
+        return time;
+    }
+    return LaterBy(time, FileTimeTicks(to) - FileTimeTicks(from));
+}
+
 }  // namespace
+
+FILETIME ToLocalTime(const FILETIME& utc, const TIME_ZONE_INFORMATION& rules) {
+    return Shifted(utc, rules, SystemTimeToTzSpecificLocalTime);
+}
+
+FILETIME FromLocalTime(const FILETIME& local, const TIME_ZONE_INFORMATION& rules) {
+    return Shifted(local, rules, TzSpecificLocalTimeToSystemTime);
+}
 
 CalendarTime ToLocalCalendar(const FILETIME& time) {
     std::optional<SYSTEMTIME> fields = LocalFields(time);

@@ -3,6 +3,8 @@
 
 #include <windows.h>
 
+#include <cstdint>
+
 namespace orvane {
 
 // Local calendar time to the second. Months and days count from 1.
@@ -19,6 +21,22 @@ struct CalendarTime {
     }
     int SecondOfDay() const { return (hour * 60 + minute) * 60 + second; }
 };
+
+inline std::int64_t FileTimeTicks(const FILETIME& time) {
+    return static_cast<std::int64_t>(time.dwHighDateTime) << 32 | time.dwLowDateTime;
+}
+
+// The time that lies `ticks` of 100 ns later, or earlier if negative.
+inline FILETIME LaterBy(const FILETIME& time, std::int64_t ticks) {
+    const std::int64_t sum = FileTimeTicks(time) + ticks;
+    return {static_cast<DWORD>(sum & MAXDWORD), static_cast<DWORD>(sum >> 32)};
+}
+
+// UTC as local time and back by the offset that `rules`, those of the time's year, have for its date, not by
+// the one that is in force now. Of the hour that the end of summer time repeats one half is taken for the
+// other. A time that cannot be converted stays what it is.
+FILETIME ToLocalTime(const FILETIME& utc, const TIME_ZONE_INFORMATION& rules);
+FILETIME FromLocalTime(const FILETIME& local, const TIME_ZONE_INFORMATION& rules);
 
 inline bool SameFileTime(const FILETIME& a, const FILETIME& b) {
     return CompareFileTime(&a, &b) == 0;
