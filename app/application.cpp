@@ -6,8 +6,21 @@
 
 #include "app/sync_dialog.h"
 #include "platform/resources.h"
+#include "qelutils/xlate.h"
+#include "res/ids.h"
+#include "settings/registry_strings.h"
 
 namespace orvane {
+
+void FollowLanguageSwitch() {
+    std::wstring name;
+    if (!RegReadString(HKEY_CURRENT_USER, ResourceString(IDS_SETTINGS_KEY), L"Language", name)) {
+        return;
+    }
+    if (const LCID locale = LocaleNameToLCID(name.c_str(), LOCALE_ALLOW_NEUTRAL_NAMES)) {
+        qel_text::SetCatalogLanguage(LANGIDFROMLCID(locale));
+    }
+}
 
 void RegisterDialogClass() {
     WNDCLASSW dialog_class{};
@@ -22,6 +35,7 @@ bool CWendlowApp::InitInstance() {
     const INITCOMMONCONTROLSEX controls = {sizeof(INITCOMMONCONTROLSEX), ICC_WIN95_CLASSES};
     InitCommonControlsEx(&controls);
     RegisterDialogClass();
+    FollowLanguageSwitch();
 
     CWendlowDlg dialog;
     dialog.DoModal();

@@ -1,10 +1,7 @@
 # orvane_add_catalog(TARGET PO_FILE LANGID): builds the gettext file into the target as the message catalog
 # of that language. It is called in the directory that defines the target, which must be linked by its
-# objects (a program or an object library). So a translation of the program takes one line in
-# res/CMakeLists.txt, here for German wherever it is spoken (0x0407 would be that of Germany; the
-# numbers are the language identifiers of Windows):
-#
-#   orvane_add_catalog(orvanelink_resources lang/de.po 0x0007)
+# objects (a program or an object library). The language identifier is that of Windows: 0x0007 is German
+# wherever it is spoken, 0x0407 that of Germany.
 #
 # The type of the resource is kCatalogType of qelutils/message_catalog.h. Its number is the language once
 # more, because this linker crashes when more than two objects hold resources of one type and number that

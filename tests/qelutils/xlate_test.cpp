@@ -20,7 +20,7 @@ class Translation : public ::testing::Test {
 TEST_F(Translation, LooksUpTheUsersLanguageAndFallsBackToTheKey) {
     EXPECT_EQ(Xlate(L"Exit it"), L"Exit it");
     EXPECT_EQ(Xlate(L"The file:\n{1} \n\nWill be replaced by the file:\n{2}"),
-              L"{2}\n\u00FCberschreibt\n{1}");
+              L"Die Datei\n{1} \n\nwird ersetzt durch die Datei\n{2}");
     qel_text::SetCatalogLanguage(kEnglish);
     EXPECT_EQ(Xlate(L"Exit"), L"Exit");
 }
@@ -32,10 +32,10 @@ TEST_F(Translation, TranslatesADialogButNotWhatTheUserEnters) {
         SetDlgItemTextW(dialog, user_text, L"Exit");
     }
     XlateWnd(dialog);
-    const wchar_t* const texts[] = {L"Abgleich zwischen PC und Ger\u00E4t",
+    const wchar_t* const texts[] = {L"Synchronisierung von PC und Mobilger\u00E4t",
                                     L"Beenden",
                                     L"Ordner auf dem PC",
-                                    L"Vorlieben",
+                                    L"Einstellungen",
                                     L"Not in the catalog",
                                     L"Exit",
                                     L"Exit",

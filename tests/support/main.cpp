@@ -5,9 +5,11 @@
 
 #include <cstdio>
 
+#include "qelutils/xlate.h"
+
 // The entry point of every test program, which has the common controls at hand. A test that hangs, a dialog
 // that nobody closes for instance, ends the program after a minute with exit code 3, so that it cannot hold
-// up the whole run.
+// up the whole run. Texts are English, whatever language the user has.
 
 namespace {
 
@@ -33,6 +35,7 @@ class Watchdog : public ::testing::EmptyTestEventListener {
 int main(int argc, char** argv) {
     const INITCOMMONCONTROLSEX controls = {sizeof(controls), ICC_WIN95_CLASSES};
     InitCommonControlsEx(&controls);
+    qel_text::SetCatalogLanguage(MAKELANGID(LANG_ENGLISH, SUBLANG_ENGLISH_US));
     ::testing::InitGoogleTest(&argc, argv);
     ::testing::UnitTest::GetInstance()->listeners().Append(new Watchdog);
     return RUN_ALL_TESTS();

@@ -1,0 +1,310 @@
+// Every language of the program has every text, whole, and every text has room where it is shown.
+#include <gmock/gmock.h>
+#include <gtest/gtest.h>
+#include <windows.h>
+
+#include <algorithm>
+#include <array>
+#include <cstring>
+#include <regex>
+#include <set>
+#include <string>
+#include <vector>
+
+#include "app/application.h"
+#include "qelutils/message_catalog.h"
+#include "qelutils/text_format.h"
+#include "qelutils/xlate.h"
+#include "res/ids.h"
+#include "settings/registry_strings.h"
+#include "tests/support/scratch_registry.h"
+#include "ui/dialog.h"
+
+namespace {
+
+using qel_text::LoadCatalog;
+using qel_text::MessageCatalog;
+
+constexpr LANGID kEnglish = 0x0009;
+
+// The numbers of the program's resources of that type: for catalogs, the languages.
+std::vector<WORD> ResourceNumbers(LPCWSTR type) {
+    std::vector<WORD> numbers;
+    EnumResourceNamesW(
+        nullptr, type,
+        [](HMODULE, LPCWSTR, LPWSTR name, LONG_PTR found) -> BOOL {
+            reinterpret_cast<std::vector<WORD>*>(found)->push_back(LOWORD(name));
+            return TRUE;
+        },
+        reinterpret_cast<LONG_PTR>(&numbers));
+    return numbers;
+}
+
+std::set<std::wstring> Keys(const MessageCatalog& catalog) {
+    std::set<std::wstring> keys;
+    for (const auto& [key, text] : catalog) {
+        keys.insert(key);
+    }
+    return keys;
+}
+
+std::multiset<std::wstring> Placeholders(const std::wstring& text) {
+    static const std::wregex placeholder(L"\\{\\{|\\{\\d+\\}");
+    std::multiset<std::wstring> found;
+    for (std::wsregex_iterator match(text.begin(), text.end(), placeholder), end; match != end; ++match) {
+        found.insert(match->str());
+    }
+    return found;
+}
+
+TEST(Languages, HaveEveryTextWithItsPlaceholders) {
+    const MessageCatalog english = LoadCatalog(kEnglish);
+    ASSERT_EQ(ResourceNumbers(qel_text::kCatalogType).size(), 13U);
+    for (const LANGID language : ResourceNumbers(qel_text::kCatalogType)) {
+        const MessageCatalog catalog = LoadCatalog(language);
+        EXPECT_THAT(Keys(catalog), ::testing::ContainerEq(Keys(english))) << "language " << language;
+        for (const auto& [key, text] : catalog) {
+            EXPECT_EQ(Placeholders(text), Placeholders(key)) << "language " << language;
+        }
+    }
+}
+
+// Where the program shows a text that is none of the template's own.
+constexpr int kCaption = 0;
+struct Place {
+    UINT dialog;
+    int control;
+    std::vector<std::wstring> keys;
+    int width = 0;  // In pixels at 100 %; 0 for that of the control.
+};
+const Place kPlaces[] = {
+    {IDD_SYNC, kCaption, {L"Desktop-Mobile Device Synchronization"}},
+    {IDD_SYNC, IDC_SYNC_CANCEL_EXIT, {L"Exit"}},
+    {IDD_SYNC,
+     IDC_SYNC_STATUS,
+     {L"Synchronization in progress...", L"Sychronization cancelled", L"Synchronization complete."}},
+    {IDD_TRANSFER,
+     IDC_TRANSFER_COPY,
+     {L"Copy Selected File(s) from PC to Device", L"Copy Selected File(s) from Device to PC"}},
+    {IDD_TRANSFER, IDC_TRANSFER_TABS, {L"PC", L"Mobile Device"}, 200},
+    // The columns are 300 and 130 wide; margins and the arrow of a sorted one take 30.
+    {IDD_TRANSFER, IDC_TRANSFER_PC_LIST, {L"File Name"}, 270},
+    {IDD_TRANSFER, IDC_TRANSFER_PC_LIST, {L"Date"}, 100},
+    {IDD_COPY_PROGRESS, kCaption, {L"{{Copying File {1}/{2}  - {3}}"}},
+    {IDD_BROWSE, kCaption, {L"Mobile Device Browse"}},
+    {IDD_LOAD_PROGRESS, IDC_LOAD_TEXT, {L"Reading from remote device. Please wait..."}},
+    {IDD_FILE_PROPERTY, IDC_PROPERTY_TYPE, {L"Folder", L" File"}, 100},
+    {IDD_FILE_PROPERTY, IDC_PROPERTY_DATE_LABEL, {L"Created:", L"Modified:"}},
+    {IDD_FILE_PROPERTY, IDC_PROPERTY_DATE, {L"Invalid DateTime"}},
+    {IDD_FILE_PROPERTY, IDC_PROPERTY_SIZE, {L"{1} bytes"}},
+};
+// Message boxes, menus and the log take what room they need; the directions are parts of a caption.
+const std::set<std::wstring> kRoomOfTheirOwn = {
+    L"About Orvanelink...",
+    L"Checking files...",
+    L"[Desktop to Mobile Device] Error: DEVICE DISK FULL.",
+    L"[Mobile Device to Desktop] Error: PC DISK FULL.",
+    L"[Mobile Device to Desktop] File copy: \"",
+    L"Communication Error",
+    L"Communication Error.",
+    L"Synchronization - Warning",
+    L"Syncronization",
+    L"The file:\n{1} \n\nWill be replaced by the file:\n{2}",
+    L"PC Date is different from DEVICE!",
+    L"Device",
+    L"Failed to read from remote device.",
+    L"failed to read from remote device",
+    L"failed to read from remote device.",
+    L"Would you like to stop the file copy?",
+    L"From Device to PC",
+    L"From PC to Device",
+    L"Device Disk Full!",
+    L"PC Disk Full!",
+    L"Dummy",
+    L"Device folder",
+    L"Property...",
+};
+// Texts of templates that nobody sees, and the numbers of pictures.
+bool IsNoText(const std::wstring& text) {
+    static const std::set<std::wstring> unseen = {L"", L"Static", L"Tree2",
+                                                  L"Desktop-Mobille Device Synchronization"};
+    return unseen.contains(text) || text[0] == L'\xFFFF';
+}
+
+// A dialog, not shown, whose font is larger by that percentage: so is all of it then, as on a screen of that
+// density.
+HWND CreateScaled(UINT id, int percent) {
+    HRSRC resource = FindResourceW(nullptr, MAKEINTRESOURCEW(id), RT_DIALOG);
+    const auto* bytes = static_cast<const char*>(LockResource(LoadResource(nullptr, resource)));
+    std::vector<DWORD> content(SizeofResource(nullptr, resource) / sizeof(DWORD) + 1);
+    std::memcpy(content.data(), bytes, SizeofResource(nullptr, resource));
+    content[3] &= ~WS_VISIBLE;  // The style of an extended template.
+    WORD* item = reinterpret_cast<WORD*>(content.data()) + 13;
+    for (int name = 0; name < 3; ++name) {  // Menu, class and caption: a number behind 0xFFFF, or a string.
+        item += *item == 0xFFFF ? 2 : wcslen(reinterpret_cast<wchar_t*>(item)) + 1;
+    }
+    *item = static_cast<WORD>(*item * percent / 100);
+    return CreateDialogIndirectParamW(nullptr, reinterpret_cast<DLGTEMPLATE*>(content.data()), nullptr,
+                                      nullptr, 0);
+}
+
+std::vector<HWND> Controls(HWND dialog) {
+    std::vector<HWND> controls;
+    for (HWND child = GetWindow(dialog, GW_CHILD); child; child = GetWindow(child, GW_HWNDNEXT)) {
+        controls.push_back(child);
+    }
+    return controls;
+}
+
+LONG StyleOf(HWND window) {
+    return static_cast<LONG>(GetWindowLongPtrW(window, GWL_STYLE));
+}
+
+bool IsButton(HWND control) {
+    std::array<wchar_t, 20> name{};
+    GetClassNameW(control, name.data(), static_cast<int>(name.size()));
+    return lstrcmpiW(name.data(), L"Button") == 0;
+}
+
+// What a window has for its text; nothing has no bounds.
+SIZE RoomOf(HWND window, int percent) {
+    RECT client{};
+    GetClientRect(window, &client);
+    int taken = 0;  // Beside the text, in pixels at 100 %.
+    if (GetParent(window) == nullptr) {
+        taken = 60;  // The caption's icon and close box.
+    } else if (IsButton(window)) {
+        switch (StyleOf(window) & BS_TYPEMASK) {
+            case BS_GROUPBOX:
+                taken = 18;
+                break;  // The frame's corners.
+            case BS_AUTOCHECKBOX:
+                taken = 17;
+                break;  // The box and the gap behind it.
+            default:
+                taken = 6;  // Border and focus frame.
+        }
+    }
+    return {client.right - MulDiv(taken, percent, 100), client.bottom};
+}
+
+// The place that the text takes in that width. A full-width character is as wide as high, and lines break
+// beside it: so is an "M" with a blank, in fonts that this system has.
+SIZE Measure(HWND window, const std::wstring& text, int width) {
+    static const std::wregex full_width(L"[\u2E80-\uFFEF]");
+    const std::wstring narrow = std::regex_replace(text, full_width, L"M ");
+    const bool one_line = IsButton(window) || GetParent(window) == nullptr;
+    HDC dc = GetDC(window);
+    SelectObject(dc, reinterpret_cast<HFONT>(SendMessageW(window, WM_GETFONT, 0, 0)));
+    RECT needed{0, 0, width, 0};
+    DrawTextW(dc, narrow.c_str(), -1, &needed, DT_CALCRECT | (one_line ? DT_SINGLELINE : DT_WORDBREAK));
+    ReleaseDC(window, dc);
+    return {needed.right, needed.bottom};
+}
+
+// One dialog in one language at one density.
+class Layout {
+  public:
+    Layout(UINT id, LANGID language, int percent)
+        : id_(id), language_(language), percent_(percent), dialog_(CreateScaled(id, percent)) {}
+    ~Layout() { DestroyWindow(dialog_); }
+
+    void Check() {
+        ASSERT_NE(dialog_, nullptr) << id_;
+        qel_text::SetCatalogLanguage(language_);
+        XlateWnd(dialog_);
+        CheckText(dialog_, orvane::ui::WindowText(dialog_));
+        for (HWND control : Controls(dialog_)) {
+            const std::wstring text = orvane::ui::WindowText(control);
+            CheckMnemonic(text);
+            if (StyleOf(control) & WS_VISIBLE) {
+                CheckText(control, text);
+            }
+        }
+        const MessageCatalog catalog = LoadCatalog(language_);
+        for (const auto& [dialog, control, keys, width] : kPlaces) {
+            for (const std::wstring& key : keys) {
+                if (dialog == id_) {
+                    CheckText(control == kCaption ? dialog_ : GetDlgItem(dialog_, control),
+                              Filled(catalog, key), MulDiv(width, percent_, 100));
+                }
+            }
+        }
+    }
+
+  private:
+    // The translation with long values in its placeholders.
+    static std::wstring Filled(const MessageCatalog& catalog, const std::wstring& key) {
+        const std::wstring direction = catalog.at(L"From PC to Device");
+        return qel_text::detail::qel_safefmt_impl(catalog.at(key), {L"1000000", L"1000000", direction});
+    }
+    void CheckText(HWND window, const std::wstring& text, int width = 0) {
+        // What is cut off with an ellipsis is meant to be.
+        if (IsNoText(text) || (width == 0 && (StyleOf(window) & SS_ELLIPSISMASK) != 0)) {
+            return;
+        }
+        SIZE room = RoomOf(window, percent_);
+        room.cx = width != 0 ? width : room.cx;
+        const SIZE needed = Measure(window, text, room.cx);
+        EXPECT_TRUE(needed.cx <= room.cx && (needed.cy <= room.cy || window == dialog_))
+            << "dialog " << id_ << ", language " << language_ << ", " << percent_ << " %: \"" << text
+            << "\" needs " << needed.cx << "x" << needed.cy << " of " << room.cx << "x" << room.cy;
+    }
+    void CheckMnemonic(const std::wstring& text) {
+        const std::size_t mark = text.find(L'&');
+        EXPECT_TRUE(mark == std::wstring::npos || mnemonics_.insert(towupper(text[mark + 1])).second)
+            << "dialog " << id_ << ", language " << language_ << ": \"" << text << "\"";
+    }
+
+    UINT id_;
+    LANGID language_;
+    int percent_;
+    HWND dialog_;
+    std::set<wint_t> mnemonics_;
+};
+
+TEST(Languages, HaveRoomForEveryText) {
+    orvane::RegisterDialogClass();
+    for (const WORD dialog : ResourceNumbers(RT_DIALOG)) {
+        for (const LANGID language : ResourceNumbers(qel_text::kCatalogType)) {
+            for (const int percent : {100, 150}) {
+                Layout(dialog, language, percent).Check();
+            }
+        }
+    }
+    qel_text::SetCatalogLanguage(kEnglish);
+}
+
+// Also what the program collects from its templates, and what the tables above say, is put to the test.
+TEST(Languages, KnowWhereEachTextIsShown) {
+    orvane::RegisterDialogClass();
+    std::set<std::wstring> known = kRoomOfTheirOwn;
+    for (const Place& place : kPlaces) {
+        known.insert(place.keys.begin(), place.keys.end());
+    }
+    for (const WORD id : ResourceNumbers(RT_DIALOG)) {
+        HWND dialog = CreateScaled(id, 100);
+        std::vector<HWND> windows = Controls(dialog);
+        windows.push_back(dialog);
+        for (HWND window : windows) {
+            if (const std::wstring text = orvane::ui::WindowText(window); !IsNoText(text)) {
+                known.insert(text);
+            }
+        }
+        DestroyWindow(dialog);
+    }
+    EXPECT_THAT(known, ::testing::ContainerEq(Keys(LoadCatalog(kEnglish))));
+}
+
+TEST(Languages, FollowTheSwitchInTheRegistry) {
+    const orvane::testing::ScratchRegistry registry;
+    const std::pair<const wchar_t*, const wchar_t*> switches[] = {
+        {L"de", L"Beenden"}, {L"pt-BR", L"Sair"}, {L"zh-Hans", L"\u9000\u51FA"}, {L"en", L"Exit"}};
+    for (const auto& [name, exit] : switches) {
+        orvane::RegWriteString(HKEY_CURRENT_USER, L"Software\\Veltrano\\CE Devices", L"Language", name);
+        orvane::FollowLanguageSwitch();
+        EXPECT_EQ(Xlate(L"Exit"), exit) << name;
+    }
+}
+
+}  // namespace
