@@ -111,6 +111,7 @@ void CFolderDialog::OnInitDialog(HWND window) {
     }
     XlateWnd(window);
     // OK accepts only a dialog with a file name; what folder that file would be in is what counts.
+    // Translators: a file name that nobody sees; leave it as it is.
     SetDlgItemTextW(window, IDC_FOLDER_FILE_NAME, Xlate(L"Dummy").c_str());
     SetDlgItemTextW(window, IDC_FOLDER_DIRECTORY, initial_text_.c_str());
     ui::DataExchange(window, true).Text(IDC_FOLDER_DIRECTORY, chosen_directory_);

@@ -42,6 +42,7 @@ std::wstring FileTypeText(const std::wstring& path) {
         extension.clear();
     }
     CharUpperBuffW(extension.data(), static_cast<DWORD>(extension.size()));
+    // Translators: follows the extension in capitals, "JPG" for instance; stands alone where there is none.
     return extension + Xlate(L" File");
 }
 

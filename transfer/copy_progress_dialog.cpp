@@ -82,6 +82,7 @@ std::wstring CopyProgressTitle(int number, int count, CopyDirection direction) {
         Xlate(to_pc ? XlateKey(L"From Device to PC") : XlateKey(L"From PC to Device"));
     // The doubled brace stands for one; the single one at the end stays as it is.
     return qel_text::detail::qel_safefmt_impl(
+        // Translators: file {1} of {2}, {3} is the direction; the braces around it all are meant.
         Xlate(L"{{Copying File {1}/{2}  - {3}}"),
         {qel_formats::IntToString(number), qel_formats::IntToString(count), direction_text});
 }
