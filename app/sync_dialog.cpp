@@ -23,18 +23,35 @@ constexpr COLORREF kBackground = RGB(0xEC, 0xE9, 0xD8);
 constexpr COLORREF kFieldText = RGB(0x00, 0xFF, 0x00);
 constexpr COLORREF kBlack = RGB(0x00, 0x00, 0x00);
 
-// How long a cancelled worker is waited for. It ends at its next 8192-byte chunk or row, unless a question
-// to the user holds it up.
-constexpr DWORD kCancelledWorkerWaitMs = 2000;
+// How long a worker that the user leaves behind may take to put away what it is about. A question to the user
+// or a silent device may hold it up for longer: nothing waits for those.
+constexpr DWORD kLeavingWaitMs = 500;
 
-// Reports are handled for so long at a time, then the user's clicks and the painting have their turn: the
-// timer that resumes is served after both.
+// Reports are handled for so long at a time, then the user's clicks and the painting have their turn.
 constexpr DWORD kReportBudgetMs = 30;
 constexpr UINT_PTR kReportTimer = 1;
 
 // Painting a step of the bar or a line of the log takes longer than most files take to be copied: what the
 // reports change is shown in one go, this often at most.
 constexpr DWORD kShowIntervalMs = 50;
+
+std::wstring StatusText(RunState state) {
+    switch (state) {
+        case RunState::kRunning:
+        case RunState::kDiskFull:  // That the run looks like running until the user cancels it is meant.
+            return Xlate(L"Synchronization in progress...");
+        case RunState::kCancelled:
+            return Xlate(L"Sychronization cancelled");
+        case RunState::kComplete:
+            return Xlate(L"Synchronization complete.");
+        default:
+            return {};
+    }
+}
+
+bool CanBeCancelled(RunState state) {
+    return state == RunState::kRunning || state == RunState::kDiskFull;
+}
 
 // The about box.
 class CAboutDlg : public ui::Dialog {
@@ -48,22 +65,17 @@ CWendlowDlg::CWendlowDlg()
     : Dialog(IDD_SYNC),
       background_(CreateSolidBrush(kBackground)),
       icon_(LoadIconW(ResourceModule(), MAKEINTRESOURCEW(IDI_APPLICATION_ICON))),
-      settings_(LoadSettings()) {
-    settings_block_ = RefreshSettingsBlock(settings_);
-}
+      settings_(LoadSettings()) {}
 
 bool CWendlowDlg::HasRunningWorker() const {
-    const auto runs = [](const UniqueThread& worker) {
-        return worker && WaitForSingleObject(worker.Get(), 0) == WAIT_TIMEOUT;
-    };
-    return runs(first_worker_) || runs(second_worker_);
+    return worker_ && WaitForSingleObject(worker_.Get(), 0) == WAIT_TIMEOUT;
 }
 
 bool CWendlowDlg::OnInitDialog() {
     SendMessageW(Handle(), WM_SETICON, ICON_BIG, reinterpret_cast<LPARAM>(icon_));
     SendMessageW(Handle(), WM_SETICON, ICON_SMALL, reinterpret_cast<LPARAM>(icon_));
     SetWindowTextW(Handle(), Xlate(L"Desktop-Mobile Device Synchronization").c_str());
-    SetDlgItemTextW(Handle(), IDC_SYNC_CANCEL_EXIT, Xlate(L"Exit").c_str());
+    Enter(RunState::kIdle);
 
     HMENU system_menu = GetSystemMenu(Handle(), FALSE);
     AppendMenuW(system_menu, MF_SEPARATOR, 0, nullptr);
@@ -78,8 +90,7 @@ bool CWendlowDlg::OnInitDialog() {
         End(0);
         return true;
     }
-    UpdateWindow(Handle());
-    ShowWindow(Handle(), SW_SHOW);
+    ShowPainted();
     const ui::WaitCursor wait;
     bool accepted = false;
     if (CheckDeviceDateTime(Handle(), device_tree_.StopEvent(), accepted) == 0) {
@@ -89,21 +100,19 @@ bool CWendlowDlg::OnInitDialog() {
     return true;
 }
 
-// Escape and the close box. The user wants to leave: a worker is cancelled first and given the time to
-// remove a file that it has copied in part.
+// Escape and the close box.
 void CWendlowDlg::OnCancel() {
-    if (HasRunningWorker()) {
-        CancelWorker();
-        for (const UniqueThread* worker : {&first_worker_, &second_worker_}) {
-            if (*worker) {
-                WaitForSingleObject(worker->Get(), kCancelledWorkerWaitMs);
-            }
-        }
+    if (worker_) {
+        CancelRun();
+        WaitForSingleObject(worker_.Get(), kLeavingWaitMs);
     }
     Dialog::OnCancel();
 }
 
 bool CWendlowDlg::OnClicked(int id) {
+    if (reads_job_folders_) {
+        return true;
+    }
     switch (id) {
         case IDC_SYNC_START:
             OnSynchronize();
@@ -131,7 +140,6 @@ std::optional<LRESULT> CWendlowDlg::OnMessage(UINT message, WPARAM wparam, LPARA
             if (wparam != kReportTimer) {
                 return std::nullopt;
             }
-            KillTimer(Handle(), kReportTimer);
             OnSyncNotify();
             return 0;
         case WM_WINDOWPOSCHANGING:
@@ -192,47 +200,55 @@ std::optional<LRESULT> CWendlowDlg::OnCtlColor(UINT message, HDC dc) {
 }
 
 void CWendlowDlg::OnSynchronize() {
-    if (!SettleEarlierRun()) {
+    if (worker_) {
+        MessageBeep(MB_OK);
         return;
     }
-    const ui::WaitCursor wait;
-    SetDlgItemTextW(Handle(), IDC_SYNC_STATUS, Xlate(L"Synchronization in progress...").c_str());
-    FileNode device_root;
-    if (!device_tree_.ReadOnThread(settings_.sync_path_ce, {}, device_root, Handle())) {
-        ui::ShowMessageBox(Handle(), Xlate(L"failed to read from remote device."));
-        SetDlgItemTextW(Handle(), IDC_SYNC_STATUS, L"");
+    ShowStatus(StatusText(RunState::kRunning));
+    JobTable pc;
+    JobTable device;
+    if (!ReadJobFolders(pc, device)) {
+        ShowStatus({});
         return;
     }
-    FillTask(ListPcJobFolder(settings_.sync_path_dt), JobTable(device_root));
+    FillTask(std::move(pc), std::move(device));
     ShowStart();
-    StartWorker(first_worker_, SyncThreadDT2CE);
+    StartWorker(SyncThreadDT2CE);
 }
 
-// True when no worker runs any more and everything that the last ones reported has been handled. A worker
-// that was not cancelled is not waited for.
-bool CWendlowDlg::SettleEarlierRun() {
-    for (;;) {
-        UniqueThread& worker = second_worker_ ? second_worker_ : first_worker_;
-        const HANDLE thread = worker.Get();
-        if (worker &&
-            WaitForSingleObject(thread, task_.cancelled ? kCancelledWorkerWaitMs : 0) != WAIT_OBJECT_0) {
-            return false;
+// False when there is nothing to start from. The user knows why, or wanted to leave: the dialog ends then.
+bool CWendlowDlg::ReadJobFolders(JobTable& pc, JobTable& device) {
+    bool device_read = false;
+    const auto read = [&] {
+        FileNode device_root;
+        // An empty folder would be the device's whole storage.
+        device_read = !settings_.sync_path_ce.empty() &&
+                      device_tree_.ReadDeviceTree(settings_.sync_path_ce, {}, device_root, Handle());
+        if (device_read) {
+            device = JobTable(device_root);
+            pc = ListPcJobFolder(settings_.sync_path_dt);
         }
-        // Its last report may be its completion, which forgets the worker and starts the next one.
-        task_.reports.Drain(INFINITE, [this](SyncReport report) { HandleReport(std::move(report)); });
-        if (worker.Get() == thread) {
-            worker.Reset();
-        }
-        if (!first_worker_ && !second_worker_) {
-            ShowReports();
-            return true;
-        }
+    };
+    reads_job_folders_ = true;
+    ui::Waited waited = ui::Waited::kFailed;
+    {
+        const ui::WaitCursor wait;
+        waited = ui::RunAndPaint(read, device_tree_.StopEvent(), DeviceTreeReader::kStackBytes);
     }
+    reads_job_folders_ = false;
+    if (waited == ui::Waited::kClosed) {
+        Dialog::OnCancel();
+        return false;
+    }
+    if (waited == ui::Waited::kFailed || !device_read) {
+        ui::ShowMessageBox(Handle(), Xlate(L"failed to read from remote device."));
+        return false;
+    }
+    return true;
 }
 
 void CWendlowDlg::FillTask(JobTable pc, JobTable device) {
     task_.cancelled = false;
-    task_.info_text.clear();
     task_.pc = {std::move(pc), std::wstring(WithoutTrailingBackslashes(settings_.sync_path_dt))};
     task_.device = {std::move(device), std::wstring(WithoutTrailingBackslashes(settings_.sync_path_ce))};
     task_.types = SynchronizedTypes(settings_.types);
@@ -242,7 +258,7 @@ void CWendlowDlg::FillTask(JobTable pc, JobTable device) {
 }
 
 void CWendlowDlg::ShowStart() {
-    SetDlgItemTextW(Handle(), IDC_SYNC_CANCEL_EXIT, Xlate(L"Cancel").c_str());
+    Enter(RunState::kRunning);
     HWND progress = Item(IDC_SYNC_PROGRESS);
     // The maximum is a 16-bit value; more rows than that wrap.
     SendMessageW(progress, PBM_SETRANGE, 0,
@@ -255,56 +271,54 @@ void CWendlowDlg::ShowStart() {
     SendMessageW(log, LB_SETCARETINDEX, static_cast<WPARAM>(lines), FALSE);
 }
 
-void CWendlowDlg::StartWorker(UniqueThread& worker, LPTHREAD_START_ROUTINE procedure) {
-    worker.Reset(CreateThread(nullptr, kSyncThreadStack, procedure, &task_, 0, nullptr));
-    if (!worker) {
-        // The system has no thread left: the dialog is as after a cancellation.
-        CancelWorker();
+void CWendlowDlg::StartWorker(LPTHREAD_START_ROUTINE procedure) {
+    worker_.Reset(CreateThread(nullptr, kSyncThreadStack, procedure, &task_, 0, nullptr));
+    if (!worker_) {
+        Enter(RunState::kCancelled);  // The system has no thread left.
     }
 }
 
 void CWendlowDlg::OnCancelExit() {
-    const std::wstring text = ui::WindowText(Item(IDC_SYNC_CANCEL_EXIT));
-    if (text == Xlate(L"Exit")) {
-        // A cancelled worker may still be copying; it is not waited for.
+    if (CanBeCancelled(state_)) {
+        CancelRun();
+        cancelled_at_ = GetTickCount64();
+    } else if (state_ != RunState::kCancelled || GetTickCount64() - cancelled_at_ > GetDoubleClickTime()) {
+        // Not the second click of a double click on "Cancel". A cancelled worker may still be copying; it is
+        // not waited for.
         OnOK();
-    } else if (text == Xlate(L"Cancel")) {
-        CancelWorker();
     }
 }
 
 void CWendlowDlg::OnSettings() {
-    if (auto saved = RunOptions(Handle(), settings_block_)) {
+    if (auto saved = RunOptions(Handle(), RefreshSettingsBlock(settings_))) {
         settings_ = std::move(*saved);
     }
-    settings_block_ = RefreshSettingsBlock(settings_);
 }
 
-// The view's settings come back in the block alone: what it stored in the registry reaches this dialog's own
-// settings at the next start.
 void CWendlowDlg::OnFileView() {
-    CCeFileTransfDlg view(settings_block_, false, Handle());
+    if (worker_) {
+        MessageBeep(MB_OK);
+        return;
+    }
+    CCeFileTransfDlg view(RefreshSettingsBlock(settings_), false, Handle());
     view.DoModal();
-    settings_block_ = view.Settings();
+    settings_ = SettingsOf(view.Settings());
 }
 
-void CWendlowDlg::CancelWorker() {
+void CWendlowDlg::CancelRun() {
     task_.cancelled = true;
     if (const HANDLE event = task_.copy_cancel_event) {
         SetEvent(event);
     }
-    SetDlgItemTextW(Handle(), IDC_SYNC_STATUS, Xlate(L"Sychronization cancelled").c_str());
-    SetDlgItemTextW(Handle(), IDC_SYNC_CANCEL_EXIT, Xlate(L"Exit").c_str());
+    Enter(RunState::kCancelled);
 }
 
+// Reports wait in the queue, or what they changed waits to be shown.
 void CWendlowDlg::OnSyncNotify() {
     // Armed first: should a report run out of memory, the timer brings the dialog back for the rest.
     SetTimer(Handle(), kReportTimer, kShowIntervalMs, nullptr);
     const bool all_handled =
         task_.reports.Drain(kReportBudgetMs, [this](SyncReport report) { HandleReport(std::move(report)); });
-    if (!all_handled) {
-        SetTimer(Handle(), kReportTimer, USER_TIMER_MINIMUM, nullptr);
-    }
     if (GetTickCount64() - reports_shown_at_ >= kShowIntervalMs) {
         ShowReports();
         if (all_handled) {
@@ -314,82 +328,66 @@ void CWendlowDlg::OnSyncNotify() {
 }
 
 void CWendlowDlg::HandleReport(SyncReport report) {
-    task_.command = report.command;
-    if (report.info_text) {
-        task_.info_text = std::move(*report.info_text);
-    }
-    if (task_.command == kIncrementProgress) {
+    if (report.command == kIncrementProgress) {
         ++unshown_steps_;
-    } else if (task_.command == kAddInfoDisplay) {
-        OnAddInfo();
-    } else if (task_.command == kErrorInfoDisplay) {
-        OnErrorInfo();
-    } else if (task_.command == kTaskCompleteDt2Ce) {
-        OnFirstPassComplete();
-    } else if (task_.command == kTaskCompleteCe2Dt) {
-        OnSecondPassComplete();
-    }
-}
-
-void CWendlowDlg::OnAddInfo() {
-    if (!task_.info_text.empty()) {
+    } else if (report.command == kAddInfoDisplay) {
         ++unshown_steps_;
-        unshown_lines_.push_back(std::move(task_.info_text));
-        task_.info_text.clear();
-    }
-}
-
-// Marks the line of the failed file in the log, if the log's lines were windows. They are not, and so an
-// error only discards its text: the file's line stays as it was. That is meant.
-void CWendlowDlg::OnErrorInfo() {
-    if (!task_.info_text.empty()) {
-        const LRESULT position = SendMessageW(Item(IDC_SYNC_PROGRESS), PBM_GETPOS, 0, 0) + unshown_steps_;
-        if (HWND line = GetDlgItem(Item(IDC_SYNC_LOG), static_cast<int>(position))) {
-            SetWindowTextW(line, (ui::WindowText(line) + L"- FAILED").c_str());
+        unshown_lines_.push_back(std::move(report.info_text));
+    } else if (report.command == kErrorInfoDisplay) {
+        // Its text was to mark the failed file's line, as a child window of the log. A list box has none: the
+        // text is dropped and the line stays as it was, which is meant.
+        if (unshown_lines_.empty()) {
+            SelectLastLogLine();  // Else it is selected when they are shown.
         }
-        task_.info_text.clear();
-    }
-    if (unshown_lines_.empty()) {
-        SelectLastLogLine();  // Else it is selected when they are shown.
+    } else {
+        OnWorkerEnded(report);
     }
 }
 
-void CWendlowDlg::OnFirstPassComplete() {
-    if (first_worker_) {
-        AwaitAndForget(first_worker_);
-        if (!task_.cancelled) {
-            StartWorker(second_worker_, SyncThreadCE2DT);
-        }
-    }
-}
-
-void CWendlowDlg::OnSecondPassComplete() {
-    if (!second_worker_) {
+void CWendlowDlg::OnWorkerEnded(const SyncReport& report) {
+    // Ends because the report was the last thing that the worker did.
+    SetThreadPriority(worker_.Get(), THREAD_PRIORITY_ABOVE_NORMAL);
+    WaitForSingleObject(worker_.Get(), INFINITE);
+    worker_.Reset();
+    if (report.command == kTaskCompleteCe2Dt) {
+        OnComplete();
+    } else if (state_ == RunState::kCancelled) {
         return;
+    } else if (report.command == kTaskCompleteDt2Ce) {
+        StartWorker(SyncThreadCE2DT);
+    } else {
+        Enter(report.end == PassEnd::kDiskFull ? RunState::kDiskFull : RunState::kCancelled);
     }
-    AwaitAndForget(second_worker_);
+}
+
+void CWendlowDlg::OnComplete() {
     ShowReports();
     HWND progress = Item(IDC_SYNC_PROGRESS);
     const LRESULT upper_end = SendMessageW(progress, PBM_GETRANGE, FALSE, 0);
     SendMessageW(progress, PBM_SETPOS, static_cast<WPARAM>(upper_end), 0);
-    if (!task_.info_text.empty()) {
-        AddLogLine(task_.info_text);
-    }
-    const std::wstring complete = Xlate(L"Synchronization complete.");
-    AddLogLine(complete);
+    AddLogLine(StatusText(RunState::kComplete));
     SelectLastLogLine();
-    SetDlgItemTextW(Handle(), IDC_SYNC_STATUS, complete.c_str());
-    SetDlgItemTextW(Handle(), IDC_SYNC_CANCEL_EXIT, Xlate(L"Exit").c_str());
+    Enter(RunState::kComplete);
     UpdateWindow(Handle());
     Sleep(100);  // The full bar is seen for a moment.
     ShowWindow(progress, SW_HIDE);
 }
 
-// A worker's completion is the last thing that it does, so the wait is short.
-void CWendlowDlg::AwaitAndForget(UniqueThread& worker) {
-    SetThreadPriority(worker.Get(), THREAD_PRIORITY_ABOVE_NORMAL);
-    WaitForSingleObject(worker.Get(), INFINITE);
-    worker.Reset();
+void CWendlowDlg::Enter(RunState state) {
+    state_ = state;
+    const std::wstring caption = CanBeCancelled(state) ? Xlate(L"Cancel") : Xlate(L"Exit");
+    SetDlgItemTextW(Handle(), IDC_SYNC_CANCEL_EXIT, caption.c_str());
+    ShowStatus(StatusText(state));
+}
+
+void CWendlowDlg::ShowStatus(std::wstring text) {
+    if (text == status_) {
+        return;
+    }
+    status_ = std::move(text);
+    SetDlgItemTextW(Handle(), IDC_SYNC_STATUS, status_.c_str());
+    // A screen reader reads it out then.
+    NotifyWinEvent(EVENT_OBJECT_NAMECHANGE, Item(IDC_SYNC_STATUS), OBJID_CLIENT, CHILDID_SELF);
 }
 
 void CWendlowDlg::AddLogLine(const std::wstring& text) {

@@ -13,14 +13,23 @@
 
 namespace orvane {
 
+// How far a synchronization has come. The caption of button 1009 and the status line show it.
+enum class RunState {
+    kIdle,
+    kRunning,
+    kCancelled,
+    kComplete,
+    kDiskFull,  // The target's disk was full: no worker is left.
+};
+
 // Holds the settings in memory, starts and cancels synchronizations, and shows what their workers report.
-// All of it runs on the user-interface thread. The object must outlive its workers (HasRunningWorker).
+// All of it runs on the user-interface thread. The object must outlive its worker (HasRunningWorker).
 class CWendlowDlg : public ui::Dialog {
   public:
     // Loads the settings, which opens a device session and may take as long as ConnectDevice waits.
     CWendlowDlg();
 
-    // Whether a worker's thread has not ended yet. Any thread may ask once the dialog has closed.
+    // Whether a worker's thread has not ended yet. Other threads may ask once the dialog has closed.
     bool HasRunningWorker() const;
 
   protected:
@@ -39,21 +48,18 @@ class CWendlowDlg : public ui::Dialog {
     bool OnPaint();
     std::optional<LRESULT> OnCtlColor(UINT message, HDC dc);
 
-    // Starting a synchronization.
-    bool SettleEarlierRun();
+    // A run from its start to its end.
+    bool ReadJobFolders(JobTable& pc, JobTable& device);
     void FillTask(JobTable pc, JobTable device);
     void ShowStart();
-    void StartWorker(UniqueThread& worker, LPTHREAD_START_ROUTINE procedure);
-
-    // Handling a report.
+    void StartWorker(LPTHREAD_START_ROUTINE procedure);
+    void CancelRun();
     void HandleReport(SyncReport report);
-    void OnAddInfo();
-    void OnErrorInfo();
-    void OnFirstPassComplete();
-    void OnSecondPassComplete();
+    void OnWorkerEnded(const SyncReport& report);
+    void OnComplete();
 
-    void CancelWorker();
-    void AwaitAndForget(UniqueThread& worker);
+    void Enter(RunState state);
+    void ShowStatus(std::wstring text);
     void AddLogLine(const std::wstring& text);
     void SelectLastLogLine();
     void ShowReports();
@@ -62,15 +68,17 @@ class CWendlowDlg : public ui::Dialog {
     UniqueBrush background_;
     HICON icon_;
     SyncSettings settings_;
-    SyncSettingsBlock settings_block_;
     DeviceTreeReader device_tree_;
+    bool reads_job_folders_ = false;  // All input is dropped.
+    RunState state_ = RunState::kIdle;
+    ULONGLONG cancelled_at_ = 0;  // By "Cancel", in ticks.
+    std::wstring status_;         // What the status line shows.
     SyncTask task_;
+    UniqueThread worker_;  // From its start until its last report has been handled.
     // What reports have changed and the controls do not show yet; since when they do not, in ticks.
     LRESULT unshown_steps_ = 0;
     std::vector<std::wstring> unshown_lines_;
     ULONGLONG reports_shown_at_ = 0;
-    UniqueThread first_worker_;   // Desktop to device.
-    UniqueThread second_worker_;  // Device to desktop.
 };
 
 }  // namespace orvane

@@ -68,33 +68,32 @@ class SyncPass {
         }
     }
 
-    void Run() {
-        for (std::int32_t row = 0; row < source_.listing.rows; ++row) {
-            if (task_.cancelled || !HandleRow(static_cast<std::size_t>(row))) {
-                return;
+    PassEnd Run() {
+        for (std::int32_t row = 0; row < source_.listing.rows && !task_.cancelled; ++row) {
+            const PassEnd end = HandleRow(static_cast<std::size_t>(row));
+            if (end != PassEnd::kComplete) {
+                return end;
             }
         }
-        if (!task_.cancelled) {
-            Report(kind_.completion);
-        }
+        return task_.cancelled ? PassEnd::kCancelled : PassEnd::kComplete;
     }
 
   private:
-    // False when the pass is over because the target disk is full.
-    bool HandleRow(std::size_t row) {
+    // kComplete when the pass goes on.
+    PassEnd HandleRow(std::size_t row) {
         const std::wstring_view name = source_.listing.table.names[row];
         const FILETIME& write_time = source_.listing.table.write_times[row];
         if (ShouldSkipCopy(task_.overwrite_old_files, write_time, name, index_, ask_replace_)) {
             Report(kIncrementProgress);
-            return true;
+            return PassEnd::kComplete;
         }
         if (source_.listing.table.kinds[row] != kKindFile || !PassesExtensionFilter(name, task_.types)) {
-            return true;
+            return PassEnd::kComplete;
         }
         return CopyRow(name, write_time);
     }
 
-    bool CopyRow(std::wstring_view name, const FILETIME& write_time) {
+    PassEnd CopyRow(std::wstring_view name, const FILETIME& write_time) {
         const EntryCopy entry = {task_.pc.folder, task_.device.folder, name, kind_.to_device};
         const HANDLE cancel = task_.copy_cancel_event;
         const bool can_copy = CanCopyEntry(entry, kind_.to_device && make_backup_);
@@ -105,13 +104,13 @@ class SyncPass {
         const DeviceResult result = can_copy ? CopyFile(entry, write_time, cancel) : DeviceResult::kFailed;
         if (result == DeviceResult::kDiskFull) {
             Report(kAddInfoDisplay, Xlate(kind_.disk_full));
-            return false;
+            return PassEnd::kDiskFull;
         }
         if (result != DeviceResult::kDone) {
             Report(kErrorInfoDisplay, Xlate(kind_.failure));
         }
         CopyCompanionFolder(entry, cancel, /*nested=*/false);
-        return true;
+        return PassEnd::kComplete;
     }
 
     DeviceResult CopyFile(const EntryCopy& entry, const FILETIME& write_time, HANDLE cancel) const {
@@ -134,8 +133,8 @@ class SyncPass {
         return kind_.copy_line() + std::wstring(name) + L'"';
     }
 
-    void Report(std::wstring_view command, std::optional<std::wstring> info_text = std::nullopt) {
-        task_.reports.Push({command, std::move(info_text)});
+    void Report(std::wstring_view command, std::wstring info_text = {}) {
+        task_.reports.Push({.command = command, .info_text = std::move(info_text)});
     }
 
     SyncTask& task_;
@@ -149,12 +148,15 @@ class SyncPass {
 
 void RunPass(void* task, const PassKind& kind) noexcept {
     auto& sync_task = *static_cast<SyncTask*>(task);
+    PassEnd end = PassEnd::kOutOfMemory;
     try {
         sync_task.copy_cancel_event = NewManualResetEvent().Release();
-        SyncPass(sync_task, kind).Run();
+        end = SyncPass(sync_task, kind).Run();
     } catch (...) {
-        // Out of memory: the pass ends as a cancelled one does, and what was copied stays.
+        // Out of memory: what was copied stays.
     }
+    const std::wstring_view command = end == PassEnd::kComplete ? kind.completion : kTaskEnded;
+    sync_task.reports.PushLast({.command = command, .end = end});
 }
 
 }  // namespace

@@ -7,7 +7,7 @@ namespace orvane {
 
 // Copy what is due from the PC to the device, and from the device to the PC. The parameter is the SyncTask,
 // which must outlive the worker. The result is always 0: what happens is told by reports, the last of them
-// "Task Complete DT2CE" or "Task Complete CE2DT" unless the pass was cancelled or the target disk is full.
+// "Task Complete DT2CE" or "Task Complete CE2DT", or "Task Ended" when the pass is not complete.
 DWORD WINAPI SyncThreadDT2CE(void* task) noexcept;
 DWORD WINAPI SyncThreadCE2DT(void* task) noexcept;
 

@@ -4,7 +4,6 @@
 #include <windows.h>
 
 #include <atomic>
-#include <optional>
 #include <string>
 #include <string_view>
 
@@ -23,11 +22,17 @@ inline constexpr std::wstring_view kAddInfoDisplay = L"Add Info Display";
 inline constexpr std::wstring_view kErrorInfoDisplay = L"Error Info Display";
 inline constexpr std::wstring_view kTaskCompleteDt2Ce = L"Task Complete DT2CE";
 inline constexpr std::wstring_view kTaskCompleteCe2Dt = L"Task Complete CE2DT";
+// The pass has ended before it was complete.
+inline constexpr std::wstring_view kTaskEnded = L"Task Ended";
 
-// One report of a worker. A report without an info text leaves the dialog's as it is.
+// How a pass came to its end.
+enum class PassEnd { kComplete, kCancelled, kDiskFull, kConnectionLost, kOutOfMemory };
+
+// One report of a worker. The last one of each worker tells the pass's end.
 struct SyncReport {
     std::wstring_view command;  // One of the constants above.
-    std::optional<std::wstring> info_text;
+    std::wstring info_text{};
+    PassEnd end = PassEnd::kComplete;
 };
 
 // One side of a synchronization: its listing and its job folder, without a trailing "\".
@@ -37,11 +42,8 @@ struct SyncSide {
 };
 
 // One per dialog, reused by every synchronization. Everything but the atomics and the queue is filled by the
-// dialog before a worker starts and only read by the worker, except command and info text, which are the
-// dialog's own: the report that it handles.
+// dialog before a worker starts and only read by the worker.
 struct SyncTask {
-    std::wstring_view command;
-    std::wstring info_text;
     SyncSide pc;
     SyncSide device;
     // Made anew by each worker when it starts, handed to all its device and file operations, signalled by

@@ -31,8 +31,7 @@ bool CCeBrowseDlg::OnInitDialog() {
     }
     // Now and not after this handler, because the read keeps the thread busy: the wait dialog, and the
     // message when there is no device, are to have the dialog behind them.
-    ShowWindow(Handle(), SW_SHOW);
-    RedrawWindow(Handle(), nullptr, nullptr, RDW_INVALIDATE | RDW_ERASE | RDW_UPDATENOW | RDW_ALLCHILDREN);
+    ShowPainted();
     tree_.Reload();
     // In time: the tree is filled by a posted message.
     tree_.SetPathToSelect(initial_folder_);

@@ -76,7 +76,7 @@ bool UCeDirTree::Reload() {
     RedrawWindow(Handle(), nullptr, nullptr, RDW_INVALIDATE | RDW_ERASE | RDW_UPDATENOW);
     ShowWaitDialog();
     Sleep(kPauseBeforeReadMs);
-    reader_.ReadDirectly(L"\\", filters_, root_, Handle());
+    reader_.ReadDeviceTree(L"\\", filters_, root_, Handle());
     return false;
 }
 

@@ -23,11 +23,6 @@ CLoadProgressDlg::CLoadProgressDlg(std::wstring text, HWND parent)
              LoadOwnedIcon(IDI_LOAD_FRAME_2), LoadOwnedIcon(IDI_LOAD_FRAME_3),
              LoadOwnedIcon(IDI_LOAD_FRAME_4)} {}
 
-void CLoadProgressDlg::ShowPainted() {
-    ShowWindow(Handle(), SW_SHOW);
-    RedrawWindow(Handle(), nullptr, nullptr, RDW_INVALIDATE | RDW_ERASE | RDW_UPDATENOW | RDW_ALLCHILDREN);
-}
-
 bool CLoadProgressDlg::OnInitDialog() {
     SetDlgItemTextW(Handle(), IDC_LOAD_TEXT, text_.c_str());
     SetTimer(Handle(), kFrameTimer, kFrameMs, nullptr);

@@ -18,9 +18,6 @@ class CLoadProgressDlg : public ui::Dialog {
     CLoadProgressDlg(std::wstring text, HWND parent);
     ~CLoadProgressDlg() override { Destroy(); }  // Before the icons that the window shows.
 
-    // Shows the window and paints all of it before it returns.
-    void ShowPainted();
-
   protected:
     bool OnInitDialog() override;
     void OnOK() override {}

@@ -5,7 +5,6 @@
 
 #include <span>
 #include <string>
-#include <vector>
 
 #include "device/file_node.h"
 #include "device/load_worker.h"
@@ -14,29 +13,28 @@
 
 namespace orvane {
 
-// Owns a stop event, the thread of a read and the request that it works on; used by one thread, the one
-// whose dialog shows the tree. The `root` of a read belongs to the caller and holds the tree when the
-// read returns. Each read first ends what the previous one left.
+// Owns a stop event and the request that a read works on. A read may run on a worker, while which the object
+// is left alone but for its stop event.
 class DeviceTreeReader {
   public:
     DeviceTreeReader() : stop_event_(NewManualResetEvent()) {}
     DeviceTreeReader(const DeviceTreeReader&) = delete;
     DeviceTreeReader& operator=(const DeviceTreeReader&) = delete;
-    ~DeviceTreeReader() { StopThread(); }
 
-    // Reads `folder` with all that lies below on a thread of its own and waits for it; the calling thread
-    // handles no messages meanwhile. `notify_window` (null for none) is told by kDeviceTreeLoadedMessage.
-    // False when the tree was not read: no device, a refused folder, a path of 260 characters or more, no
-    // thread to be had. A read that was stopped counts as read; Result tells.
-    bool ReadOnThread(const std::wstring& folder, std::span<const std::wstring> extensions, FileNode& root,
-                      HWND notify_window);
+    // Reads `folder` with all that lies below into `root`, in a session of its own on the calling thread.
+    // `extensions`: as for ListDeviceFolder. `notify_window` (null for none) is told by
+    // kDeviceTreeLoadedMessage. False when the tree was not read: no device, a refused folder, a path of 260
+    // characters or more. A read that was stopped counts as read; Result tells.
+    bool ReadDeviceTree(const std::wstring& folder, std::span<const std::wstring> extensions, FileNode& root,
+                        HWND notify_window);
 
-    // The same on the calling thread.
-    bool ReadDirectly(const std::wstring& folder, std::span<const std::wstring> extensions, FileNode& root,
-                      HWND notify_window);
+    // What a worker that reads is to be started with, in bytes: committed at its start, so that a deep tree
+    // cannot run out of it half-way.
+    static constexpr SIZE_T kStackBytes = 0x20000;
 
-    // The stop event (manual reset): signalling it ends a read at the next folder. The next read resets it.
-    // It is the reader's; device operations of the same dialog may take it as their cancel event.
+    // The stop event (manual reset): signalling it ends a read at the next folder, and the reads after it
+    // until it is reset. It is the reader's; device operations of the same dialog may take it as their cancel
+    // event.
     HANDLE StopEvent() const { return stop_event_.Get(); }
     // Of the last read; kFailed before the first.
     DeviceResult Result() const { return request_.result; }
@@ -45,14 +43,8 @@ class DeviceTreeReader {
     const wchar_t* LibraryDirectory() const { return request_.library_directory; }
 
   private:
-    void StopThread();
-    void Prepare(const std::wstring& folder, std::span<const std::wstring> extensions, FileNode& root,
-                 HWND notify_window);
-
     UniqueEvent stop_event_;
-    std::vector<std::wstring> extensions_;
     DeviceTreeRequest request_;
-    UniqueThread thread_;
 };
 
 }  // namespace orvane

@@ -1,5 +1,4 @@
-// Loading a device folder tree: the routine that a thread of its own runs, or that is called directly.
-// DeviceTreeReader is what starts it.
+// Loading a device folder tree: the routine that a thread of its own can run. DeviceTreeReader calls it.
 #pragma once
 
 #include <windows.h>

@@ -229,8 +229,8 @@ bool CCeFileTransfDlg::ReadListings() {
     Comparison comparison = {.types = settings_.types, .overwrite_old_files = settings_.overwrite_old_files};
     {
         FileNode device_root;
-        if (!device_tree_.ReadDirectly(WithTrailingBackslash(settings_.sync_path_ce), {}, device_root,
-                                       Handle())) {
+        if (!device_tree_.ReadDeviceTree(WithTrailingBackslash(settings_.sync_path_ce), {}, device_root,
+                                         Handle())) {
             ui::ShowMessageBox(Handle(), Xlate(L"Failed to read from remote device."));
             return false;
         }

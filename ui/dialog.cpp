@@ -85,6 +85,11 @@ void Dialog::Destroy() {
     }
 }
 
+void Dialog::ShowPainted() {
+    ShowWindow(window_, SW_SHOW);
+    RedrawWindow(window_, nullptr, nullptr, RDW_INVALIDATE | RDW_ERASE | RDW_UPDATENOW | RDW_ALLCHILDREN);
+}
+
 void Dialog::UpdateData(bool save) {
     DataExchange exchange(window_, save);
     DoDataExchange(exchange);

@@ -49,6 +49,8 @@ class Dialog {
     // Creates the modeless window; false when that fails.
     bool Create();
     void Destroy();
+    // Shows the window and paints all of it before it returns, for what keeps the thread busy afterwards.
+    void ShowPainted();
     // The window, null before it exists and from its WM_NCDESTROY on. Other threads may ask.
     HWND Handle() const { return window_; }
 

@@ -5,6 +5,7 @@
 
 #include <deque>
 #include <mutex>
+#include <optional>
 #include <utility>
 
 namespace orvane::ui {
@@ -25,9 +26,15 @@ class ReportQueue {
     void Push(Report report) {
         const std::lock_guard lock(mutex_);
         pushed_.push_back(std::move(report));
-        if (!notified_) {
-            notified_ = PostMessageW(window_, message_, 0, 0) != FALSE;
-        }
+        Notify();
+    }
+
+    // The same for the last report of the only worker that pushes. It needs no memory and so cannot fail, if
+    // moving a report cannot.
+    void PushLast(Report report) noexcept {
+        const std::lock_guard lock(mutex_);
+        last_pushed_ = std::move(report);
+        Notify();
     }
 
     // Window's thread. Calls `handle` with each report, the oldest first, for at most `budget_ms`
@@ -37,9 +44,7 @@ class ReportQueue {
     bool Drain(DWORD budget_ms, Handler handle) {
         const ULONGLONG end = GetTickCount64() + budget_ms;
         while (Refill()) {
-            Report report = std::move(taken_.front());
-            taken_.pop_front();
-            handle(std::move(report));
+            handle(TakeOldest());
             if (GetTickCount64() >= end) {
                 return !Refill();
             }
@@ -48,23 +53,43 @@ class ReportQueue {
     }
 
   private:
+    // With the mutex locked.
+    void Notify() {
+        if (!notified_) {
+            notified_ = PostMessageW(window_, message_, 0, 0) != FALSE;
+        }
+    }
+
     // Takes over what was pushed when all that was taken is handled. False when nothing is left; only then
     // may the next push notify again.
     bool Refill() {
-        if (taken_.empty()) {
+        if (taken_.empty() && !last_taken_) {
             const std::lock_guard lock(mutex_);
             taken_.swap(pushed_);
-            notified_ = !taken_.empty();
+            last_taken_.swap(last_pushed_);
+            notified_ = !taken_.empty() || last_taken_;
         }
-        return !taken_.empty();
+        return !taken_.empty() || last_taken_;
+    }
+
+    Report TakeOldest() {
+        if (taken_.empty()) {
+            return *std::exchange(last_taken_, std::nullopt);
+        }
+        Report report = std::move(taken_.front());
+        taken_.pop_front();
+        return report;
     }
 
     std::mutex mutex_;
     std::deque<Report> pushed_;
+    std::optional<Report> last_pushed_;  // After all in pushed_.
     bool notified_ = false;
     HWND window_ = nullptr;
     UINT message_ = 0;
-    std::deque<Report> taken_;  // Used by the window's thread only.
+    // Used by the window's thread only.
+    std::deque<Report> taken_;
+    std::optional<Report> last_taken_;  // After all in taken_.
 };
 
 }  // namespace orvane::ui

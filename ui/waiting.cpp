@@ -1,5 +1,7 @@
 #include "ui/waiting.h"
 
+#include "platform/handles.h"
+
 namespace orvane::ui {
 
 namespace {
@@ -52,6 +54,22 @@ bool HandlePending(HANDLE stop_event) {
     return go_on;
 }
 
+struct Job {
+    const std::function<void()>& work;
+    bool done = false;
+};
+
+DWORD WINAPI RunJob(void* parameter) noexcept {
+    Job& job = *static_cast<Job*>(parameter);
+    try {
+        job.work();
+        job.done = true;
+    } catch (...) {
+        // Memory is all that can have failed: the job is not done.
+    }
+    return 0;
+}
+
 }  // namespace
 
 WaitCursor::WaitCursor() {
@@ -80,6 +98,19 @@ bool WaitAndPaint(HANDLE worker, HANDLE stop_event) {
             return go_on;
         }
     }
+}
+
+Waited RunAndPaint(const std::function<void()>& work, HANDLE stop_event, SIZE_T stack_bytes) {
+    ResetEvent(stop_event);
+    Job job{work};
+    const UniqueThread worker(CreateThread(nullptr, stack_bytes, RunJob, &job, 0, nullptr));
+    if (!worker) {
+        return Waited::kFailed;
+    }
+    if (!WaitAndPaint(worker.Get(), stop_event)) {
+        return Waited::kClosed;
+    }
+    return job.done ? Waited::kDone : Waited::kFailed;
 }
 
 void DropPendingInput() {

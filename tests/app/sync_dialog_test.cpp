@@ -121,6 +121,9 @@ TEST_F(SyncTest, WorksInTheUsersLanguage) {
         EXPECT_TRUE(WaitUntil([&] { return dialog.Text(IDC_SYNC_CANCEL_EXIT) == L"Abbrechen"; }));
         dialog.Press(IDC_SYNC_CANCEL_EXIT);
         EXPECT_EQ(dialog.Text(IDC_SYNC_CANCEL_EXIT), L"Beenden");
+        dialog.Press(IDC_SYNC_CANCEL_EXIT);  // The second click of a double click.
+        Sleep(GetDoubleClickTime() + 100);
+        EXPECT_FALSE(dialog.HasEnded());
         dialog.Press(IDC_SYNC_CANCEL_EXIT);
         EXPECT_TRUE(WaitUntil([&] { return dialog.HasEnded(); }));
     }

@@ -39,44 +39,41 @@ class DeviceTree : public ::testing::Test {
 };
 
 TEST_F(DeviceTree, IsReadInASessionOfItsOwn) {
-    for (const auto read : {&DeviceTreeReader::ReadOnThread, &DeviceTreeReader::ReadDirectly}) {
-        EXPECT_TRUE((reader_.*read)(L"\\Jobs", {}, root_, window_));
-        EXPECT_EQ(reader_.Result(), DeviceResult::kDone);
-        ASSERT_EQ(root_.child_count, 1);
-        EXPECT_EQ(root_.children[0].child_count, 1);
+    EXPECT_TRUE(reader_.ReadDeviceTree(L"\\Jobs", {}, root_, window_));
+    EXPECT_EQ(reader_.Result(), DeviceResult::kDone);
+    ASSERT_EQ(root_.child_count, 1);
+    EXPECT_EQ(root_.children[0].child_count, 1);
+    EXPECT_EQ(TakeMessages(), 1);
+    EXPECT_TRUE(SessionsAreClosed());
+
+    // Failures tell the window as well.
+    for (const std::wstring& folder : {std::wstring(L"\\Missing"), L"\\" + std::wstring(259, L'a')}) {
+        EXPECT_FALSE(reader_.ReadDeviceTree(folder, {}, root_, window_));
+        EXPECT_EQ(reader_.Result(), DeviceResult::kFailed);
+        EXPECT_EQ(root_.child_count, 0);
         EXPECT_EQ(TakeMessages(), 1);
         EXPECT_TRUE(SessionsAreClosed());
-
-        // Failures tell the window as well.
-        for (const std::wstring& folder : {std::wstring(L"\\Missing"), L"\\" + std::wstring(259, L'a')}) {
-            EXPECT_FALSE((reader_.*read)(folder, {}, root_, window_));
-            EXPECT_EQ(reader_.Result(), DeviceResult::kFailed);
-            EXPECT_EQ(root_.child_count, 0);
-            EXPECT_EQ(TakeMessages(), 1);
-            EXPECT_TRUE(SessionsAreClosed());
-        }
     }
     device_.Set(L"INIT_RESULT", L"0x80004005");
-    EXPECT_FALSE(reader_.ReadOnThread(L"\\Jobs", {}, root_, window_));
+    EXPECT_FALSE(reader_.ReadDeviceTree(L"\\Jobs", {}, root_, window_));
     EXPECT_EQ(TakeMessages(), 1);
 }
 
 TEST_F(DeviceTree, ThatIsStoppedTellsNobodyAndCanBeReadAgain) {
-    for (const auto read : {&DeviceTreeReader::ReadOnThread, &DeviceTreeReader::ReadDirectly}) {
-        device_.Set(L"CALL_DELAY", L"1000");
-        std::jthread signal([this] {
-            Sleep(500);  // The device is busy with the first folder.
-            SetEvent(reader_.StopEvent());
-        });
-        EXPECT_TRUE((reader_.*read)(L"\\Jobs", {}, root_, window_));
-        signal.join();
-        EXPECT_EQ(reader_.Result(), DeviceResult::kListingCancelled);
-        EXPECT_EQ(TakeMessages(), 0);
-        EXPECT_TRUE(SessionsAreClosed());
-        device_.Set(L"CALL_DELAY", L"");
-        EXPECT_TRUE((reader_.*read)(L"\\Jobs", {}, root_, nullptr));
-        EXPECT_EQ(reader_.Result(), DeviceResult::kDone);
-    }
+    device_.Set(L"CALL_DELAY", L"1000");
+    std::jthread signal([this] {
+        Sleep(500);  // The device is busy with the first folder.
+        SetEvent(reader_.StopEvent());
+    });
+    EXPECT_TRUE(reader_.ReadDeviceTree(L"\\Jobs", {}, root_, window_));
+    signal.join();
+    EXPECT_EQ(reader_.Result(), DeviceResult::kListingCancelled);
+    EXPECT_EQ(TakeMessages(), 0);
+    EXPECT_TRUE(SessionsAreClosed());
+    device_.Set(L"CALL_DELAY", L"");
+    ResetEvent(reader_.StopEvent());
+    EXPECT_TRUE(reader_.ReadDeviceTree(L"\\Jobs", {}, root_, nullptr));
+    EXPECT_EQ(reader_.Result(), DeviceResult::kDone);
 }
 
 TEST_F(DeviceTree, ComesWithTheProductFolders) {
@@ -96,7 +93,7 @@ TEST_F(DeviceTree, ComesWithTheProductFolders) {
     for (const auto& c : cases) {
         SCOPED_TRACE(c.values);
         device_.SetRegistry("[HKEY_CURRENT_USER\\Software\\Veltrano\\Dunhallow]\n" + c.values);
-        EXPECT_TRUE(reader_.ReadDirectly(L"\\Jobs", {}, root_, nullptr));
+        EXPECT_TRUE(reader_.ReadDeviceTree(L"\\Jobs", {}, root_, nullptr));
         EXPECT_EQ(root_.child_count, 1);
         EXPECT_EQ(reader_.DataDirectory(), c.data);
         EXPECT_EQ(reader_.LibraryDirectory(), c.library);

@@ -60,9 +60,8 @@ TEST(RemoteApiAbsent, OperationsFailSoftly) {
     FileNode root;
     root.children = std::make_unique<FileNode[]>(1);
     root.child_count = 1;
-    EXPECT_FALSE(reader.ReadOnThread(L"\\", {}, root, nullptr));
+    EXPECT_FALSE(reader.ReadDeviceTree(L"\\", {}, root, nullptr));
     EXPECT_EQ(root.child_count, 0);
-    EXPECT_FALSE(reader.ReadDirectly(L"\\", {}, root, nullptr));
 
     // The null handle of the missing CeCreateFile passes for a file until the next call fails.
     const testing::MessageBoxAnswerer answerer;

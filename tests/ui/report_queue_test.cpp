@@ -57,6 +57,15 @@ TEST_F(ReportQueueTest, NotifiesOncePerFilling) {
     EXPECT_EQ(handled, 20'010);
     Push(1);
     EXPECT_EQ(PostedMessages(), 1);
+    // The last report comes after all others and is told of like them.
+    queue_.PushLast({1, 0});
+    int last = -1;
+    EXPECT_FALSE(queue_.Drain(0, [&](const auto& report) { last = report.first; }));
+    EXPECT_EQ(last, 0);
+    EXPECT_TRUE(queue_.Drain(0, [&](const auto& report) { last = report.first; }));
+    EXPECT_EQ(last, 1);
+    queue_.PushLast({});
+    EXPECT_EQ(PostedMessages(), 1);
 }
 
 }  // namespace
