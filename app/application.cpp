@@ -34,6 +34,10 @@ void RegisterDialogClass() {
 bool CWendlowApp::InitInstance() {
     const INITCOMMONCONTROLSEX controls = {sizeof(INITCOMMONCONTROLSEX), ICC_WIN95_CLASSES};
     InitCommonControlsEx(&controls);
+    // A window that waits for the device is to be seen, not a picture of it that takes no clicks.
+    DisableProcessWindowsGhosting();
+    // A card that was taken out is a failed call, not a box of the system.
+    SetErrorMode(SetErrorMode(0) | SEM_FAILCRITICALERRORS);
     RegisterDialogClass();
     FollowLanguageSwitch();
 

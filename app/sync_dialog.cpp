@@ -90,6 +90,9 @@ bool CWendlowDlg::OnInitDialog() {
         End(0);
         return true;
     }
+    if (settings_.sync_path_ce.empty()) {
+        ShowStatus(Xlate(L"No mobile device with a job folder was found."));
+    }
     ShowPainted();
     const ui::WaitCursor wait;
     bool accepted = false;
@@ -112,6 +115,9 @@ void CWendlowDlg::OnCancel() {
 bool CWendlowDlg::OnClicked(int id) {
     if (reads_job_folders_) {
         return true;
+    }
+    if (state_ == RunState::kIdle) {
+        ShowStatus({});  // That there was no device at the start is no news any more.
     }
     switch (id) {
         case IDC_SYNC_START:
