@@ -7,11 +7,11 @@
 
 #include <concepts>
 #include <cstddef>
-#include <functional>
+#include <utility>
 #include <vector>
 
+#include "controls/cell_pictures.h"
 #include "controls/sorted_list.h"
-#include "controls/tick_pictures.h"
 
 namespace orvane {
 
@@ -34,7 +34,8 @@ inline constexpr DWORD kColumnBlueText2 = 0x500;
 
 // A list of SortedListRecord: column 0 and 1 show the record's texts, column 2 its tick, by the kinds that
 // are set for the columns. A click into column 2 flips the tick of that row, the space bar that of the
-// focused row. The records belong to the owner: while the list has items they must neither move nor end.
+// focused row. The records belong to the owner: while the list has items they must neither move nor end, nor
+// may their ticks be changed by others.
 // For styles and thread see CSortedListCtrl.
 class USortedListCtrl : public CSortedListCtrl {
   public:
@@ -54,14 +55,23 @@ class USortedListCtrl : public CSortedListCtrl {
     bool SetColumnKind(int column, DWORD flags, INT_PTR extra = 0);
     const std::vector<COLUMN_STRUCT>& Columns() const { return columns_; }
 
-    // Replaces all items by one for each record, in their order, and sorts them by the present setting. All
-    // texts are asked for when they are drawn. The scroll position stays, and so does the focused row if its
-    // record lies at the same address as before.
+    // Replaces all items by one for each record, in their order, and sorts them by the present setting. The
+    // scroll position stays, and so does the focused row if its record lies at the same address as before.
     template <std::derived_from<SortedListRecord> Record>
     void SetItems(std::vector<Record>& records) {
-        SetItems(records.size(),
-                 [&records](std::size_t index) -> SortedListRecord* { return &records[index]; });
+        std::vector<SortedListRecord*> rows;
+        rows.reserve(records.size());
+        for (Record& record : records) {
+            rows.push_back(&record);
+        }
+        SetRecords(std::move(rows));
     }
+
+    // Ticks are changed through the list, which redraws what shows them and keeps count.
+    // False when there is no such row.
+    bool FlipTick(int row);
+    void TickAll(bool ticked);
+    std::size_t TickedCount() const { return ticked_count_; }
 
   protected:
     std::optional<LRESULT> OnMessage(UINT message, WPARAM wparam, LPARAM lparam) override;
@@ -73,26 +83,25 @@ class USortedListCtrl : public CSortedListCtrl {
         int column;
     };
 
-    void SetItems(std::size_t count, const std::function<SortedListRecord*(std::size_t)>& record_at);
-    void InsertItem(int index, SortedListRecord* record, int column_count) const;
-    void ScrollTo(int row) const;
+    void SetRecords(std::vector<SortedListRecord*> rows);
     Cell CellAt(POINT point) const;
-    bool FlipTick(int row) const;
 
-    bool OnLeftButtonDown(POINT point) const;
+    bool OnLeftButtonDown(POINT point);
     void OnLeftButtonDoubleClick(POINT point);
-    bool OnSpace(LPARAM key_data) const;
+    bool OnSpace(LPARAM key_data);
     void OnItemDrawn();
     void OnDrawNotice();
 
     void DrawItem(const DRAWITEMSTRUCT& item);
     void DrawImages(HDC dc, int row, const RECT& bounds) const;
-    void DrawCell(HDC dc, int row, int column, RECT cell, bool selected);
+    void DrawCell(HDC dc, const SortedListRecord& record, int column, RECT cell, bool selected);
+    COLORREF TextColor(int column, bool selected) const;
     RECT CellRect(int column, const RECT& bounds) const;
     RECT ItemRect(int row, LONG part) const;
 
     HWND notify_window_ = nullptr;
     std::vector<COLUMN_STRUCT> columns_;
+    std::size_t ticked_count_ = 0;
     TickPictures tick_pictures_;
     // The private message is on its way.
     bool draw_notice_posted_ = false;

@@ -13,6 +13,7 @@
 #include "settings/options_dialog.h"
 #include "transfer/copy_progress.h"
 #include "transfer/selected_copy.h"
+#include "ui/screen.h"
 #include "ui/waiting.h"
 
 namespace orvane {
@@ -21,7 +22,7 @@ namespace {
 
 struct Column {
     qel_text::TextKey title;
-    int width;  // Pixels.
+    int width;  // Pixels at 100 %.
 };
 constexpr std::array<Column, 3> kColumns = {
     {{XlateKey(L"File Name"), 300}, {XlateKey(L"Date"), 130}, {XlateKey(L" "), 20}}};
@@ -35,7 +36,7 @@ void InsertColumn(HWND list, int index, const Column& column) {
     LVCOLUMNW item{};
     item.mask = LVCF_FMT | LVCF_WIDTH | LVCF_TEXT;
     item.fmt = LVCFMT_LEFT;
-    item.cx = column.width;
+    item.cx = ui::Scaled(column.width, ui::DpiOf(list));
     item.pszText = title.data();
     SendMessageW(list, LVM_INSERTCOLUMNW, static_cast<WPARAM>(index), reinterpret_cast<LPARAM>(&item));
 }
@@ -53,16 +54,6 @@ bool SameFolder(std::wstring_view a, std::wstring_view b) {
 }
 
 }  // namespace
-
-bool CCeFileTransfDlg::Page::HasTicked() const {
-    return std::any_of(candidates.begin(), candidates.end(),
-                       [](const sFileDate& entry) { return entry.ticked; });
-}
-
-bool CCeFileTransfDlg::Page::AllTicked() const {
-    return std::all_of(candidates.begin(), candidates.end(),
-                       [](const sFileDate& entry) { return entry.ticked; });
-}
 
 CCeFileTransfDlg::CCeFileTransfDlg(const SyncSettingsBlock& settings, bool date_check_done, HWND parent)
     : ui::Dialog(IDD_TRANSFER, parent),
@@ -289,10 +280,7 @@ void CCeFileTransfDlg::OnListDoubleClick(HWND list) {
     UpdateData(true);
     const auto selected = static_cast<int>(
         SendMessageW(list, LVM_GETNEXTITEM, static_cast<WPARAM>(-1), MAKELPARAM(LVNI_SELECTED, 0)));
-    if (SortedListRecord* record = selected >= 0 ? page->list.RecordAt(selected) : nullptr) {
-        record->ticked = !record->ticked;
-    }
-    page->list.SetItems(page->candidates);
+    page->list.FlipTick(selected);
     UpdateData(false);
 }
 
@@ -318,10 +306,7 @@ void CCeFileTransfDlg::OnListItemsDrawn(HWND list) {
 
 void CCeFileTransfDlg::OnSelectAll(Page& page) {
     UpdateData(true);
-    for (sFileDate& entry : page.candidates) {
-        entry.ticked = page.all_ticked;
-    }
-    page.list.SetItems(page.candidates);
+    page.list.TickAll(page.all_ticked);
 }
 
 void CCeFileTransfDlg::OnSettings() {

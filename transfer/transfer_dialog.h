@@ -52,8 +52,8 @@ class CCeFileTransfDlg : public ui::Dialog {
         std::vector<sFileDate> candidates{};
         bool all_ticked = false;  // The "Select all file(s)" value.
 
-        bool HasTicked() const;
-        bool AllTicked() const;
+        bool HasTicked() const { return list.TickedCount() > 0; }
+        bool AllTicked() const { return list.TickedCount() == candidates.size(); }
     };
     static constexpr int kPcPage = 0;
     static constexpr int kDevicePage = 1;

@@ -46,7 +46,7 @@ std::vector<ParentWindow::Posted> ParentWindow::Pump() {
 
 ListWindow::ListWindow(int control_id, DWORD extra_style) {
     HWND window =
-        AddControl(WC_LISTVIEWW, LVS_REPORT | LVS_OWNERDRAWFIXED | extra_style, control_id, {0, 0, 480, 280});
+        AddControl(WC_LISTVIEWW, LVS_REPORT | LVS_OWNERDATA | LVS_OWNERDRAWFIXED | extra_style, control_id, {0, 0, 480, 280});
     list.Attach(window);
     list.SetNotifyWindow(Handle());
     list.SetSortEnabled(true);

@@ -1,6 +1,6 @@
 #include <gtest/gtest.h>
 
-#include "controls/color_swatch.h"
+#include "controls/cell_pictures.h"
 #include "controls/record_list.h"
 #include "platform/handles.h"
 #include "tests/controls/list_window.h"
