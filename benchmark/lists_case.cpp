@@ -101,6 +101,10 @@ class View {
         SendMessageW(list, LVM_SETITEMSTATE, static_cast<WPARAM>(row), reinterpret_cast<LPARAM>(&item));
         return Time([&] { SendMessageW(list, WM_KEYDOWN, VK_SPACE, 1); });
     }
+    double DoubleClick(int list_id) const {
+        HWND list = Item(list_id);
+        return Time([&] { SendMessageW(list, WM_LBUTTONDBLCLK, MK_LBUTTON, MAKELPARAM(20, 50)); });
+    }
     double RepaintAll() const {
         return Time([&] {
             RedrawWindow(thread_.Window(), nullptr, nullptr,
@@ -126,6 +130,7 @@ bool RunLists(const std::wstring& pc_folder) {
     constexpr int kDevicePage = 1;
     constexpr int kInNameColumn = 20;  // Pixels from the left.
     constexpr int kInDateColumn = 320;
+    constexpr int kInTickColumn = 440;
     for (int run = 0; run < kRuns; ++run) {
         JsonLine line;
         line.Add("refresh_ms", view.Press(IDC_TRANSFER_REFRESH));
@@ -134,9 +139,11 @@ bool RunLists(const std::wstring& pc_folder) {
         line.Add("select_all_ms", view.Press(IDC_TRANSFER_DEVICE_ALL));
         line.Add("select_none_ms", view.Press(IDC_TRANSFER_DEVICE_ALL));
         line.Add("tick_ms", view.TickRow(IDC_TRANSFER_DEVICE_LIST, 3));
+        line.Add("double_click_ms", view.DoubleClick(IDC_TRANSFER_DEVICE_LIST));
         line.Add("sort_by_date_ms", view.ClickHeader(IDC_TRANSFER_DEVICE_LIST, kInDateColumn));
         line.Add("sort_by_name_ms", view.ClickHeader(IDC_TRANSFER_DEVICE_LIST, kInNameColumn));
         line.Add("sort_reverse_ms", view.ClickHeader(IDC_TRANSFER_DEVICE_LIST, kInNameColumn));
+        line.Add("sort_by_tick_ms", view.ClickHeader(IDC_TRANSFER_DEVICE_LIST, kInTickColumn));
         line.Add("repaint_ms", view.RepaintAll());
         line.Add("to_pc_page_ms", view.SelectPage(kPcPage));
         line.Add("rows", static_cast<double>(view.Count(IDC_TRANSFER_DEVICE_LIST)));

@@ -140,10 +140,13 @@ latency_cases() {
 }
 
 list_cases() {
-  clear_sides
-  lay pc p "$(of_size 10000)" 0
-  lay device d "$(of_size 10000)" 0
-  measure lists 1 lists "$(windows_path "$work/pc/Jobs")\\"
+  local count
+  for count in $(of_size 10000) $(of_size 100000); do
+    clear_sides
+    lay pc p "$count" 0
+    lay device d "$count" 0
+    measure "lists $count" 1 lists "$(windows_path "$work/pc/Jobs")\\"
+  done
   clear_sides
   measure_other "start xcopy" 3 xcopy_both
   lay device d "$(of_size 200000)" 0 # 2,000 folders

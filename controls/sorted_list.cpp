@@ -158,16 +158,19 @@ void CSortedListCtrl::Sort() {
     }
     const SortedListRecord* focused = RecordAt(NextItem(-1, LVNI_FOCUSED));
     std::vector<const SortedListRecord*> selected;
-    for (int row = HasSelection() ? NextItem(-1, LVNI_SELECTED) : -1; row >= 0;
-         row = NextItem(row, LVNI_SELECTED)) {
+    for (const int row : SelectedItems()) {
         selected.push_back(RecordAt(row));
+    }
+    if (selected.size() == rows_.size()) {
+        selected.clear();  // They stay as they are, whatever their order.
+    } else {
+        ClearStates();
     }
     rows_ = SortedRows(rows_, header_.SortColumn()).Sorted(header_.Ascending());
 
-    ClearStates();
-    std::sort(selected.begin(), selected.end(), std::less<>());
     const RedrawPause pause(*this);
-    for (int row = 0; row < ItemCount() && (focused != nullptr || !selected.empty()); ++row) {
+    std::sort(selected.begin(), selected.end(), std::less<>());
+    for (int row = 0; row < ItemCount(); ++row) {
         const SortedListRecord* record = RecordAt(row);
         if (std::binary_search(selected.begin(), selected.end(), record, std::less<>())) {
             SetItemState(row, LVIS_SELECTED, LVIS_SELECTED);
@@ -257,14 +260,20 @@ void CSortedListCtrl::SetItemFocus(int index) const {
     }
 }
 
-bool CSortedListCtrl::HasSelection() const {
-    return Direct(LVM_GETSELECTEDCOUNT, 0, 0) > 0;
+std::vector<int> CSortedListCtrl::SelectedItems() const {
+    std::vector<int> items;
+    if (Direct(LVM_GETSELECTEDCOUNT, 0, 0) > 0) {
+        for (int row = NextItem(-1, LVNI_SELECTED); row >= 0; row = NextItem(row, LVNI_SELECTED)) {
+            items.push_back(row);
+        }
+    }
+    return items;
 }
 
 void CSortedListCtrl::ClearStates() {
-    if (HasSelection()) {
-        const RedrawPause pause(*this);
-        SetItemState(-1, 0, LVIS_SELECTED);
+    const RedrawPause pause(*this);
+    for (const int item : SelectedItems()) {
+        SetItemState(item, 0, LVIS_SELECTED);
     }
     SetItemFocus(-1);
 }

@@ -91,7 +91,7 @@ class CSortedListCtrl : public ui::Control {
     void OnDensityChanged();
     int FindText(const NMLVFINDITEMW& find) const;
     void FocusSomeRow() const;
-    bool HasSelection() const;
+    std::vector<int> SelectedItems() const;
     void ClearStates();
     UINT RowHeight() const;
     // The one item with the item focus; -1 takes it from the item that has it.

@@ -1,14 +1,66 @@
-// The copying thread's side of the progress window.
+// The window that shows how a copy of the manual view goes on, and the copying thread's side of it.
 #pragma once
 
 #include <windows.h>
 
+#include <atomic>
 #include <string>
 
 #include "platform/handles.h"
-#include "transfer/copy_progress_dialog.h"
+#include "ui/dialog.h"
 
 namespace orvane {
+
+// Which way files are copied; the number is that of the page whose list they come from.
+enum class CopyDirection { kPcToDevice = 0, kDeviceToPc = 1 };
+
+// Whether the user wants the copy to stop.
+enum class StopState { kRunning = 0, kAsking = 1, kStopped = 2 };
+
+// What the copying thread sends to the window; each returns when it has been handled.
+// wParam: id of the control, lParam: its text. Returns 0.
+inline constexpr UINT kCopySetText = WM_USER + 1008;
+// wParam: zero-based index of the file, lParam: number of files. Returns 0.
+inline constexpr UINT kCopySetCount = WM_USER + 1009;
+// Ends the dialog. Returns 0.
+inline constexpr UINT kCopyClose = WM_USER + 1010;
+// lParam: the question's text. Returns 0 to leave the file, 1 to replace it.
+inline constexpr UINT kCopyAskReplace = WM_USER + 1011;
+
+// The "Copying File" dialog. It is modal on a thread of its own and has no owner: the thread that copies
+// handles no messages, and a window owned by one of its windows would share that thread's input. Everything
+// but GetStopState belongs to the thread that calls DoModal.
+class CCeShwCopyFileDlg : public ui::Dialog {
+  public:
+    explicit CCeShwCopyFileDlg(CopyDirection direction);
+
+    // Any thread. kAsking while the user is asked.
+    StopState GetStopState() const { return stop_state_; }
+    // A manual-reset event, signalled once the window is there and ready for messages. Owned by the dialog.
+    HANDLE ReadyEvent() const { return ready_.Get(); }
+
+  protected:
+    bool OnInitDialog() override;
+    // Enter without a focused button does nothing: there is nothing to accept.
+    void OnOK() override {}
+    // Escape and the close box ask like the button.
+    void OnCancel() override { OnStop(); }
+    bool OnClicked(int id) override;
+    std::optional<LRESULT> OnMessage(UINT message, WPARAM wparam, LPARAM lparam) override;
+
+  private:
+    void OnStop();
+    void OnSetCount(int index, int count);
+    bool OnAskReplace(const std::wstring& question);
+    void OnClose();
+
+    const CopyDirection direction_;
+    const UniqueEvent ready_;
+    std::atomic<StopState> stop_state_{StopState::kRunning};
+};
+
+// The window's title while file `number` (counted from 1) of `count` is copied.
+std::wstring CopyProgressTitle(int number, int count, CopyDirection direction);
 
 // Runs the progress dialog on a thread of its own while it lives; used by one other thread, the one that
 // copies, which needs to handle no messages. A window that does not come up, or that the user closed by

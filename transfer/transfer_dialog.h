@@ -11,7 +11,7 @@
 #include "device/device_tree_reader.h"
 #include "settings/settings_store.h"
 #include "transfer/candidates.h"
-#include "transfer/copy_progress_dialog.h"
+#include "transfer/copy_progress.h"
 #include "ui/dialog.h"
 
 namespace orvane {

@@ -1,0 +1,425 @@
+#include <gmock/gmock.h>
+#include <gtest/gtest.h>
+
+#include <algorithm>
+#include <string>
+#include <utility>
+#include <vector>
+
+#include "controls/page_tab.h"
+#include "controls/record_list.h"
+#include "platform/handles.h"
+#include "platform/resources.h"
+
+namespace orvane::testing {
+namespace {
+
+using ::testing::Contains;
+using ::testing::ElementsAre;
+using ::testing::IsEmpty;
+using Texts = std::vector<std::wstring>;
+
+// A parent window that reflects notifications to its controls, as dialogs do, and collects the messages
+// from WM_USER on that are posted to it.
+class ParentWindow {
+  public:
+    struct Posted {
+        UINT message;
+        WPARAM wparam;
+        LPARAM lparam;
+        bool operator==(const Posted&) const = default;
+    };
+
+    ParentWindow() {
+        WNDCLASSW window_class{};
+        window_class.lpfnWndProc = [](HWND window, UINT message, WPARAM wparam, LPARAM lparam) {
+            const auto reflected = ui::Control::Reflect(window, message, wparam, lparam);
+            return reflected ? *reflected : DefWindowProcW(window, message, wparam, lparam);
+        };
+        window_class.hInstance = ResourceModule();
+        window_class.lpszClassName = L"orvane_controls_test";
+        RegisterClassW(&window_class);
+        window_ = CreateWindowExW(0, window_class.lpszClassName, L"", WS_POPUP | WS_VISIBLE | WS_CLIPCHILDREN,
+                                  0, 0, 500, 300, nullptr, nullptr, ResourceModule(), nullptr);
+    }
+    ~ParentWindow() { DestroyWindow(window_); }
+    ParentWindow(const ParentWindow&) = delete;
+    ParentWindow& operator=(const ParentWindow&) = delete;
+
+    HWND Handle() const { return window_; }
+    HWND AddControl(const wchar_t* class_name, DWORD style, int id, const RECT& place) const {
+        return CreateWindowExW(0, class_name, L"", WS_CHILD | WS_VISIBLE | style, place.left, place.top,
+                               place.right - place.left, place.bottom - place.top, window_,
+                               reinterpret_cast<HMENU>(static_cast<INT_PTR>(id)), ResourceModule(), nullptr);
+    }
+    // Paints and handles all that is in the queue; what was posted to the window since the last call.
+    std::vector<Posted> Pump() {
+        std::vector<Posted> posted;
+        for (MSG message; PeekMessageW(&message, nullptr, 0, 0, PM_REMOVE);) {
+            if (message.hwnd == window_ && message.message >= WM_USER && message.message < WM_APP) {
+                posted.push_back({message.message, message.wParam, message.lParam});
+            }
+            DispatchMessageW(&message);
+        }
+        return posted;
+    }
+
+  private:
+    HWND window_;
+};
+
+// The window with a list of three columns (name, date, tick), as the program uses it, that sorts.
+struct ListWindow : ParentWindow {
+    explicit ListWindow(int control_id = 1039, DWORD extra_style = 0) {
+        list.Attach(AddControl(WC_LISTVIEWW, LVS_REPORT | LVS_OWNERDATA | LVS_OWNERDRAWFIXED | extra_style,
+                               control_id, {0, 0, 480, 280}));
+        list.SetNotifyWindow(Handle());
+        list.SetSortEnabled(true);
+        list.SetColumnCount(3);
+        list.SetColumnKind(2, kColumnCheckBox);
+        const int widths[] = {300, 130, 20};
+        for (int index = 0; index < 3; ++index) {
+            LVCOLUMNW column{};
+            column.mask = LVCF_TEXT | LVCF_WIDTH | LVCF_FMT;
+            column.pszText = const_cast<wchar_t*>(L"Column");
+            column.cx = widths[index];
+            Send(LVM_INSERTCOLUMNW, static_cast<WPARAM>(index), reinterpret_cast<LPARAM>(&column));
+        }
+    }
+
+    LRESULT Send(UINT message, WPARAM wparam = 0, LPARAM lparam = 0) const {
+        return SendMessageW(list.Handle(), message, wparam, lparam);
+    }
+    void Fill(std::vector<SortedListRecord> new_records) {
+        const auto before = std::exchange(records, std::move(new_records));  // Ends after the list let go.
+        list.SetItems(records);
+    }
+    void ClickHeader(int column) const {
+        NMLISTVIEW click{};
+        click.hdr.hwndFrom = list.Handle();
+        click.hdr.idFrom = static_cast<UINT_PTR>(GetDlgCtrlID(list.Handle()));
+        click.hdr.code = LVN_COLUMNCLICK;
+        click.iItem = -1;
+        click.iSubItem = column;
+        SendMessageW(Handle(), WM_NOTIFY, click.hdr.idFrom, reinterpret_cast<LPARAM>(&click));
+    }
+    RECT Cell(int row, int column) const {
+        RECT cell{LVIR_BOUNDS, column, 0, 0};
+        Send(LVM_GETSUBITEMRECT, static_cast<WPARAM>(row), reinterpret_cast<LPARAM>(&cell));
+        return cell;
+    }
+    // A press (or another mouse message) into the tick column.
+    void MouseAtTick(UINT message, int row) const {
+        const RECT cell = Cell(row, 2);
+        Send(message, MK_LBUTTON, MAKELPARAM((cell.left + cell.right) / 2, (cell.top + cell.bottom) / 2));
+    }
+    Texts FirstTexts() const {
+        Texts texts;
+        for (int row = 0; row < list.ItemCount(); ++row) {
+            texts.push_back(list.RecordAt(row)->first_text);
+        }
+        return texts;
+    }
+    LRESULT Selected() const { return Send(LVM_GETSELECTEDCOUNT); }
+    int FirstWith(UINT state) const {
+        return static_cast<int>(Send(LVM_GETNEXTITEM, static_cast<WPARAM>(-1), MAKELPARAM(state, 0)));
+    }
+    Posted Notice(UINT message) const {
+        return {message, reinterpret_cast<WPARAM>(list.Handle()), reinterpret_cast<LPARAM>(list.Handle())};
+    }
+
+    std::vector<SortedListRecord> records;
+    USortedListCtrl list;
+};
+
+std::vector<SortedListRecord> FourRecords() {
+    return {{L"b", L"2", true}, {L"A", L"3", false}, {L"c_", L"1", true}, {L"ca", L"1", false}};
+}
+
+// Plain entries, named by their number, none ticked.
+std::vector<SortedListRecord> ManyRecords(int count) {
+    std::vector<SortedListRecord> records;
+    for (int number = 0; number < count; ++number) {
+        // 7919 is prime to the counts in use: every name once, out of order.
+        records.push_back({L"Job" + std::to_wstring(number * 7919LL % count) + L".qvj", L"01/02/2012"});
+    }
+    return records;
+}
+
+TEST(RecordList, HeaderClicksSortAndTurn) {
+    ListWindow window;
+    window.Fill(FourRecords());
+    window.list.SelectItem(1);
+    EXPECT_EQ(window.FirstTexts(), (Texts{L"b", L"A", L"c_", L"ca"})) << "no click yet";
+    const struct {
+        int column;
+        bool ascending;
+        Texts order;
+    } clicks[] = {
+        {0, true, {L"A", L"b", L"c_", L"ca"}}, {0, false, {L"ca", L"c_", L"b", L"A"}},
+        {1, true, {L"ca", L"c_", L"b", L"A"}}, {1, false, {L"A", L"b", L"ca", L"c_"}},
+        {0, true, {L"A", L"b", L"c_", L"ca"}},
+    };
+    for (const auto& click : clicks) {
+        window.ClickHeader(click.column);
+        EXPECT_EQ(window.FirstTexts(), click.order) << click.column << click.ascending;
+        EXPECT_EQ(window.list.Header().SortColumn(), click.column);
+        EXPECT_EQ(window.list.Header().Ascending(), click.ascending);
+        EXPECT_EQ(window.FirstWith(LVNI_SELECTED), click.order[0] == L"A" ? 0 : 3) << "A stays selected";
+        EXPECT_EQ(window.FirstWith(LVNI_FOCUSED), click.order[0] == L"A" ? 0 : 3);
+    }
+    window.Fill({{L"z", L"", false}, {L"y", L"", false}});
+    EXPECT_EQ(window.FirstTexts(), (Texts{L"y", L"z"})) << "filled again: the sort setting holds";
+    window.list.SetSortEnabled(false);
+    window.ClickHeader(0);
+    EXPECT_TRUE(window.list.Header().Ascending());
+    ListWindow other(1048);
+    other.Fill(FourRecords());
+    other.ClickHeader(0);
+    EXPECT_EQ(other.list.Header().SortColumn(), 0);
+    EXPECT_EQ(other.FirstTexts(), (Texts{L"b", L"A", L"c_", L"ca"})) << "only the list numbered 1039 sorts";
+}
+
+TEST(RecordList, ClicksAndKeysTick) {
+    ListWindow window;
+    window.Fill(FourRecords());
+    window.Pump();
+    window.MouseAtTick(WM_LBUTTONDOWN, 1);
+    EXPECT_TRUE(window.records[1].ticked);
+    EXPECT_EQ(window.Selected(), 0) << "the click is swallowed";
+    EXPECT_EQ(window.FirstWith(LVNI_FOCUSED), 1) << "a list with the focus has a focused row";
+    EXPECT_EQ(GetFocus(), window.list.Handle());
+    EXPECT_THAT(window.Pump(), Contains(window.Notice(2023)));
+    window.MouseAtTick(WM_LBUTTONDOWN, 1);
+    EXPECT_FALSE(window.records[1].ticked);
+
+    window.list.SelectItem(2);
+    window.Send(WM_KEYDOWN, VK_SPACE, 0);
+    EXPECT_FALSE(window.records[2].ticked);
+    window.Send(WM_KEYDOWN, VK_SPACE, static_cast<LPARAM>(KF_REPEAT) << 16);
+    EXPECT_FALSE(window.records[2].ticked) << "a key held down";
+    window.Send(WM_KEYDOWN, VK_DOWN, 0);
+    window.Send(WM_KEYDOWN, VK_SPACE, 0);
+    EXPECT_TRUE(window.records[3].ticked);
+    EXPECT_EQ(window.list.TickedCount(), 2U);
+    window.Send(WM_CHAR, 'C', 0);
+    window.Send(WM_CHAR, 'a', 0);
+    EXPECT_EQ(window.FirstWith(LVNI_FOCUSED), 3) << "typing finds the name";
+
+    window.list.SelectItem(0);
+    window.MouseAtTick(WM_LBUTTONDBLCLK, 3);
+    EXPECT_THAT(window.Pump(), Contains(window.Notice(2022)));
+    EXPECT_EQ(window.FirstWith(LVNI_SELECTED), 3) << "the receiver must find the row that was clicked";
+}
+
+TEST(RecordList, ColumnKinds) {
+    const struct {
+        int column;
+        DWORD flags;
+        INT_PTR extra;
+        bool accepted;
+        DWORD stored;
+    } cases[] = {
+        {0, 0x806, 0, true, 0x800}, {0, 0x6, 0, true, 0x4},     {0, 0x2, 0, false, 0},
+        {0, 0x38, 5, true, 0x30},   {0, 0x50, 0, false, 0},     {0, 0x18, 0, true, 0},
+        {0, 0x108, 0, true, 0x8},   {0, 0x700, 0, true, 0x500}, {0, 0x80, 0, false, 0},
+        {-1, 0x1, 0, false, 0},     {3, 0x1, 0, false, 0},
+    };
+    for (const auto& row : cases) {
+        USortedListCtrl list;
+        list.SetColumnCount(3);
+        EXPECT_EQ(list.SetColumnKind(row.column, row.flags, row.extra), row.accepted) << row.flags;
+        EXPECT_EQ(list.Columns()[0].kind, row.stored) << row.flags;
+    }
+}
+
+TEST(RecordList, AHundredThousandEntries) {
+    constexpr int kCount = 100'000;
+    ListWindow window;
+    const auto step = [&window](const char* name, const auto& action) {
+        const ULONGLONG start = GetTickCount64();
+        action();
+        const auto posted = window.Pump();
+        // Several times what a busy machine needs; what is quadratic takes minutes.
+        EXPECT_LT(GetTickCount64() - start, 5000) << name;
+        const auto notices = std::count(posted.begin(), posted.end(), window.Notice(2023));
+        EXPECT_GE(notices, 1) << name;
+        EXPECT_LE(notices, 3) << name << ": not one for each item";
+    };
+    step("fill", [&] { window.Fill(ManyRecords(kCount)); });
+    step("sort by name", [&] { window.ClickHeader(0); });
+    EXPECT_EQ(window.list.RecordAt(0)->first_text, L"Job0.qvj");
+    step("sort by tick, which is no ordering", [&] { window.ClickHeader(2); });
+    Texts names = window.FirstTexts();
+    std::sort(names.begin(), names.end());
+    EXPECT_EQ(std::unique(names.begin(), names.end()) - names.begin(), kCount) << "each entry once";
+    step("select all", [&] { window.list.SelectAll(); });
+    step("sort with all selected", [&] { window.ClickHeader(0); });
+    EXPECT_EQ(window.Selected(), kCount);
+    step("invert", [&] { window.list.InvertSelection(); });
+    step("tick all", [&] { window.list.TickAll(true); });
+    step("untick the last", [&] {
+        window.list.SelectItem(kCount - 1);
+        window.MouseAtTick(WM_LBUTTONDOWN, kCount - 1);
+    });
+    EXPECT_EQ(window.list.TickedCount(), kCount - 1U);
+    const LRESULT top = window.Send(LVM_GETTOPINDEX);
+    step("fill again", [&] { window.list.SetItems(window.records); });
+    EXPECT_EQ(window.Send(LVM_GETTOPINDEX), top);
+    EXPECT_EQ(window.FirstWith(LVNI_FOCUSED), kCount - 1);
+    step("fill with fewer", [&] { window.Fill(ManyRecords(10)); });
+    EXPECT_EQ(window.FirstWith(LVNI_FOCUSED), 9) << "the keyboard stays in the list";
+}
+
+constexpr COLORREF kBlack = RGB(0, 0, 0);
+constexpr COLORREF kWhite = RGB(255, 255, 255);
+
+// What is drawn, as pixels: by a window of itself, or by the test.
+class Picture {
+  public:
+    explicit Picture(HWND window) {
+        RECT client{};
+        GetClientRect(window, &client);
+        HDC window_dc = GetDC(window);
+        bitmap_.Reset(CreateCompatibleBitmap(window_dc, client.right, client.bottom));
+        dc_.Reset(CreateCompatibleDC(window_dc));
+        ReleaseDC(window, window_dc);
+        SelectObject(dc_.Get(), bitmap_.Get());
+        SendMessageW(window, WM_PRINTCLIENT, reinterpret_cast<WPARAM>(Dc()), PRF_CLIENT | PRF_ERASEBKGND);
+    }
+    HDC Dc() const { return dc_.Get(); }
+    // Pixels of this colour in the rectangle.
+    int Count(const RECT& part, COLORREF color) const {
+        int count = 0;
+        for (int y = part.top; y < part.bottom; ++y) {
+            for (int x = part.left; x < part.right; ++x) {
+                count += GetPixel(Dc(), x, y) == color ? 1 : 0;
+            }
+        }
+        return count;
+    }
+
+  private:
+    UniqueBitmap bitmap_;
+    UniqueMemoryDc dc_;
+};
+
+TEST(RecordListDraw, RowsFollowFocusKindAndTick) {
+    ListWindow window;
+    window.list.SetColumnKind(1, kColumnBlueText1);
+    window.Fill({{L"mmmm", L"MMMM", true}, {L"mmmm", L"MMMM", false}});
+    window.list.SelectAll();
+    const COLORREF highlight = GetSysColor(COLOR_HIGHLIGHT);
+    // Letters are smoothed: what is looked for are their darkest pixels.
+    const struct {
+        bool focus;
+        COLORREF background;
+        COLORREF text[2];
+        COLORREF mark;
+    } cases[] = {{false, kWhite, {kBlack, RGB(0, 0, 255)}, kBlack},
+                 {true, highlight, {kWhite, kWhite}, kWhite}};
+    for (const auto& expected : cases) {
+        SetFocus(expected.focus ? window.list.Handle() : window.Handle());
+        const Picture picture(window.list.Handle());
+        for (int column = 0; column < 2; ++column) {
+            const RECT cell = window.Cell(0, column);
+            EXPECT_GT(picture.Count(cell, expected.background), 1000) << column;
+            EXPECT_GT(picture.Count(cell, expected.text[column]), 10) << column;
+        }
+        for (int row = 0; row < 2; ++row) {
+            RECT box = window.Cell(row, 2);
+            InflateRect(&box, -6, -(box.bottom - box.top - 8) / 2);  // What the box has in it.
+            EXPECT_EQ(picture.Count(box, expected.mark) > 8, row == 0) << "ticked entries look ticked";
+            EXPECT_GT(picture.Count(box, expected.background), 30);
+        }
+    }
+}
+
+TEST(RecordListDraw, BoxesAreDrawnForDenserScreens) {
+    ListWindow window;
+    TickPictures pictures;
+    for (const int dpi : {96, 120, 144, 192}) {
+        for (const bool ticked : {false, true}) {
+            const Picture picture(window.list.Handle());
+            const RECT cell{100, 100, 140, 140};
+            FillRect(picture.Dc(), &cell, static_cast<HBRUSH>(GetStockObject(BLACK_BRUSH)));
+            pictures.Draw(picture.Dc(), cell, ticked, /*selected=*/false, dpi);
+            const int size = MulDiv(10, dpi, 96);
+            const int around = 40 * 40 - size * size;
+            const int mark = picture.Count(cell, kBlack) - around;
+            EXPECT_GE(mark, ticked ? size * size / 8 : 0) << dpi;
+            EXPECT_LE(mark, ticked ? size * size / 4 : 0) << dpi;
+        }
+    }
+}
+
+constexpr int kTabId = 1046;
+
+// Two tabs; a control of each page and one that is on both.
+struct TabWindow : ParentWindow {
+    TabWindow() {
+        tabs.Attach(AddControl(WC_TABCONTROLW, 0, kTabId, {0, 0, 400, 30}));
+        for (const wchar_t* text : {L"Mobile Device", L"PC"}) {
+            TCITEMW item{};
+            item.mask = TCIF_TEXT;
+            item.pszText = const_cast<wchar_t*>(text);
+            SendMessageW(tabs.Handle(), TCM_INSERTITEMW, 0, reinterpret_cast<LPARAM>(&item));
+        }
+        tabs.SetNotifyWindow(Handle());
+    }
+
+    void ClickTab(int tab) const {
+        RECT place{};
+        SendMessageW(tabs.Handle(), TCM_GETITEMRECT, static_cast<WPARAM>(tab),
+                     reinterpret_cast<LPARAM>(&place));
+        const LPARAM point = MAKELPARAM((place.left + place.right) / 2, (place.top + place.bottom) / 2);
+        SendMessageW(tabs.Handle(), WM_LBUTTONDOWN, MK_LBUTTON, point);
+        SendMessageW(tabs.Handle(), WM_LBUTTONUP, 0, point);
+    }
+    void AttachAll() {
+        EXPECT_TRUE(tabs.AttachControlToTab(second, 1) && tabs.AttachControlToTab(both, 1));
+        EXPECT_TRUE(tabs.AttachControlToTab(first, 0) && tabs.AttachControlToTab(both, 0));
+    }
+    template <class Test>
+    std::vector<bool> Each(Test test) const {
+        return {test(first) != 0, test(second) != 0, test(both) != 0};
+    }
+
+    HWND first = AddControl(L"BUTTON", 0, 1, {0, 40, 50, 60});
+    HWND second = AddControl(L"BUTTON", 0, 2, {60, 40, 110, 60});
+    HWND both = AddControl(L"BUTTON", 0, 3, {120, 40, 170, 60});
+    CSTabCtrl tabs;
+};
+
+TEST(PageTab, ShowsThePageThatIsSelected) {
+    TabWindow window;
+    for (const int no_tab : {2, -1}) {
+        EXPECT_FALSE(window.tabs.AttachControlToTab(window.first, no_tab));
+        EXPECT_TRUE(IsWindowVisible(window.first)) << no_tab;
+    }
+    window.AttachAll();
+    EXPECT_THAT(window.Each(IsWindowVisible), ElementsAre(false, false, false)) << "whatever tab is selected";
+    EXPECT_EQ(window.tabs.SetCurSel(0), 1) << "what was inserted first was selected and moved on";
+    EXPECT_THAT(window.Each(IsWindowVisible), ElementsAre(true, false, true));
+    EXPECT_THAT(window.Pump(), IsEmpty()) << "only the user's selections are told";
+    window.ClickTab(1);
+    EXPECT_THAT(window.Each(IsWindowVisible), ElementsAre(false, true, true));
+    EXPECT_THAT(window.Pump(), ElementsAre(ParentWindow::Posted{2021, kTabId, 1}));
+}
+
+TEST(PageTab, EnablesAllPagesWithItself) {
+    TabWindow window;
+    window.AttachAll();
+    EXPECT_TRUE(window.tabs.EnableTabControls(0, false));
+    EXPECT_THAT(window.Each(IsWindowEnabled), ElementsAre(false, true, false));
+    EXPECT_FALSE(window.tabs.EnableTabControls(2, false));
+    EnableWindow(window.tabs.Handle(), FALSE);
+    EXPECT_THAT(window.Each(IsWindowEnabled), ElementsAre(false, false, false));
+    EnableWindow(window.tabs.Handle(), TRUE);
+    EXPECT_THAT(window.Each(IsWindowEnabled), ElementsAre(true, true, true));
+    DestroyWindow(window.tabs.Handle());
+    EXPECT_FALSE(window.tabs.ShowTabControls(0, SW_SHOW)) << "the pages end with the window";
+}
+
+}  // namespace
+}  // namespace orvane::testing
