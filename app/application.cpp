@@ -8,7 +8,7 @@
 #include "platform/resources.h"
 #include "qelutils/xlate.h"
 #include "res/ids.h"
-#include "settings/registry_strings.h"
+#include "settings/settings_store.h"
 
 namespace orvane {
 

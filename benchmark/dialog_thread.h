@@ -10,7 +10,7 @@
 #include <thread>
 
 #include "benchmark/call_timer.h"
-#include "settings/registry_strings.h"
+#include "settings/settings_store.h"
 
 namespace orvane::bench {
 

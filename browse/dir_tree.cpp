@@ -3,9 +3,9 @@
 #include <windowsx.h>
 
 #include <array>
+#include <cwchar>
 
 #include "browse/file_property_dialog.h"
-#include "browse/icons.h"
 #include "platform/resources.h"
 #include "platform/text_case.h"
 #include "qelutils/xlate.h"
@@ -24,6 +24,36 @@ constexpr DWORD kPauseBeforeReadMs = 500;
 
 constexpr DWORD kUsualStyle = WS_CHILD | WS_VISIBLE | WS_BORDER | WS_VSCROLL | WS_TABSTOP | TVS_HASBUTTONS |
                               TVS_HASLINES | TVS_LINESATROOT | TVS_DISABLEDRAGDROP | TVS_SHOWSELALWAYS;
+
+// The picture of an item that nobody has touched yet. A folder without kept entries has nothing to open and
+// shows as open.
+TreePicture InitialPicture(const FileNode& node) {
+    if (node.is_folder == 0) {
+        return TreePicture::kFile;
+    }
+    return node.child_count > 0 ? TreePicture::kClosedFolder : TreePicture::kOpenFolder;
+}
+
+// Folders before files, and by name without regard to case within each. Negative, 0 or positive.
+int CompareSiblings(const FileNode& a, const FileNode& b) {
+    if (a.is_folder != b.is_folder) {
+        return a.is_folder != 0 ? -1 : 1;
+    }
+    return _wcsicmp(a.name.c_str(), b.name.c_str());
+}
+
+// The non-empty pieces of a device path between its "\", in order.
+std::vector<std::wstring_view> PathPieces(std::wstring_view path) {
+    std::vector<std::wstring_view> pieces;
+    while (!path.empty()) {
+        const std::size_t length = path.find(L'\\');
+        if (length != 0) {
+            pieces.push_back(path.substr(0, length));
+        }
+        path = length == std::wstring_view::npos ? std::wstring_view() : path.substr(length + 1);
+    }
+    return pieces;
+}
 
 UINT StateOf(TreePicture picture) {
     return INDEXTOSTATEIMAGEMASK(static_cast<UINT>(picture));

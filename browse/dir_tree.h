@@ -10,7 +10,6 @@
 #include <string>
 #include <vector>
 
-#include "browse/dir_tree_rules.h"
 #include "browse/load_progress_dialog.h"
 #include "device/device_tree_reader.h"
 #include "device/file_node.h"
@@ -18,6 +17,10 @@
 #include "ui/control.h"
 
 namespace orvane {
+
+// The pictures of the tree's items, as indices of its state image list. Picture 0 is never shown: an index
+// of 0 means no picture.
+enum class TreePicture : unsigned { kOpenFolder = 1, kClosedFolder = 2, kFile = 3 };
 
 // A tree view that shows the device from its root down. The whole device is read in one pass on the
 // window's thread, behind a wait dialog; expanding an item never asks the device. Folders are shown in bold

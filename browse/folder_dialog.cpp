@@ -1,9 +1,11 @@
 #include "browse/folder_dialog.h"
 
+#include <algorithm>
 #include <array>
 #include <utility>
 
 #include "platform/resources.h"
+#include "platform/text_case.h"
 #include "qelutils/xlate.h"
 #include "res/ids.h"
 #include "ui/dialog.h"
@@ -41,7 +43,29 @@ const wchar_t* NullIfEmpty(const std::wstring& text) {
     return text.empty() ? nullptr : text.c_str();
 }
 
+// From the last "\" on; the whole path when there is none.
+std::wstring_view LastComponent(std::wstring_view path) {
+    const std::size_t cut = path.rfind(L'\\');
+    return cut == std::wstring_view::npos ? path : path.substr(cut);
+}
+
+std::wstring ExpandAbbreviation(std::wstring_view field, std::wstring_view directory) {
+    const std::size_t cut = directory.rfind(L'\\');
+    if (cut == std::wstring_view::npos || EqualIgnoringCase(LastComponent(field), LastComponent(directory))) {
+        return std::wstring(directory);
+    }
+    return std::wstring(directory).append(field.substr(std::min(cut, field.size())));
+}
+
 }  // namespace
+
+ChosenFolder ChosenFolderOf(std::wstring_view field, std::wstring_view file_path, std::size_t name_offset) {
+    const std::wstring_view directory = file_path.substr(0, name_offset > 0 ? name_offset - 1 : 0);
+    const bool is_abbreviated = field.find(L"...") != std::wstring_view::npos;
+    return {is_abbreviated ? ExpandAbbreviation(field, directory)
+                           : std::wstring(WithoutTrailingBackslashes(field)),
+            std::wstring(directory)};
+}
 
 CFolderDialog::CFolderDialog(std::wstring initial_text, std::wstring initial_directory, int /*unused*/,
                              std::wstring title, HWND parent)

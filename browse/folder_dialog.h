@@ -5,12 +5,24 @@
 
 #include <commdlg.h>
 
+#include <cstddef>
 #include <string>
+#include <string_view>
 
-#include "browse/chosen_folder.h"
 #include "platform/paths.h"
 
 namespace orvane {
+
+// What the user chose. PC paths without "\" at their end: of a drive's root only "C:" is left.
+struct ChosenFolder {
+    std::wstring folder;     // What was chosen.
+    std::wstring directory;  // The folder part of the file path that the file dialog answered.
+};
+
+// `field`: the text of the current-directory field when OK was pressed. `file_path` and `name_offset`: the
+// file path that the file dialog answered, and where in it the file's name begins. The field's text is what
+// counts, unless the system has abbreviated it with "...".
+ChosenFolder ChosenFolderOf(std::wstring_view field, std::wstring_view file_path, std::size_t name_offset);
 
 // The system's old-style dialog for saving a file, on a template of which only the parts that have to do
 // with folders can be seen. The process's current directory is the same before and after DoModal, however

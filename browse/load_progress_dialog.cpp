@@ -2,7 +2,7 @@
 
 #include <utility>
 
-#include "browse/icons.h"
+#include "platform/resources.h"
 #include "res/ids.h"
 
 namespace orvane {

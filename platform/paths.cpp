@@ -51,6 +51,11 @@ std::wstring_view ParentPath(std::wstring_view path) {
     return cut == std::wstring_view::npos ? std::wstring_view() : path.substr(0, cut);
 }
 
+bool IsUncRoot(std::wstring_view path) {
+    path = WithoutTrailingBackslashes(path);
+    return path.starts_with(L"\\\\") && std::ranges::count(path.substr(2), L'\\') <= 1;
+}
+
 bool IsPathComponent(std::wstring_view name) {
     static constexpr std::wstring_view kForbidden = L"<>:\"/\\|?*";
     return !name.empty() && name != L"." && name != L".." &&

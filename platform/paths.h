@@ -27,6 +27,10 @@ std::wstring JoinPath(std::wstring_view folder, std::wstring_view name);
 // The path without trailing "\", cut before its last "\"; empty when there is none.
 std::wstring_view ParentPath(std::wstring_view path);
 
+// Whether the path is a network's root, "\\server" or "\\server\share" with or without "\" at its end: no
+// folder that a program could make.
+bool IsUncRoot(std::wstring_view path);
+
 // Whether `name` can be one component of a path at all: not empty, not "." or "..", free of control
 // characters and of < > : " / \ | ? *. Names listed by a device are not trusted before they pass this.
 bool IsPathComponent(std::wstring_view name);

@@ -5,6 +5,8 @@
 
 #include <string>
 
+#include "platform/handles.h"
+
 namespace orvane {
 
 inline HINSTANCE ResourceModule() {
@@ -12,6 +14,20 @@ inline HINSTANCE ResourceModule() {
 }
 
 // The text of a string resource; empty when there is none of that number.
-std::wstring ResourceString(UINT id);
+inline std::wstring ResourceString(UINT id) {
+    // With a buffer size of 0 LoadStringW hands out a pointer to the text in the resource itself, which is
+    // not terminated.
+    const wchar_t* text = nullptr;
+    const int length = LoadStringW(ResourceModule(), id, reinterpret_cast<LPWSTR>(&text), 0);
+    return length > 0 ? std::wstring(text, static_cast<std::size_t>(length)) : std::wstring();
+}
+
+// A copy of the icon that the caller owns, `pixels` wide and high; 0 means the system's size for icons.
+// Empty when there is no such icon.
+inline UniqueIcon LoadOwnedIcon(int id, int pixels = 0) {
+    const UINT flags = pixels == 0 ? LR_DEFAULTSIZE : LR_DEFAULTCOLOR;
+    return UniqueIcon(static_cast<HICON>(
+        LoadImageW(ResourceModule(), MAKEINTRESOURCEW(id), IMAGE_ICON, pixels, pixels, flags)));
+}
 
 }  // namespace orvane

@@ -64,6 +64,8 @@ void COptionsDlg::DoDataExchange(ui::DataExchange& exchange) {
 }
 
 bool COptionsDlg::OnInitDialog() {
+    SendMessageW(Item(IDC_OPTIONS_PC_FOLDER), EM_LIMITTEXT, kMaxPcFolderChars, 0);
+    SendMessageW(Item(IDC_OPTIONS_DEVICE_FOLDER), EM_LIMITTEXT, kMaxDeviceFolderChars, 0);
     EnableOverwriteBoxes();
     return true;
 }

@@ -10,11 +10,13 @@
 #include "platform/handles.h"
 #include "platform/paths.h"
 #include "platform/resources.h"
-#include "settings/registry_strings.h"
 
 namespace orvane {
 
 namespace {
+
+constexpr DWORD kBufferBytes = 1020;
+constexpr std::size_t kMaxCharacters = kBufferBytes / sizeof(wchar_t) - 1;
 
 // Where ActiveSync looks for what to start when a device connects.
 constexpr const wchar_t* kAutoStartKey = L"SOFTWARE\\Microsoft\\Windows CE Services\\AutoStartOnConnect";
@@ -104,49 +106,71 @@ std::wstring LoadPcFolder() {
     return folder;
 }
 
-// Needs a session. Stored folders end in "\", and a device's search may find nothing for a path that does:
-// the folder is looked for by its name. The root has none; it always exists.
-bool IsDeviceFolder(const std::wstring& path) {
+enum class Presence { kThere, kNotThere, kUnknown };
+
+// Whether the device says that it has a folder of that path. Needs a session. Stored folders end in "\", and
+// a device's search may find nothing for a path that does: the folder is looked for by its name. The root has
+// none; it always exists.
+Presence LookForDeviceFolder(const std::wstring& path) {
     const std::wstring name(WithoutTrailingBackslashes(path));
     if (name.empty()) {
-        return !path.empty();
+        return path.empty() ? Presence::kNotThere : Presence::kThere;
     }
     if (!FitsPathBuffer(name.size())) {
-        return false;
+        return Presence::kNotThere;
     }
     rapi::FindData found{};
     // The search is left to the end of the session, which releases it.
-    const HANDLE search = CeFindFirstFile(name.c_str(), &found);
-    return search != INVALID_HANDLE_VALUE && (found.attributes & FILE_ATTRIBUTE_DIRECTORY) != 0;
+    if (const HANDLE search = CeFindFirstFile(name.c_str(), &found); search != INVALID_HANDLE_VALUE) {
+        const bool is_folder = (found.attributes & FILE_ATTRIBUTE_DIRECTORY) != 0;
+        return is_folder ? Presence::kThere : Presence::kNotThere;
+    }
+    const DWORD error = CeGetLastError();
+    // Where the call did not reach the device, the error is that of an earlier one.
+    const bool absent =
+        SUCCEEDED(CeRapiGetError()) &&
+        (error == ERROR_FILE_NOT_FOUND || error == ERROR_PATH_NOT_FOUND || error == ERROR_NO_MORE_FILES);
+    return absent ? Presence::kNotThere : Presence::kUnknown;
 }
 
-std::wstring FindDeviceFolder() {
-    std::wstring stored;
-    if (ReadSetting(IDS_SYNC_PATH_CE, stored) && IsDeviceFolder(stored)) {
-        return stored;
-    }
+// The first of the usual folders; none when the device does not say of one before it whether it is there.
+std::wstring FindUsualFolder() {
     for (const UINT candidate_id : kDeviceFolders) {
         std::wstring candidate = ResourceString(candidate_id);
-        if (IsDeviceFolder(candidate)) {
-            WriteSetting(IDS_SYNC_PATH_CE, candidate);
+        const Presence presence = LookForDeviceFolder(candidate);
+        if (presence == Presence::kThere) {
             return candidate;
+        }
+        if (presence == Presence::kUnknown) {
+            break;
         }
     }
     return {};
 }
 
-std::wstring LoadDeviceFolder() {
+}  // namespace
+
+std::wstring FindDeviceJobFolder() {
     const UniqueEvent cancel = NewManualResetEvent();
     const DeviceSession session(cancel.Get());
-    return session ? FindDeviceFolder() : std::wstring();
+    if (!session) {
+        return {};
+    }
+    std::wstring stored;
+    if (ReadSetting(IDS_SYNC_PATH_CE, stored) && LookForDeviceFolder(stored) != Presence::kNotThere) {
+        return stored;
+    }
+    std::wstring usual = FindUsualFolder();
+    if (!usual.empty()) {
+        WriteSetting(IDS_SYNC_PATH_CE, usual);
+    }
+    return usual;
 }
-
-}  // namespace
 
 SyncSettings LoadSettings() {
     SyncSettings settings;
     settings.sync_path_dt = LoadPcFolder();
-    settings.sync_path_ce = LoadDeviceFolder();
+    settings.sync_path_ce = FindDeviceJobFolder();
     for (const StoredFlag& stored : kReadOrder) {
         std::wstring text;
         if (!ReadSetting(stored.setting, text)) {
@@ -211,6 +235,41 @@ void WriteAutoStart(bool on, HWND owner) {
     GetWindowModuleFileNameW(active != nullptr ? active : owner, module.data(),
                              static_cast<UINT>(module.size() - 1));
     RegWriteString(HKEY_LOCAL_MACHINE, kAutoStartKey, kAutoStartValue, on ? module.data() : L"");
+}
+
+bool RegReadString(HKEY root, const std::wstring& subkey, const std::wstring& name, std::wstring& text) {
+    text.clear();
+    UniqueRegistryKey key;
+    if (RegOpenKeyExW(root, subkey.c_str(), 0, KEY_ALL_ACCESS, key.Receive()) != ERROR_SUCCESS) {
+        return false;
+    }
+    std::array<wchar_t, kBufferBytes / sizeof(wchar_t)> buffer{};
+    DWORD bytes = kBufferBytes;
+    if (RegQueryValueExW(key.Get(), name.c_str(), nullptr, nullptr, reinterpret_cast<BYTE*>(buffer.data()),
+                         &bytes) != ERROR_SUCCESS) {
+        return false;
+    }
+    // A value may be stored without a terminator, our own are: the buffer's zeros end it then.
+    const auto end = std::find(buffer.begin(), buffer.end(), L'\0');
+    const auto length = static_cast<std::size_t>(end - buffer.begin());
+    if (length > kMaxCharacters) {
+        return false;
+    }
+    text.assign(buffer.data(), length);
+    return true;
+}
+
+bool RegWriteString(HKEY root, const std::wstring& subkey, const std::wstring& name,
+                    const std::wstring& text) {
+    UniqueRegistryKey key;
+    if (RegOpenKeyExW(root, subkey.c_str(), 0, KEY_ALL_ACCESS, key.Receive()) != ERROR_SUCCESS &&
+        RegCreateKeyExW(root, subkey.c_str(), 0, nullptr, REG_OPTION_NON_VOLATILE, KEY_WRITE, nullptr,
+                        key.Receive(), nullptr) != ERROR_SUCCESS) {
+        return false;
+    }
+    RegSetValueExW(key.Get(), name.c_str(), 0, REG_SZ, reinterpret_cast<const BYTE*>(text.data()),
+                   static_cast<DWORD>(text.size() * sizeof(wchar_t)));
+    return true;
 }
 
 }  // namespace orvane

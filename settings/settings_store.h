@@ -9,8 +9,14 @@
 #include <string>
 
 #include "jobs/file_types.h"
+#include "platform/paths.h"
 
 namespace orvane {
+
+// What can be typed of a folder so that it is found again: one "\" comes to its end, and with that a value of
+// the registry holds 509 characters and the device's buffer one less than its length.
+inline constexpr std::size_t kMaxPcFolderChars = 508;
+inline constexpr std::size_t kMaxDeviceFolderChars = kPathBufferChars - 2;
 
 // The settings in memory.
 struct SyncSettings {
@@ -46,10 +52,15 @@ inline constexpr auto kFlagSettings = std::to_array<FlagSetting>({
 // "0", in the order in which flags are written. Start_File_View is not among them.
 using SyncSettingsBlock = std::array<std::wstring, 2 + kFileTypes.size() + kFlagSettings.size() - 1>;
 
-// Reads all settings of the current user and writes back a default for every one that is missing. Opens a
-// device session for the device job folder, which may take as long as ConnectDevice waits: without a device
-// that folder is empty and what the registry holds stays unread; with one, a stored folder that is not on the
-// device gives way to the first of the three usual folders that is.
+// The device job folder: the stored one, or the first of the three usual ones that is on the device, which is
+// stored then. The stored folder gives way only when the device answers that it has no such folder; where it
+// answers anything else, or the call does not reach it, the stored folder stands. Empty when no device
+// session can be opened, or when neither is there: no device folder is meant then, never all of the device,
+// which is "\". May take as long as ConnectDevice waits.
+std::wstring FindDeviceJobFolder();
+
+// Reads all settings of the current user and writes back a default for every one that is missing. The device
+// job folder comes from FindDeviceJobFolder, and with it the time that it takes.
 SyncSettings LoadSettings();
 
 // Writes all settings, changed or not. Both folders are stored, and left in `settings`, with exactly one "\"
@@ -71,5 +82,14 @@ bool ReadStartFileView();
 // active.
 bool ReadAutoStart();
 void WriteAutoStart(bool on, HWND owner);
+
+// Reads a value as text, whatever its type, of at most 509 characters. False, with an empty text, when the
+// key cannot be opened with full access or the value is missing or longer.
+bool RegReadString(HKEY root, const std::wstring& subkey, const std::wstring& name, std::wstring& text);
+
+// Writes a REG_SZ value without a terminator of its own, creating the key when it cannot be opened. False
+// when there is no key to write to; whether the value itself could be stored is not told.
+bool RegWriteString(HKEY root, const std::wstring& subkey, const std::wstring& name,
+                    const std::wstring& text);
 
 }  // namespace orvane

@@ -8,7 +8,7 @@
 #include "app/sync_dialog.h"
 #include "jobs/file_types.h"
 #include "platform/resources.h"
-#include "settings/registry_strings.h"
+#include "settings/settings_store.h"
 
 namespace orvane::testing {
 

@@ -6,7 +6,7 @@
 #include <array>
 #include <filesystem>
 
-#include "browse/property_texts.h"
+#include "browse/file_property_dialog.h"
 #include "platform/handles.h"
 #include "res/ids.h"
 #include "tests/support/dialog_script.h"

@@ -1,7 +1,7 @@
 #include <gtest/gtest.h>
 
-#include "browse/chosen_folder.h"
-#include "browse/property_texts.h"
+#include "browse/file_property_dialog.h"
+#include "browse/folder_dialog.h"
 #include "tests/support/temp_folder.h"
 
 namespace orvane {

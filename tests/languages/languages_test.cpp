@@ -16,7 +16,7 @@
 #include "qelutils/text_format.h"
 #include "qelutils/xlate.h"
 #include "res/ids.h"
-#include "settings/registry_strings.h"
+#include "settings/settings_store.h"
 #include "tests/support/scratch_registry.h"
 #include "ui/dialog.h"
 

@@ -32,5 +32,15 @@ TEST(Paths, AcceptOnlyNamesThatThePcKeepsAsTheyAre) {
     }
 }
 
+TEST(Paths, TellTheRootsOfANetwork) {
+    for (const wchar_t* root :
+         {L"\\\\server", L"\\\\server\\", L"\\\\server\\share", L"\\\\server\\share\\\\"}) {
+        EXPECT_TRUE(IsUncRoot(root)) << root;
+    }
+    for (const wchar_t* path : {L"", L"\\", L"\\a", L"C:\\a", L"C:\\\\a", L"\\\\server\\share\\a"}) {
+        EXPECT_FALSE(IsUncRoot(path)) << path;
+    }
+}
+
 }  // namespace
 }  // namespace orvane

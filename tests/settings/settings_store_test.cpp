@@ -103,5 +103,21 @@ TEST_F(SettingsStore, TheDeviceFolderGivesWayToTheFirstUsualOneWhenItIsNotOnTheD
     }
 }
 
+TEST_F(SettingsStore, NoFailedCallPutsAnotherFolderInPlaceOfTheStoredOne) {
+    testing::FolderDevice device;
+    testing::MakeFolder(device.PcPath(L"\\CF Card\\Qel ORVANE\\Jobs"));  // The second candidate.
+    Store(L"SyncPath_CE", L"\\My Jobs\\");
+    for (const wchar_t* fault : {L"FAIL_CALL", L"VANISH"}) {
+        // The stored folder is looked for, then one candidate after the other.
+        for (int call = 1; call <= 3; ++call) {
+            device.Set(fault, std::to_wstring(call));
+            EXPECT_EQ(FindDeviceJobFolder(), call == 1 ? L"\\My Jobs\\" : L"") << fault << call;
+            EXPECT_EQ(Stored(L"SyncPath_CE"), L"\\My Jobs\\") << fault << call;
+        }
+        device.Clear(fault);
+    }
+    EXPECT_EQ(FindDeviceJobFolder(), L"\\CF Card\\Qel ORVANE\\Jobs");
+}
+
 }  // namespace
 }  // namespace orvane

@@ -4,7 +4,6 @@
 #include <gtest/gtest.h>
 
 #include "platform/resources.h"
-#include "settings/registry_strings.h"
 #include "settings/settings_store.h"
 #include "tests/support/folder_device.h"
 #include "tests/support/scratch_registry.h"
