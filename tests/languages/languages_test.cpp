@@ -236,8 +236,11 @@ class Layout {
   private:
     // The translation with long values in its placeholders.
     static std::wstring Filled(const MessageCatalog& catalog, const std::wstring& key) {
-        const std::wstring direction = catalog.at(L"From PC to Device");
-        return qel_text::detail::qel_safefmt_impl(catalog.at(key), {L"1000000", L"1000000", direction});
+        const auto text = catalog.find(key);
+        return text == catalog.end()
+                   ? key
+                   : qel_text::detail::qel_safefmt_impl(
+                         text->second, {L"1000000", L"1000000", Xlate(L"From PC to Device")});
     }
     void CheckText(HWND window, const std::wstring& text, int width = 0) {
         // What is cut off with an ellipsis is meant to be.
