@@ -1,19 +1,21 @@
-// Drives the windows of another program from a script. A window is named by its caption, or by the start of
-// it and a "*", a control by its id. Every command waits up to two minutes for what it needs and ends with
-// exit code 1 if that does not come.
+// Drives the windows of another program from a script. A window is named by its caption, by the start of it
+// and a "*", or by "#ID" if it shows a control of that id; a control by its id. Every command waits up to two
+// minutes for what it needs and ends with exit code 1 if that does not come.
 //
 //   window_driver wait CAPTION               until the window is shown and takes input
 //   window_driver gone CAPTION               until there is no such window
 //   window_driver click CAPTION ID           presses a button, without waiting for what it does
 //   window_driver wait-text CAPTION ID TEXT  until the control's text is TEXT
 //   window_driver wait-disabled CAPTION ID   until the control takes no input
+//   window_driver rect CAPTION               prints where the window is, as WIDTHxHEIGHT+LEFT+TOP
 //   window_driver list CAPTION ID            prints the lines of a list box, in UTF-8
 //   window_driver tab CAPTION ID INDEX       turns to a page of a tab control
 //   window_driver command CAPTION ID NUMBER  sends the control a menu command; ID 0: the window, a command of
 //                                            its system menu
 //
 // The windows are looked for on the desktop that the environment variable WINDOW_DESKTOP names, by default
-// on that of the driver itself.
+// on that of the driver itself. Captions and texts are those in English; WINDOW_LANGUAGE ("de", "pt-BR")
+// names the language that the program shows them in.
 
 #include <windows.h>
 
@@ -24,6 +26,8 @@
 #include <functional>
 #include <iterator>
 #include <string>
+
+#include "qelutils/message_catalog.h"
 
 namespace {
 
@@ -49,7 +53,25 @@ std::wstring TextOf(HWND window) {
     return text;
 }
 
+std::wstring Variable(const wchar_t* name) {
+    wchar_t value[64] = {};
+    GetEnvironmentVariableW(name, value, static_cast<DWORD>(std::size(value)));
+    return value;
+}
+
+// What the program shows for that English text.
+std::wstring InItsLanguage(const std::wstring& english) {
+    static const auto catalog = qel_text::LoadCatalog(
+        LANGIDFROMLCID(LocaleNameToLCID(Variable(L"WINDOW_LANGUAGE").c_str(), LOCALE_ALLOW_NEUTRAL_NAMES)));
+    const auto found = catalog.find(english);
+    return found != catalog.end() ? found->second : english;
+}
+
 bool HasCaption(HWND window, const std::wstring& caption) {
+    if (caption.starts_with(L'#')) {
+        HWND control = GetDlgItem(window, static_cast<int>(std::wcstol(caption.c_str() + 1, nullptr, 10)));
+        return control != nullptr && IsWindowVisible(control);
+    }
     const std::wstring text = TextOf(window);
     return caption.ends_with(L'*') ? text.starts_with(caption.substr(0, caption.size() - 1))
                                    : text == caption;
@@ -132,18 +154,25 @@ bool Run(const std::wstring& verb, const std::wstring& caption, int id, const st
     if (!WaitUntil([&] { return (dialog = FindDialog(caption)) != nullptr; })) {
         return false;
     }
+    if (verb == L"rect") {
+        RECT place{};
+        GetWindowRect(dialog, &place);
+        std::printf("%ldx%ld+%ld+%ld\n", place.right - place.left, place.bottom - place.top, place.left,
+                    place.top);
+        return true;
+    }
     return verb == L"wait" || RunOnControl(verb, dialog, id, text);
 }
 
 // Windows of another desktop are out of reach. Wine's virtual desktops are desktops of their own.
 bool MoveToDesktop() {
-    wchar_t name[64] = {};
-    if (GetEnvironmentVariableW(L"WINDOW_DESKTOP", name, static_cast<DWORD>(std::size(name))) == 0) {
+    const std::wstring name = Variable(L"WINDOW_DESKTOP");
+    if (name.empty()) {
         return true;
     }
     // It may not have been made yet. The handle is needed as long as the driver runs.
     return WaitUntil([&] {
-        HDESK desktop = OpenDesktopW(name, 0, FALSE, GENERIC_ALL);
+        HDESK desktop = OpenDesktopW(name.c_str(), 0, FALSE, GENERIC_ALL);
         return desktop != nullptr && SetThreadDesktop(desktop);
     });
 }
@@ -157,5 +186,5 @@ int wmain(int argc, wchar_t** argv) {
     }
     const int id = argc > 3 ? static_cast<int>(std::wcstol(argv[3], nullptr, 10)) : 0;
     const std::wstring text = argc > 4 ? argv[4] : L"";
-    return MoveToDesktop() && Run(argv[1], argv[2], id, text) ? 0 : 1;
+    return MoveToDesktop() && Run(argv[1], InItsLanguage(argv[2]), id, InItsLanguage(text)) ? 0 : 1;
 }
