@@ -41,8 +41,11 @@ xgettext --language=C++ --from-code=UTF-8 --keyword --keyword=Xlate --keyword=Xl
     -e 's/LANGUAGE <LL@li.org>/Orvanelink/' -e '1i # Made by tools/make_pot.sh: the texts of the program, for a catalog in a new language.' \
     >"$work/new.pot"
 
+# Where a text stands, and in what order, is of no matter to the catalogs.
+comparable() { msgcat --no-location --sort-output "$1"; }
+
 case ${1:-} in
-  --check) diff -u "$pot" "$work/new.pot" || { echo "Run tools/make_pot.sh --merge" >&2 && exit 1; } ;;
+  --check) diff -u <(comparable "$pot") <(comparable "$work/new.pot") || { echo "Run tools/make_pot.sh --merge" >&2 && exit 1; } ;;
   --merge)
     cp "$work/new.pot" "$pot"
     for catalog in res/lang/*.po; do
