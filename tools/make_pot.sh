@@ -33,7 +33,7 @@ done
 
 # A text of blanks has nothing to translate.
 xgettext --language=C++ --from-code=UTF-8 --keyword --keyword=Xlate --keyword=XlateKey --add-comments=Translators: \
-  --add-location=file --package-name=Orvanelink --directory="$work" --directory=. --output=- \
+  --add-location=file --sort-output --package-name=Orvanelink --directory="$work" --directory=. --output=- \
   "${sources[@]}" "${templates[@]}" | sed 's/charset=CHARSET/charset=UTF-8/' |
   msggrep --invert-match --msgid --extended-regexp --regexp='^ +$' - |
   sed -e '/^"\(POT-Creation-Date\|Report-Msgid-Bugs-To\):/d' \
@@ -41,15 +41,15 @@ xgettext --language=C++ --from-code=UTF-8 --keyword --keyword=Xlate --keyword=Xl
     -e 's/LANGUAGE <LL@li.org>/Orvanelink/' -e '1i # Made by tools/make_pot.sh: the texts of the program, for a catalog in a new language.' \
     >"$work/new.pot"
 
-# Where a text stands, and in what order, is of no matter to the catalogs.
-comparable() { msgcat --no-location --sort-output "$1"; }
+# Where a text stands is of no matter to the catalogs.
+comparable() { msgcat --no-location "$1"; }
 
 case ${1:-} in
   --check) diff -u <(comparable "$pot") <(comparable "$work/new.pot") || { echo "Run tools/make_pot.sh --merge" >&2 && exit 1; } ;;
   --merge)
     cp "$work/new.pot" "$pot"
     for catalog in res/lang/*.po; do
-      msgmerge --quiet --no-fuzzy-matching --add-location=file --output-file="$work/merged.po" "$catalog" "$pot"
+      msgmerge --quiet --no-fuzzy-matching --add-location=file --sort-output --output-file="$work/merged.po" "$catalog" "$pot"
       msgattrib --no-obsolete --output-file="$catalog" "$work/merged.po"
     done
     ;;
