@@ -34,34 +34,29 @@ class FolderDeviceTest : public ::testing::Test {
         EXPECT_EQ(WaitForSingleObject(record.init_event, 5000), WAIT_OBJECT_0);
         return record.init_result;
     }
-
     // Closes all sessions and opens one, so that changed settings are read.
     void Reconnect() {
         device_.CloseSessions();
         EXPECT_EQ(Connect(), S_OK);
     }
-
-    HANDLE Open(const wchar_t* path, DWORD access, DWORD creation, DWORD share = 0) {
-        return CeCreateFile(path, access, share, nullptr, creation, FILE_ATTRIBUTE_NORMAL, nullptr);
+    HANDLE Open(const std::wstring& path, DWORD access, DWORD creation, DWORD share = 0) {
+        return CeCreateFile(path.c_str(), access, share, nullptr, creation, FILE_ATTRIBUTE_NORMAL, nullptr);
     }
-
     // Creates the file with this content through the device. False when a call failed.
-    bool WriteNew(const wchar_t* path, std::string_view content) {
+    bool WriteNew(const std::wstring& path, std::string_view content) {
         const HANDLE file = Open(path, GENERIC_WRITE, CREATE_NEW);
         return file != INVALID_HANDLE_VALUE && Write(file, content) && CeCloseHandle(file);
     }
-
     bool Write(HANDLE file, std::string_view bytes) {
         DWORD written = 0;
         return CeWriteFile(file, bytes.data(), static_cast<DWORD>(bytes.size()), &written, nullptr) &&
                written == bytes.size();
     }
-
     // The names that CeFindAllFiles gives, in alphabetical order; nothing when it fails.
-    std::optional<StringList> Names(const wchar_t* pattern) {
+    std::optional<StringList> Names(const std::wstring& pattern) {
         DWORD count = 0;
         rapi::FindData* found = nullptr;
-        if (!CeFindAllFiles(pattern, rapi::kFindName, &count, &found)) {
+        if (!CeFindAllFiles(pattern.c_str(), rapi::kFindName, &count, &found)) {
             return std::nullopt;
         }
         StringList names;
@@ -71,7 +66,6 @@ class FolderDeviceTest : public ::testing::Test {
         EXPECT_EQ(CeRapiFreeBuffer(found), S_OK);
         return names;
     }
-
     // The error of a call that must have failed; 0 for one that did not.
     DWORD ErrorOf(BOOL done) { return done ? 0 : CeGetLastError(); }
     DWORD ErrorOf(HANDLE handle) { return handle != INVALID_HANDLE_VALUE ? 0 : CeGetLastError(); }
