@@ -6,19 +6,19 @@
 namespace folder_device {
 
 void DeviceTimes::LookAtVolume() {
-    if (volume_.empty()) {
-        volume_.resize(root_.size() + MAX_PATH);
-        if (!GetVolumePathNameW((root_ + L"\\").c_str(), volume_.data(),
-                                static_cast<DWORD>(volume_.size()))) {
-            volume_.clear();
-            return;
-        }
-        volume_is_fixed_ = GetDriveTypeW(volume_.c_str()) == DRIVE_FIXED;
-    } else if (volume_is_fixed_) {
+    if (volume_stays_) {
         return;
     }
+    const orvane::UniqueFile root(CreateFileW((root_ + L"\\").c_str(), 0,
+                                              FILE_SHARE_READ | FILE_SHARE_WRITE | FILE_SHARE_DELETE, nullptr,
+                                              OPEN_EXISTING, FILE_FLAG_BACKUP_SEMANTICS, nullptr));
     wchar_t kind[MAX_PATH + 1] = L"";
-    GetVolumeInformationW(volume_.c_str(), nullptr, 0, nullptr, nullptr, nullptr, kind, MAX_PATH + 1);
+    if (root) {
+        GetVolumeInformationByHandleW(root.Get(), nullptr, 0, nullptr, nullptr, nullptr, kind, MAX_PATH + 1);
+    }
+    const std::size_t colon = root_.find(L':');  // None in a network path.
+    volume_stays_ = kind[0] != L'\0' && colon != std::wstring::npos && colon > 0 &&
+                    GetDriveTypeW((root_.substr(colon - 1, 2) + L"\\").c_str()) == DRIVE_FIXED;
     DYNAMIC_TIME_ZONE_INFORMATION zone{};
     GetDynamicTimeZoneInformation(&zone);
     const std::wstring_view name = kind;

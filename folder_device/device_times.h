@@ -47,8 +47,7 @@ class DeviceTimes {
 
     const std::wstring root_;
     const std::int64_t offset_;  // In 100-ns units.
-    std::wstring volume_;
-    bool volume_is_fixed_ = false;
+    bool volume_stays_ = false;  // On a fixed disk: the question costs more than all else of a session.
     bool keeps_local_time_ = false;
     mutable std::mutex mutex_;
     mutable std::map<WORD, TIME_ZONE_INFORMATION> rules_;  // By year: the system takes its time to tell.
