@@ -4,6 +4,7 @@
 
 #include <utility>
 
+#include "app/help.h"
 #include "app/sync_pass.h"
 #include "device/clock_check.h"
 #include "platform/paths.h"
@@ -53,12 +54,6 @@ bool CanBeCancelled(RunState state) {
     return state == RunState::kRunning || state == RunState::kDiskFull;
 }
 
-// The about box.
-class CAboutDlg : public ui::Dialog {
-  public:
-    explicit CAboutDlg(HWND parent) : Dialog(IDD_ABOUT, parent) {}
-};
-
 }  // namespace
 
 CWendlowDlg::CWendlowDlg()
@@ -77,10 +72,7 @@ bool CWendlowDlg::OnInitDialog() {
     SetWindowTextW(Handle(), Xlate(L"Desktop-Mobile Device Synchronization").c_str());
     Enter(RunState::kIdle);
 
-    HMENU system_menu = GetSystemMenu(Handle(), FALSE);
-    AppendMenuW(system_menu, MF_SEPARATOR, 0, nullptr);
-    AppendMenuW(system_menu, MF_STRING, IDM_ABOUT, Xlate(L"About Orvanelink...").c_str());
-
+    AppendHelpItems(GetSystemMenu(Handle(), FALSE));
     task_.reports.SetTarget(Handle(), WM_SYNC_NOTIFY);
 
     if (settings_.start_file_view) {
@@ -155,7 +147,11 @@ std::optional<LRESULT> CWendlowDlg::OnMessage(UINT message, WPARAM wparam, LPARA
             }
             return std::nullopt;
         case WM_SYSCOMMAND:
-            return OnSysCommand(static_cast<UINT>(wparam)) ? std::optional<LRESULT>(0) : std::nullopt;
+            return RunHelpItem(static_cast<UINT>(wparam), Handle()) ? std::optional<LRESULT>(0)
+                                                                    : std::nullopt;
+        case WM_HELP:  // F1, here or in a dialog above this one.
+            OpenGuide(Handle());
+            return TRUE;
         case WM_PAINT:
             return OnPaint() ? std::optional<LRESULT>(0) : std::nullopt;
         case WM_QUERYDRAGICON:
@@ -167,15 +163,6 @@ std::optional<LRESULT> CWendlowDlg::OnMessage(UINT message, WPARAM wparam, LPARA
         default:
             return std::nullopt;
     }
-}
-
-bool CWendlowDlg::OnSysCommand(UINT command) {
-    // The system uses the low four bits of a command itself.
-    if ((command & 0xFFF0U) != IDM_ABOUT) {
-        return false;
-    }
-    CAboutDlg(Handle()).DoModal();
-    return true;
 }
 
 bool CWendlowDlg::OnPaint() {

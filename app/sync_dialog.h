@@ -44,7 +44,6 @@ class CWendlowDlg : public ui::Dialog {
     void OnSettings();
     void OnFileView();
     void OnSyncNotify();
-    bool OnSysCommand(UINT command);
     bool OnPaint();
     std::optional<LRESULT> OnCtlColor(UINT message, HDC dc);
 

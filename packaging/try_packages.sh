@@ -71,7 +71,20 @@ grep -q '/Start Menu/.*/Orvanelink.lnk' <<<"$(drive_files)" || fail "the Start m
 DLL_FOLDER=$folder/folder_device FOLDER_DEVICE_ROOT='J:\device' synchronize "$folder/orvanelink.exe"
 done_with "installed for one user; the installed program synchronizes"
 
+# Wine hands pages to this browser; without Wine's own they are of no type.
+wine reg add 'HKCR\.html' /ve /d htmlfile /f >>"$trial/wine.log"
+printf '#!/bin/sh\necho "$1" >"%s"\n' "$trial/opened" >"$trial/browser"
+chmod +x "$trial/browser"
+wine reg add 'HKCU\Software\Wine\WineBrowser' /v Browsers /d "$trial/browser" /f >>"$trial/wine.log"
 start "$folder/orvanelink.exe"
+drive command "$main_window" 0 $((0x20))
+for ((tenths = 0; tenths < 100; ++tenths)); do
+  [ -s "$trial/opened" ] && break
+  sleep 0.1
+done
+grep -q '/Orvanelink/guide/user_guide.html$' "$trial/opened" || fail "Help opens: $(cat "$trial/opened")"
+done_with "Help opens the guide"
+
 status=0
 msi /i "$next_installer" || status=$?
 [ $status -eq $((3010 % 256)) ] || fail "an upgrade of the running program answers $status"

@@ -35,6 +35,8 @@
 
 // About box
 #define IDD_ABOUT 100
+#define IDC_ABOUT_VERSION 1060
+#define IDC_ABOUT_SETTINGS 1061
 
 // Synchronization dialog
 #define IDD_SYNC 102
@@ -45,8 +47,9 @@
 #define IDC_SYNC_SETTINGS 1010
 #define IDC_SYNC_FILE_VIEW 1011
 #define IDC_SYNC_LOG 1020
-// The system-menu item; the low four bits of a system command belong to the system.
+// The system-menu items; the low four bits of a system command belong to the system.
 #define IDM_ABOUT 0x10
+#define IDM_HELP 0x20
 
 // Options dialog
 #define IDD_OPTIONS 130

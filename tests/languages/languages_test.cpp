@@ -84,6 +84,7 @@ const Place kPlaces[] = {
      IDC_SYNC_STATUS,
      {L"Synchronization in progress...", L"Sychronization cancelled", L"Synchronization complete.",
       L"No mobile device with a job folder was found."}},
+    {IDD_ABOUT, IDC_ABOUT_VERSION, {L"Orvanelink, version {1}"}},
     {IDD_TRANSFER,
      IDC_TRANSFER_COPY,
      {L"Copy Selected File(s) from PC to Device", L"Copy Selected File(s) from Device to PC"}},
@@ -102,6 +103,7 @@ const Place kPlaces[] = {
 // Message boxes, menus and the log take what room they need; the directions are parts of a caption.
 const std::set<std::wstring> kRoomOfTheirOwn = {
     L"About Orvanelink...",
+    L"Help",
     L"Checking files...",
     L"[Desktop to Mobile Device] Error: DEVICE DISK FULL.",
     L"[Mobile Device to Desktop] Error: PC DISK FULL.",

@@ -23,7 +23,8 @@ TIME_ZONE_INFORMATION Rules(LONG bias, SYSTEMTIME standard, SYSTEMTIME summer) {
 TEST(LocalTime, HasTheOffsetOfItsOwnDate) {
     const TIME_ZONE_INFORMATION berlin = Rules(-60, {0, 10, 0, 5, 3, 0, 0, 0}, {0, 3, 0, 5, 2, 0, 0, 0});
     const TIME_ZONE_INFORMATION sydney = Rules(-600, {0, 4, 0, 1, 3, 0, 0, 0}, {0, 10, 0, 1, 2, 0, 0, 0});
-    const TIME_ZONE_INFORMATION newfoundland = Rules(210, {0, 11, 0, 1, 2, 0, 0, 0}, {0, 3, 0, 2, 2, 0, 0, 0});
+    const TIME_ZONE_INFORMATION newfoundland =
+        Rules(210, {0, 11, 0, 1, 2, 0, 0, 0}, {0, 3, 0, 2, 2, 0, 0, 0});
     const TIME_ZONE_INFORMATION utc{};
     const struct {
         const TIME_ZONE_INFORMATION& rules;
