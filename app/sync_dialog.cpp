@@ -213,6 +213,9 @@ void CWendlowDlg::OnSynchronize() {
 bool CWendlowDlg::ReadJobFolders(JobTable& pc, JobTable& device) {
     bool device_read = false;
     const auto read = [&] {
+        if (settings_.sync_path_ce.empty()) {
+            settings_.sync_path_ce = FindDeviceJobFolder();  // The device may have come since the start.
+        }
         FileNode device_root;
         // An empty folder would be the device's whole storage.
         device_read = !settings_.sync_path_ce.empty() &&

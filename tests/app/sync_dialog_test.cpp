@@ -1,113 +1,87 @@
-// Whole synchronizations through the real dialog: what it does and what it shows.
-#include <windows.h>
-
-#include <commctrl.h>
-
-#include <algorithm>
+// What the synchronization dialog does and shows.
+#include <atomic>
+#include <new>
 
 #include "qelutils/xlate.h"
-#include "res/ids.h"
 #include "tests/app/sync_fixture.h"
+
+namespace {
+
+// While it is not 0, only the thread of that number and the one that set it get memory.
+std::atomic<DWORD> fed_thread{0};
+std::atomic<DWORD> feeding_thread{0};
+
+}  // namespace
+
+void* operator new(std::size_t bytes) {
+    const DWORD thread = GetCurrentThreadId();
+    const bool fed = fed_thread == 0 || thread == fed_thread || thread == feeding_thread;
+    if (void* memory = fed ? HeapAlloc(GetProcessHeap(), 0, bytes) : nullptr) {
+        return memory;
+    }
+    throw std::bad_alloc();
+}
+
+void operator delete(void* memory) noexcept {
+    HeapFree(GetProcessHeap(), 0, memory);
+}
+
+void operator delete(void* memory, std::size_t /*bytes*/) noexcept {
+    HeapFree(GetProcessHeap(), 0, memory);
+}
 
 namespace orvane::testing {
 
 namespace {
 
-TEST_F(SyncTest, CopiesBothWaysAndTellsSo) {
-    PutOnPc(L"from_pc.qvj", "pc", noon_);
-    PutOnPc(L"sub\\deep\\Plan.XML", "plan", noon_);
-    PutOnPc(L"letter.doc", "stays", noon_);
-    PutOnDevice(L"from_device.txt", "device", noon_);
-    PutOnDevice(L"day 1\\scan.img", "image", noon_);
-    PutOnPc(L"newer_here.tn3", "newer", AddSeconds(noon_, 10));
-    PutOnDevice(L"NEWER_HERE.tn3", "older", noon_);
-    PutOnPc(L"same.tn3", "as on the pc", AddSeconds(noon_, 9));
-    PutOnDevice(L"same.tn3", "as on the device", noon_);
-    PutOnPc(L"newer_there.rd3", "older", noon_);
-    PutOnDevice(L"newer_there.rd3", "newer", AddSeconds(noon_, 3600));
+constexpr const wchar_t* kRunning = L"Synchronization in progress...";
+constexpr const wchar_t* kCancelled = L"Sychronization cancelled";
+constexpr const wchar_t* kStart = L"Checking files...";
 
-    const DialogRun dialog;
-    EXPECT_EQ(dialog.Text(IDC_SYNC_CANCEL_EXIT), L"Exit");
-    EXPECT_EQ(dialog.Text(IDC_SYNC_STATUS), L"");
-    EXPECT_FALSE(dialog.IsBarVisible());
-    dialog.Synchronize();
-
-    Lines log = dialog.Log();
-    EXPECT_EQ(log, (Lines{L"Checking files...", L"[Desktop to Mobile Device] File copy: \"\\from_pc.qvj\"",
-                          L"[Desktop to Mobile Device] File copy: \"\\newer_here.tn3\"",
-                          L"[Desktop to Mobile Device] File copy: \"\\sub\\deep\\Plan.XML\"",
-                          L"[Mobile Device to Desktop] File copy: \"\\day 1\\scan.img\"",
-                          L"[Mobile Device to Desktop] File copy: \"\\from_device.txt\"",
-                          L"[Mobile Device to Desktop] File copy: \"\\newer_there.rd3\"",
-                          L"Synchronization complete."}));
-    EXPECT_EQ(dialog.Text(IDC_SYNC_CANCEL_EXIT), L"Exit");
-    // 8 entries on the PC, 6 on the device.
-    EXPECT_EQ(dialog.BarMaximum(), 14);
-    EXPECT_EQ(SendMessageW(dialog.Item(IDC_SYNC_PROGRESS), PBM_GETPOS, 0, 0), 14);
-
-    EXPECT_EQ(ReadTextFile(OnDevice(L"from_pc.qvj")), "pc");
-    EXPECT_EQ(ReadTextFile(OnDevice(L"sub\\deep\\Plan.XML")), "plan");
-    EXPECT_FALSE(Exists(OnDevice(L"letter.doc")));
-    EXPECT_EQ(ReadTextFile(OnPc(L"from_device.txt")), "device");
-    EXPECT_EQ(ReadTextFile(OnPc(L"day 1\\scan.img")), "image");
-    EXPECT_EQ(ReadTextFile(OnDevice(L"newer_here.tn3")), "newer");
-    EXPECT_EQ(ReadTextFile(OnDevice(L"same.tn3")), "as on the device");
-    EXPECT_EQ(ReadTextFile(OnPc(L"newer_there.rd3")), "newer");
-    EXPECT_EQ(TicksOf(LastWriteTime(OnPc(L"from_device.txt"))), TicksOf(noon_));
-
-    // Nothing is left to do, and the log goes on below.
-    dialog.Synchronize();
-    log.insert(log.end(), {L"Checking files...", L"Synchronization complete."});
-    EXPECT_EQ(dialog.Log(), log);
+TEST_F(SyncTest, ShowsHowFarARunIs) {
+    PutOnPc(L"a.qvj");
+    PutOnDevice(L"b.txt");
+    const SyncRun run;
+    EXPECT_EQ(run.Button(), L"Exit");
+    EXPECT_EQ(run.Status(), L"");
+    EXPECT_FALSE(run.IsBarVisible());
+    run.Synchronize();
+    EXPECT_EQ(run.Button(), L"Exit");
+    EXPECT_EQ(run.BarMaximum(), 2);
+    EXPECT_EQ(SendMessageW(run.Item(IDC_SYNC_PROGRESS), PBM_GETPOS, 0, 0), 2);
+    EXPECT_EQ(run.Log()[1], L"[Desktop to Mobile Device] File copy: \"\\a.qvj\"");
+    EXPECT_EQ(run.Log()[2], L"[Mobile Device to Desktop] File copy: \"\\b.txt\"");
+    EXPECT_EQ(TicksOf(LastWriteTime(OnPc(L"b.txt"))), TicksOf(noon_));
 }
 
 TEST_F(SyncTest, StartsAsAFileViewerOnRequest) {
     Setting(L"Start_File_View", L"1");
-    const DialogRun dialog;
-    ASSERT_NE(FileView(), nullptr);
+    const DialogThread<CWendlowDlg> run;
+    const wchar_t* view = L"File Transfer - Copy From";
+    ASSERT_TRUE(WaitUntil([&] { return Shown(view) != nullptr; }));
     const ULONGLONG shown = GetTickCount64();
     EXPECT_TRUE(WaitUntil([&] {
-        EXPECT_FALSE(IsWindowVisible(dialog.Window()));
+        EXPECT_FALSE(IsWindowVisible(run.Window()));
         return GetTickCount64() >= shown + 200;
     }));
-    PostMessageW(FileView(), WM_CLOSE, 0, 0);
+    PostMessageW(Shown(view), WM_CLOSE, 0, 0);
     EXPECT_TRUE(WaitUntil([&] {
-        EXPECT_FALSE(IsWindowVisible(dialog.Window()));
-        return dialog.HasEnded();
+        EXPECT_FALSE(IsWindowVisible(run.Window()));
+        return run.HasEnded();
     }));
 }
 
-TEST_F(SyncTest, TakesCompanionFoldersAlongAndKeepsBackups) {
-    Setting(L"Overwrite_bkp", L"1");
-    PutOnPc(L"bridge.wkf", "job", noon_);
-    PutOnPc(L"bridge\\raw\\points.dat", "points", noon_);
-    PutOnDevice(L"tunnel.WKF", "job", noon_);
-    PutOnDevice(L"tunnel\\points.dat", "points", noon_);
-    PutNewerOnPc(L"level.qvj");
-    PutOnDevice(L"level.qvj.001", "oldest", noon_);
-
-    DialogRun().Synchronize();
-    EXPECT_EQ(ReadTextFile(OnDevice(L"bridge\\raw\\points.dat")), "points");
-    EXPECT_EQ(ReadTextFile(OnPc(L"tunnel\\points.dat")), "points");
-    EXPECT_EQ(ReadTextFile(OnDevice(L"level.qvj")), "newer");
-    EXPECT_EQ(ReadTextFile(OnDevice(L"level.qvj.002")), "older");
-}
-
-TEST_F(SyncTest, AsksBeforeReplacingWhenTheUserWantsWarning) {
+TEST_F(SyncTest, TheReplaceQuestionStandsAlone) {
     Setting(L"Overwrite_warn", L"1");
     PutNewerOnPc(L"a.qvj");
-    PutNewerOnPc(L"b.qvj");
-    const MessageBoxAnswerer answers({IDCANCEL, IDOK});
-    DialogRun().Synchronize();
+    const MessageBoxAnswerer boxes;  // The default button.
+    SyncRun().Synchronize();
     EXPECT_EQ(ReadTextFile(OnDevice(L"a.qvj")), "older");
-    EXPECT_EQ(ReadTextFile(OnDevice(L"b.qvj")), "newer");
-    const auto boxes = answers.Seen();
-    ASSERT_EQ(boxes.size(), 2U);
-    EXPECT_EQ(boxes[0].caption, L"Synchronization - Warning");
-    EXPECT_EQ(boxes[0].text, L"The file:\n\\Jobs\\a.qvj [Device] \n\nWill be replaced by the file:\n" +
-                                 OnPc(L"a.qvj") + L" [PC]");
-    EXPECT_EQ(boxes[0].owner, nullptr);
-    EXPECT_EQ(boxes[0].style & 0x1171U, 0x1121U);
+    ASSERT_EQ(boxes.Seen().size(), 1U);
+    EXPECT_EQ(boxes.Seen()[0].caption, L"Synchronization - Warning");
+    EXPECT_EQ(boxes.Seen()[0].text, L"The file:\n\\Jobs\\a.qvj [Device] \n\nWill be replaced by the file:\n" +
+                                        OnPc(L"a.qvj") + L" [PC]");
+    EXPECT_EQ(boxes.Seen()[0].owner, nullptr);
 }
 
 TEST_F(SyncTest, WorksInTheUsersLanguage) {
@@ -115,17 +89,17 @@ TEST_F(SyncTest, WorksInTheUsersLanguage) {
     {
         PutManyOnPc(40);
         device_.Set(L"CALL_DELAY", L"5");
-        const DialogRun dialog;
-        EXPECT_EQ(dialog.Text(IDC_SYNC_CANCEL_EXIT), L"Beenden");
-        dialog.Press(IDC_SYNC_START);
-        EXPECT_TRUE(WaitUntil([&] { return dialog.Text(IDC_SYNC_CANCEL_EXIT) == L"Abbrechen"; }));
-        dialog.Press(IDC_SYNC_CANCEL_EXIT);
-        EXPECT_EQ(dialog.Text(IDC_SYNC_CANCEL_EXIT), L"Beenden");
-        dialog.Press(IDC_SYNC_CANCEL_EXIT);  // The second click of a double click.
+        const SyncRun run;
+        EXPECT_EQ(run.Button(), L"Beenden");
+        run.Press(IDC_SYNC_START);
+        EXPECT_EQ(run.Button(), L"Abbrechen");
+        run.Press(IDC_SYNC_CANCEL_EXIT);
+        EXPECT_EQ(run.Button(), L"Beenden");
+        run.Press(IDC_SYNC_CANCEL_EXIT);  // The second click of a double click.
         Sleep(GetDoubleClickTime() + 100);
-        EXPECT_FALSE(dialog.HasEnded());
-        dialog.Press(IDC_SYNC_CANCEL_EXIT);
-        EXPECT_TRUE(WaitUntil([&] { return dialog.HasEnded(); }));
+        EXPECT_FALSE(run.HasEnded());
+        run.Press(IDC_SYNC_CANCEL_EXIT);
+        EXPECT_TRUE(WaitUntil([&] { return run.HasEnded(); }));
     }
     qel_text::SetCatalogLanguage(MAKELANGID(LANG_ENGLISH, SUBLANG_ENGLISH_US));
 }
@@ -133,37 +107,24 @@ TEST_F(SyncTest, WorksInTheUsersLanguage) {
 TEST_F(SyncTest, CancelStopsAndTheNextPressStartsAfresh) {
     PutManyOnPc(60);
     device_.Set(L"CALL_DELAY", L"5");
-    const DialogRun dialog;
-    const auto starts = [&] {
-        const Lines log = dialog.Log();
-        return std::count(log.begin(), log.end(), L"Checking files...");
-    };
-    dialog.Press(IDC_SYNC_START);
-    EXPECT_TRUE(WaitUntil([&] { return dialog.Log().size() >= 3; }));
-    EXPECT_EQ(dialog.Text(IDC_SYNC_STATUS), L"Synchronization in progress...");
-    EXPECT_TRUE(dialog.IsBarVisible());
+    const SyncRun run;
+    run.Press(IDC_SYNC_START);
+    EXPECT_TRUE(WaitUntil([&] { return run.Log().size() >= 3; }));
+    EXPECT_EQ(run.Status(), kRunning);
+    EXPECT_TRUE(run.IsBarVisible());
 
-    // While a worker runs the press does nothing.
-    dialog.Press(IDC_SYNC_START);
-    EXPECT_EQ(starts(), 1);
-
-    dialog.Press(IDC_SYNC_CANCEL_EXIT);
-    EXPECT_EQ(dialog.Text(IDC_SYNC_CANCEL_EXIT), L"Exit");
-    Sleep(300);  // For the file under way to end.
+    run.Press(IDC_SYNC_CANCEL_EXIT);
+    EXPECT_EQ(run.Button(), L"Exit");
+    EXPECT_TRUE(WaitUntil([&] { return !run.HasWorker(); }));
     const Lines copied = DeviceFiles();
     EXPECT_LT(copied.size(), 60U);
-    Sleep(300);
-    EXPECT_EQ(DeviceFiles(), copied);
-    EXPECT_EQ(dialog.Completions(), 0);
-    EXPECT_EQ(dialog.Text(IDC_SYNC_STATUS), L"Sychronization cancelled");
-    EXPECT_TRUE(dialog.IsBarVisible());
+    EXPECT_EQ(run.Status(), kCancelled);
+    EXPECT_TRUE(run.IsBarVisible());
 
     device_.Set(L"CALL_DELAY", L"");
-    dialog.Synchronize();
-    EXPECT_EQ(starts(), 2);
-    for (int i = 0; i < 60; ++i) {
-        EXPECT_EQ(ReadTextFile(OnDevice(L"new_" + std::to_wstring(i) + L".qvj")), "content") << i;
-    }
+    run.Synchronize();
+    EXPECT_EQ(run.Logged(kStart), 2);
+    EXPECT_EQ(DeviceFiles(), PcFiles());
 }
 
 TEST_F(SyncTest, CancelledInItsLastFileARunStaysCancelled) {
@@ -171,66 +132,159 @@ TEST_F(SyncTest, CancelledInItsLastFileARunStaysCancelled) {
         const std::wstring large = to_device ? L"large.qvj" : L"large.txt";
         WriteTextFile(to_device ? OnPc(large) : OnDevice(large), std::string(4'000'000, 'l'), noon_);
         if (to_device) {
-            PutOnDevice(L"later.txt", "for the second pass", noon_);
+            PutOnDevice(L"later.txt");  // For the second pass.
         }
         device_.Set(L"CALL_DELAY", L"10");
-        const DialogRun dialog;
-        dialog.Press(IDC_SYNC_START);
-        EXPECT_TRUE(WaitUntil([&] { return dialog.Log().size() == 2; }));
-        Sleep(100);
-        dialog.Press(IDC_SYNC_CANCEL_EXIT);
-        Sleep(300);
-        EXPECT_EQ(dialog.Text(IDC_SYNC_STATUS), L"Sychronization cancelled");
-        EXPECT_EQ(dialog.Log().size(), 2U);
-        EXPECT_FALSE(Exists(to_device ? OnDevice(large) : OnPc(large)));
-        EXPECT_FALSE(Exists(OnPc(L"later.txt")));
-        DeleteFileW(OnPc(L"large.qvj").c_str());
+        const SyncRun run;
+        run.Press(IDC_SYNC_START);
+        EXPECT_TRUE(WaitUntil([&] { return run.Log().size() == 2; }));
+        Sleep(100);  // Into the file.
+        run.Press(IDC_SYNC_CANCEL_EXIT);
+        EXPECT_TRUE(WaitUntil([&] { return !run.HasWorker(); }));
+        EXPECT_EQ(run.Status(), kCancelled);
+        EXPECT_EQ(run.Log().size(), 2U);
+        EXPECT_EQ(PcFiles(), to_device ? Lines{large} : Lines{});
+        DeleteFileW(OnPc(large).c_str());
         DeleteFileW(OnDevice(L"later.txt").c_str());
     }
 }
 
-TEST_F(SyncTest, LeavingRemovesTheFileThatIsCopiedInPart) {
-    PutOnPc(L"large.qvj", std::string(4'000'000, 'l'), noon_);
-    device_.Set(L"CALL_DELAY", L"10");
-    const DialogRun dialog;
-    dialog.Press(IDC_SYNC_START);
-    EXPECT_TRUE(WaitUntil([&] { return Exists(OnDevice(L"large.qvj")); }));
-    PostMessageW(dialog.Window(), WM_COMMAND, IDCANCEL, 0);
-    EXPECT_TRUE(WaitUntil([&] { return dialog.HasEnded(); }));
-    EXPECT_FALSE(Exists(OnDevice(L"large.qvj")));
+TEST_F(SyncTest, DoesOneThingAtATime) {
+    PutManyOnPc(3);
+    device_.Set(L"CALL_DELAY", L"1000");
+    const SyncRun run;
+    run.Press(IDC_SYNC_START);
+    for (const bool cancelled : {false, true}) {
+        if (cancelled) {
+            run.Press(IDC_SYNC_CANCEL_EXIT);
+        }
+        ASSERT_TRUE(run.HasWorker());
+        const ULONGLONG pressed = GetTickCount64();
+        run.Press(IDC_SYNC_START);
+        run.Press(IDC_SYNC_FILE_VIEW);
+        EXPECT_LT(GetTickCount64() - pressed, 500U);
+        EXPECT_EQ(run.Logged(kStart), 1);
+    }
+    // Nor is the worker waited for when the user leaves.
+    const ULONGLONG left = GetTickCount64();
+    run.PressAndGoOn(IDCANCEL);
+    EXPECT_TRUE(WaitUntil([&] { return run.HasEnded(); }));
+    EXPECT_LT(GetTickCount64() - left, 900U);
+    device_.Set(L"CALL_DELAY", L"");
 }
 
 TEST_F(SyncTest, AnOpenQuestionHoldsUpTheNextStart) {
     Setting(L"Overwrite_warn", L"1");
     PutNewerOnPc(L"a.qvj");
-    const DialogRun dialog;
-    const auto question = [] { return FindWindowW(L"#32770", L"Synchronization - Warning"); };
-    dialog.Press(IDC_SYNC_START);
+    const SyncRun run;
+    const auto question = [] { return Shown(L"Synchronization - Warning"); };
+    run.Press(IDC_SYNC_START);
     EXPECT_TRUE(WaitUntil([&] { return question() != nullptr; }));
-    dialog.Press(IDC_SYNC_CANCEL_EXIT);
-    dialog.Press(IDC_SYNC_START);
-    EXPECT_EQ(dialog.Log(), (Lines{L"Checking files..."}));
+    run.Press(IDC_SYNC_CANCEL_EXIT);
+    run.Press(IDC_SYNC_START);
+    EXPECT_EQ(run.Log(), Lines{kStart});
 
     PostMessageW(question(), WM_COMMAND, IDOK, 0);
-    EXPECT_TRUE(WaitUntil([&] { return question() == nullptr; }));
-    Setting(L"Overwrite_warn", L"0");
+    EXPECT_TRUE(WaitUntil([&] { return !run.HasWorker(); }));
     const MessageBoxAnswerer answers({IDOK});
-    dialog.Synchronize();
+    run.Synchronize();
     EXPECT_EQ(ReadTextFile(OnDevice(L"a.qvj")), "newer");
+}
+
+// The window lives while the device is read, drops what is pressed, and can be closed.
+TEST_F(SyncTest, LivesWhileTheJobFoldersAreRead) {
+    for (const bool escape : {true, false}) {
+        PutOnDevice(L"sub\\a.qvj");
+        const SyncRun run;
+        device_.Set(L"CALL_DELAY", L"1000");
+        run.PressAndGoOn(IDC_SYNC_START);
+        EXPECT_TRUE(WaitUntil([&] { return run.Status() == kRunning; }));
+        run.PressAndGoOn(IDC_SYNC_SETTINGS);
+        run.Press(IDC_SYNC_START);
+        InvalidateRect(run.Window(), nullptr, TRUE);
+        Sleep(200);
+        EXPECT_FALSE(GetUpdateRect(run.Window(), nullptr, FALSE));
+        DWORD_PTR answer = 0;
+        EXPECT_TRUE(SendMessageTimeoutW(run.Window(), WM_NULL, 0, 0, SMTO_NORMAL, 100, &answer));
+        EXPECT_EQ(Shown(L"Options"), nullptr);
+        if (escape) {
+            PostMessageW(run.Item(IDC_SYNC_LOG), WM_KEYDOWN, VK_ESCAPE, 0);
+        } else {
+            PostMessageW(run.Window(), WM_SYSCOMMAND, SC_CLOSE, 0);
+        }
+        const ULONGLONG closed = GetTickCount64();
+        EXPECT_TRUE(WaitUntil([&] { return run.HasEnded(); }));
+        EXPECT_LT(GetTickCount64() - closed, 3000U);  // The call under way, the next one, and a second.
+        EXPECT_FALSE(Exists(OnPc(L"sub")));
+        device_.Set(L"CALL_DELAY", L"");
+    }
+}
+
+TEST_F(SyncTest, ARunThatIsOutOfMemoryIsOver) {
+    PutManyOnPc(40);
+    device_.Set(L"CALL_DELAY", L"5");
+    const SyncRun run;
+    run.Press(IDC_SYNC_START);
+    EXPECT_TRUE(WaitUntil([&] { return run.Log().size() >= 3; }));
+    feeding_thread = GetCurrentThreadId();
+    fed_thread = GetWindowThreadProcessId(run.Window(), nullptr);
+    EXPECT_TRUE(WaitUntil([&] { return run.Status() == kCancelled; }));
+    fed_thread = 0;
+    EXPECT_EQ(run.Button(), L"Exit");
+    run.Synchronize();
+    EXPECT_EQ(DeviceFiles(), PcFiles());
+}
+
+TEST_F(SyncTest, SettingsOfTheFileViewHoldHereToo) {
+    PutOnPc(L"a.qvj");
+    PutOnPc(L"b.tn3");
+    const SyncRun run;
+    run.PressAndGoOn(IDC_SYNC_FILE_VIEW);
+    const wchar_t* view = L"File Transfer - Copy From";
+    ASSERT_TRUE(WaitUntil([&] { return Shown(view) != nullptr; }));
+    PostMessageW(Shown(view), WM_COMMAND, IDC_TRANSFER_SETTINGS, 0);
+    const wchar_t* options = L"Options";
+    ASSERT_TRUE(WaitUntil([&] { return Shown(options) != nullptr; }));
+    SendDlgItemMessageW(Shown(options), IDC_OPTIONS_QVJ, BM_SETCHECK, BST_UNCHECKED, 0);
+    PostMessageW(Shown(options), WM_COMMAND, IDOK, 0);
+    ASSERT_TRUE(WaitUntil([&] { return Shown(options) == nullptr; }));
+    PostMessageW(Shown(view), WM_CLOSE, 0, 0);
+    ASSERT_TRUE(WaitUntil([&] { return Shown(view) == nullptr; }));
+    run.Synchronize();
+    EXPECT_EQ(DeviceFiles(), Lines{L"b.tn3"});
+}
+
+TEST_F(SyncTest, AsksForTheDeviceFolderAgain) {
+    device_.Set(L"CONNECT_RESULT", L"0x80004005");
+    const SyncRun run;
+    EXPECT_EQ(run.Status(), L"No mobile device with a job folder was found.");
+    PutOnPc(L"a.qvj");
+    {
+        const MessageBoxAnswerer boxes;
+        run.Press(IDC_SYNC_START);
+        ASSERT_EQ(boxes.Seen().size(), 1U);
+        EXPECT_EQ(run.Status(), L"");
+    }
+    // The device comes, with its job folder as stored, which is not all of it.
+    device_.Clear(L"CONNECT_RESULT");
+    WriteTextFile(device_.PcPath(L"\\other.txt"), "beside the job folder");
+    run.Synchronize();
+    EXPECT_EQ(DeviceFiles(), Lines{L"a.qvj"});
+    EXPECT_EQ(PcFiles(), Lines{L"a.qvj"});
 }
 
 TEST_F(SyncTest, TwentyRunsLeaveNoHandlesBehind) {
     PutManyOnPc(1);
-    PutOnDevice(L"a.txt", "device", noon_);
-    const DialogRun dialog;
-    dialog.Synchronize();
+    PutOnDevice(L"a.txt");
+    const SyncRun run;
+    run.Synchronize();
     DWORD before = 0;
     DWORD after = 0;
     GetProcessHandleCount(GetCurrentProcess(), &before);
     for (int i = 0; i < 20; ++i) {
         DeleteFileW(OnDevice(L"new_0.qvj").c_str());
         DeleteFileW(OnPc(L"a.txt").c_str());
-        dialog.Synchronize();
+        run.Synchronize();
         EXPECT_TRUE(Exists(OnDevice(L"new_0.qvj")) && Exists(OnPc(L"a.txt"))) << i;
     }
     GetProcessHandleCount(GetCurrentProcess(), &after);
@@ -239,12 +293,26 @@ TEST_F(SyncTest, TwentyRunsLeaveNoHandlesBehind) {
 }
 
 TEST_F(SyncTest, ShowsTheAboutBoxFromTheSystemMenu) {
-    const DialogRun dialog;
-    PostMessageW(dialog.Window(), WM_SYSCOMMAND, IDM_ABOUT, 0);
-    const auto about = [] { return FindWindowW(L"#32770", L"About Orvanelink"); };
+    const SyncRun run;
+    PostMessageW(run.Window(), WM_SYSCOMMAND, IDM_ABOUT, 0);
+    const auto about = [] { return Shown(L"About Orvanelink"); };
     ASSERT_TRUE(WaitUntil([&] { return about() != nullptr; }));
     PostMessageW(about(), WM_COMMAND, IDOK, 0);
     EXPECT_TRUE(WaitUntil([&] { return about() == nullptr; }));
+}
+
+TEST_F(SyncTest, AsksAboutClocksThatDiffer) {
+    device_.Set(L"CLOCK_OFFSET", L"180");
+    const MessageBoxAnswerer answers({IDCANCEL, IDOK});
+    {
+        const SyncRun refused;
+        EXPECT_TRUE(WaitUntil([&] { return refused.HasEnded(); }));
+    }
+    const SyncRun accepted;
+    ASSERT_EQ(answers.Seen().size(), 2U);
+    EXPECT_EQ(answers.Seen()[0].caption, L"Syncronization");
+    EXPECT_FALSE(accepted.HasEnded());
+    accepted.Synchronize();
 }
 
 }  // namespace

@@ -1,7 +1,6 @@
 // Synchronizations that meet with trouble: full disks, refused calls, a device that is gone or lies.
 #include <algorithm>
 
-#include "res/ids.h"
 #include "tests/app/sync_fixture.h"
 
 namespace orvane::testing {
@@ -9,71 +8,70 @@ namespace orvane::testing {
 namespace {
 
 TEST_F(SyncTest, AFullDeviceEndsThePassAndTheNextPressStartsAfresh) {
-    PutOnPc(L"a.qvj", std::string(3000, 'a'), noon_);
-    PutOnPc(L"b.qvj", std::string(20000, 'b'), noon_);
-    PutOnPc(L"c.qvj", std::string(100, 'c'), noon_);
-    PutOnDevice(L"d.txt", "device", noon_);
+    PutOnPc(L"a.qvj", 0, std::string(3000, 'a'));
+    PutOnPc(L"b.qvj", 0, std::string(20000, 'b'));
+    PutOnPc(L"c.qvj", 0, std::string(100, 'c'));
+    PutOnDevice(L"d.txt", 0, "device");
     device_.Set(L"CAPACITY", L"20000");
-    const DialogRun dialog;
-    dialog.Press(IDC_SYNC_START);
-    EXPECT_TRUE(WaitUntil([&] { return dialog.Log().size() == 4; }));
-    EXPECT_EQ(dialog.Log(), (Lines{L"Checking files...", L"[Desktop to Mobile Device] File copy: \"\\a.qvj\"",
-                                   L"[Desktop to Mobile Device] File copy: \"\\b.qvj\"",
-                                   L"[Desktop to Mobile Device] Error: DEVICE DISK FULL."}));
+    const SyncRun run;
+    run.Press(IDC_SYNC_START);
+    EXPECT_TRUE(WaitUntil([&] { return run.Log().size() == 4; }));
+    EXPECT_EQ(run.Log(), (Lines{L"Checking files...", L"[Desktop to Mobile Device] File copy: \"\\a.qvj\"",
+                                L"[Desktop to Mobile Device] File copy: \"\\b.qvj\"",
+                                L"[Desktop to Mobile Device] Error: DEVICE DISK FULL."}));
     Sleep(200);
-    EXPECT_EQ(dialog.Text(IDC_SYNC_STATUS), L"Synchronization in progress...");
-    EXPECT_EQ(dialog.Text(IDC_SYNC_CANCEL_EXIT), L"Cancel");
+    EXPECT_EQ(run.Status(), L"Synchronization in progress...");
+    EXPECT_EQ(run.Button(), L"Cancel");
     EXPECT_EQ(DeviceFiles(), (Lines{L"a.qvj", L"d.txt"}));
     EXPECT_FALSE(Exists(OnPc(L"d.txt")));
 
     device_.Set(L"CAPACITY", L"");
-    dialog.Synchronize();
+    run.Synchronize();
     EXPECT_EQ(DeviceFiles(), (Lines{L"a.qvj", L"b.qvj", L"c.qvj", L"d.txt"}));
     EXPECT_EQ(PcFiles(), DeviceFiles());
 }
 
 TEST_F(SyncTest, AnUnreadableDeviceLeavesTheDialogIdle) {
-    PutOnPc(L"a.qvj", "pc", noon_);
-    const DialogRun dialog;
+    PutOnPc(L"a.qvj", 0, "pc");
+    const SyncRun run;
     for (const auto& [name, value] :
          {std::pair{L"CONNECT_RESULT", L"0x80004005"}, std::pair{L"REFUSE", L"CeFindAllFiles=5"}}) {
         device_.Set(name, value);
         const MessageBoxAnswerer answers({IDOK});
-        dialog.Press(IDC_SYNC_START);
+        run.Press(IDC_SYNC_START);
         ASSERT_EQ(answers.Seen().size(), 1U) << value;
         EXPECT_EQ(answers.Seen()[0].text, L"failed to read from remote device.");
         EXPECT_EQ(answers.Seen()[0].caption, L"Orvanelink");
-        EXPECT_EQ(answers.Seen()[0].style & 0xFFU, static_cast<UINT>(MB_OK));
-        EXPECT_EQ(dialog.Text(IDC_SYNC_STATUS), L"");
-        EXPECT_EQ(dialog.Text(IDC_SYNC_CANCEL_EXIT), L"Exit");
-        EXPECT_TRUE(dialog.Log().empty());
+        EXPECT_EQ(run.Status(), L"");
+        EXPECT_EQ(run.Button(), L"Exit");
+        EXPECT_TRUE(run.Log().empty());
         device_.Set(name, L"");
     }
-    dialog.Synchronize();
+    run.Synchronize();
     EXPECT_TRUE(Exists(OnDevice(L"a.qvj")));
 }
 
 TEST_F(SyncTest, ADeviceThatVanishesCostsNoFile) {
     const std::string whole(10'000, 'w');
     const Lines small = {L"a.qvj", L"b.qvj", L"c.qvj"};
-    const DialogRun dialog;
+    const SyncRun run;
     // At each call of the run that follows the listing.
     bool all_copied = false;
     for (int call = 3; call <= 23; ++call) {
         SCOPED_TRACE(call);
         for (const std::wstring& name : small) {
-            PutOnPc(name, "older", noon_);
-            PutOnDevice(name, "newer", AddSeconds(noon_, 60));
+            PutOnPc(name, 0, "older");
+            PutOnDevice(name, 60, "newer");
         }
-        PutOnPc(L"big.qvj", whole, noon_);
-        PutOnDevice(L"big.txt", whole, noon_);
+        PutOnPc(L"big.qvj", 0, whole);
+        PutOnDevice(L"big.txt", 0, whole);
         DeleteFileW(OnDevice(L"big.qvj").c_str());
         DeleteFileW(OnPc(L"big.txt").c_str());
 
         device_.Set(L"VANISH", std::to_wstring(call));
         const MessageBoxAnswerer answers({IDOK});
-        dialog.Press(IDC_SYNC_START);
-        EXPECT_TRUE(WaitUntil([&] { return dialog.Text(IDC_SYNC_CANCEL_EXIT) == L"Exit"; }));
+        run.Press(IDC_SYNC_START);
+        EXPECT_TRUE(WaitUntil([&] { return run.Button() == L"Exit"; }));
         device_.Set(L"VANISH", L"");
         int missing = 0;
         all_copied = ReadTextFile(OnDevice(L"big.qvj")) == whole && ReadTextFile(OnPc(L"big.txt")) == whole;
@@ -93,7 +91,7 @@ TEST_F(SyncTest, ADeviceThatVanishesCostsNoFile) {
         }
 
         // A copy that was cut off must not be taken for a newer file.
-        dialog.Synchronize();
+        run.Synchronize();
         for (const std::wstring& name : small) {
             EXPECT_EQ(ReadTextFile(OnDevice(name)), "newer");
             EXPECT_EQ(ReadTextFile(OnPc(name)), "newer");
@@ -105,49 +103,10 @@ TEST_F(SyncTest, ADeviceThatVanishesCostsNoFile) {
     EXPECT_TRUE(all_copied);  // The last loss came too late to matter.
 }
 
-TEST_F(SyncTest, AFailedFileDoesNotStopTheNext) {
-    for (const wchar_t* name : {L"a.qvj", L"locked.qvj", L"z.qvj"}) {
-        PutOnPc(name, "pc", noon_);
-    }
-    PutOnDevice(L"b.txt", "device", noon_);
-    PutOnDevice(L"y.txt", "device", noon_);
-    device_.Set(L"REFUSE", L"CeCreateFile@\\Jobs\\a.qvj=5;CeCreateFile@\\Jobs\\b.txt=32");
-    const HANDLE lock =
-        CreateFileW(OnPc(L"locked.qvj").c_str(), GENERIC_READ, 0, nullptr, OPEN_EXISTING, 0, nullptr);
-    const DialogRun dialog;
-    dialog.Synchronize();
-    CloseHandle(lock);
-    EXPECT_EQ(DeviceFiles(), (Lines{L"b.txt", L"y.txt", L"z.qvj"}));
-    EXPECT_EQ(PcFiles(), (Lines{L"a.qvj", L"locked.qvj", L"y.txt", L"z.qvj"}));
-    // The lines of the failed files stay as they are, and no error text reaches the log.
-    EXPECT_EQ(dialog.Log().size(), 7U);
-}
-
-TEST_F(SyncTest, WorksWithinSessionsAndInsideTheJobFolder) {
-    Setting(L"Overwrite_bkp", L"1");
-    PutNewerOnPc(L"a.qvj");
-    PutOnPc(L"job.wkf", "job", noon_);
-    PutOnPc(L"job\\points.dat", "points", noon_);
-    PutOnDevice(L"sub\\b.wkf", "job", noon_);
-    // What is left of these names without the extension leads out of the job folder, or to its whole content.
-    PutOnPc(L"...wkf", "dots", noon_);
-    PutOnPc(L".wkf", "dot", noon_);
-    device_.StartTrace();
-    DialogRun().Synchronize();
-
-    EXPECT_EQ(device_.CallsOf(L"CeRapiInitEx"), device_.CallsOf(L"CeRapiUninit"));
-    for (const TraceLine& call : device_.Trace()) {
-        EXPECT_TRUE(call.function == L"CeRapiUninit" || call.sessions > 0) << call.number;
-        const std::wstring path = call.arguments.empty() ? L"" : call.arguments[0];
-        EXPECT_FALSE(path.ends_with(L"\\..") || path.ends_with(L"\\Jobs\\points.dat")) << call.number;
-    }
-    EXPECT_TRUE(Exists(OnDevice(L"job\\points.dat")));
-}
-
 TEST_F(SyncTest, AMissingPcFolderIsMadeButWithoutOneNothingIsCopied) {
-    PutOnDevice(L"orvane_test.txt", "device", noon_);
+    PutOnDevice(L"orvane_test.txt", 0, "device");
     Setting(L"SyncPath_DT", OnPc(L"not\\there\\"));
-    DialogRun().Synchronize();
+    SyncRun().Synchronize();
     const Lines made = {L"not\\", L"not\\there\\", L"not\\there\\orvane_test.txt"};
     EXPECT_EQ(PcFiles(), made);
     // The root of the current drive must not take its place.
@@ -156,10 +115,10 @@ TEST_F(SyncTest, AMissingPcFolderIsMadeButWithoutOneNothingIsCopied) {
     ASSERT_TRUE(SetCurrentDirectoryW(pc_.Path().c_str()));
     for (const wchar_t* folder : {L"\\", L""}) {
         Setting(L"SyncPath_DT", folder);
-        const DialogRun dialog;
-        dialog.Synchronize();
-        EXPECT_EQ(dialog.BarMaximum(), 1);  // Nothing was listed on the PC.
-        EXPECT_EQ(dialog.Log().size(), 3U);
+        const SyncRun run;
+        run.Synchronize();
+        EXPECT_EQ(run.BarMaximum(), 1);  // Nothing was listed on the PC.
+        EXPECT_EQ(run.Log().size(), 3U);
         EXPECT_FALSE(Exists(L"\\orvane_test.txt"));
         EXPECT_EQ(PcFiles(), made);
     }
@@ -171,9 +130,9 @@ TEST_F(SyncTest, HostileNamesReachNoFileOutsideTheJobFolder) {
                 L"\\Jobs|..\\evil.qvj;\\Jobs|..|folder;\\Jobs|.|folder;\\Jobs|;\\Jobs|c:evil.qvj;"
                 L"\\Jobs|a/evil.qvj;\\Jobs|long.qvj|unterminated;\\Jobs|nul.qvj;\\Jobs|com1.txt;"
                 L"\\Jobs|evil.qvj.;\\Jobs|evil.qvj ;\\Jobs|...wkf");
-    PutOnDevice(L"good.qvj", "device", noon_);
+    PutOnDevice(L"good.qvj", 0, "device");
     device_.StartTrace();
-    DialogRun().Synchronize();
+    SyncRun().Synchronize();
     EXPECT_EQ(PcFiles(), (Lines{L"good.qvj"}));
     // The device would refuse most of these names, so it must not even be asked.
     Lines opened;
@@ -192,7 +151,7 @@ TEST_F(SyncTest, ShortNamesLeadIntoNoOtherFolder) {
     const std::wstring folder = L"a long folder name";
     const Lines kept = {folder + L"\\listed.qvj", L"job\\" + folder + L"\\companion.dat"};
     for (const std::wstring& name : kept) {
-        PutOnPc(name, "kept", noon_);
+        PutOnPc(name, 0, "kept");
     }
     wchar_t path[MAX_PATH] = L"";
     GetShortPathNameW(OnPc(folder).c_str(), path, MAX_PATH);
@@ -200,12 +159,11 @@ TEST_F(SyncTest, ShortNamesLeadIntoNoOtherFolder) {
     if (alias.find(L'~') == std::wstring::npos) {
         GTEST_SKIP() << "no short names to be had here";
     }
-    const FILETIME newer = AddSeconds(noon_, 60);
-    PutOnDevice(alias + L"\\listed.qvj", "device", newer);
-    PutOnDevice(alias + L"\\new.qvj", "device", newer);
-    PutOnDevice(L"job.wkf", "device", newer);
-    PutOnDevice(L"job\\" + alias + L"\\companion.dat", "device", newer);
-    DialogRun().Synchronize();
+    PutOnDevice(alias + L"\\listed.qvj", 60);
+    PutOnDevice(alias + L"\\new.qvj", 60);
+    PutOnDevice(L"job.wkf", 60);
+    PutOnDevice(L"job\\" + alias + L"\\companion.dat", 60);
+    SyncRun().Synchronize();
     for (const std::wstring& name : kept) {
         EXPECT_EQ(ReadTextFile(OnPc(name)), "kept") << name;
     }
@@ -232,15 +190,15 @@ TEST_F(SyncTest, RowsWithPathsTooLongForTheDeviceFailLikeOthers) {
         const std::wstring fits = NameFor(limit, folder, L".qvj");
         const std::wstring too_long = NameFor(limit + 1, folder, L".jpg");
         for (const std::wstring& name : {fits, too_long, std::wstring(L"z.xml")}) {
-            PutOnPc(name, "content", noon_);
+            PutOnPc(name, 0, "content");
         }
         ASSERT_LT(OnPc(too_long).size(), 250U);
-        const DialogRun dialog;
-        dialog.Synchronize();
+        const SyncRun run;
+        run.Synchronize();
         EXPECT_TRUE(Exists(on_device(fits)));
         EXPECT_FALSE(Exists(on_device(too_long)));
         EXPECT_TRUE(Exists(on_device(L"z.xml")));
-        EXPECT_EQ(dialog.Log().size(), 5U);
+        EXPECT_EQ(run.Log().size(), 5U);
         for (const std::wstring& name : {fits, too_long, std::wstring(L"z.xml")}) {
             DeleteFileW(OnPc(name).c_str());
             DeleteFileW(on_device(name).c_str());
@@ -254,25 +212,10 @@ TEST_F(SyncTest, RowsWithPathsTooLongForThePcFailLikeOthers) {
     for (const std::wstring& name : {fits, too_long, std::wstring(L"z.xml")}) {
         WriteTextFile(L"\\\\?\\" + OnDevice(name), "content", noon_);
     }
-    const DialogRun dialog;
-    dialog.Synchronize();
+    const SyncRun run;
+    run.Synchronize();
     EXPECT_EQ(PcFiles(), (Lines{fits, L"z.xml"}));
-    EXPECT_EQ(dialog.Log().size(), 5U);
-}
-
-TEST_F(SyncTest, AsksAboutClocksThatDiffer) {
-    device_.Set(L"CLOCK_OFFSET", L"180");
-    const MessageBoxAnswerer answers({IDCANCEL, IDOK});
-    {
-        const DialogRun refused;
-        EXPECT_TRUE(WaitUntil([&] { return refused.HasEnded(); }));
-    }
-    const DialogRun accepted;
-    EXPECT_TRUE(WaitUntil([&] { return answers.Seen().size() == 2; }));
-    EXPECT_EQ(answers.Seen()[0].caption, L"Syncronization");
-    Sleep(100);
-    EXPECT_FALSE(accepted.HasEnded());
-    accepted.Synchronize();
+    EXPECT_EQ(run.Log().size(), 5U);
 }
 
 }  // namespace

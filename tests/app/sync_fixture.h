@@ -1,82 +1,98 @@
-// The real synchronization dialog on a thread of its own, over a PC folder and the folder device.
+// The real synchronization dialog over a PC folder and the folder device.
 #pragma once
 
-#include <gtest/gtest.h>
 #include <windows.h>
 
-#include <atomic>
-#include <string>
-#include <thread>
-#include <vector>
+#include <commctrl.h>
 
-#include "tests/support/dialog_script.h"
-#include "tests/support/folder_device.h"
+#include <algorithm>
+#include <string>
+
+#include "app/application.h"
+#include "app/sync_dialog.h"
+#include "jobs/file_types.h"
+#include "platform/resources.h"
+#include "res/ids.h"
+#include "settings/settings_store.h"
+#include "tests/support/dialog_thread.h"
+#include "tests/support/job_folders.h"
 #include "tests/support/message_boxes.h"
-#include "tests/support/scratch_registry.h"
-#include "tests/support/temp_folder.h"
 
 namespace orvane::testing {
 
-using Lines = std::vector<std::wstring>;
-
-// One run of the dialog, from its construction to its end. The test drives it by messages from its own
-// thread, as a user would.
-class DialogRun {
+class SyncRun : public DialogThread<CWendlowDlg> {
   public:
-    // Starts the dialog; returns when it, or the file view in its place, is shown or it has ended.
-    DialogRun();
-    // Closes the dialog if that has not happened, and waits for its workers.
-    ~DialogRun();
-    DialogRun(const DialogRun&) = delete;
-    DialogRun& operator=(const DialogRun&) = delete;
+    SyncRun() { WaitUntilOpen(); }
 
-    HWND Window() const { return window_; }
-    HWND Item(int id) const { return GetDlgItem(window_, id); }
-    bool HasEnded() const { return ended_; }
-    void Press(int id) const { SendMessageW(Item(id), BM_CLICK, 0, 0); }
-    std::wstring Text(int id) const { return ItemText(window_, id); }
-    Lines Log() const;
-    // How often the log tells that a run is complete.
-    std::ptrdiff_t Completions() const;
-    bool IsBarVisible() const;
-    LRESULT BarMaximum() const;
-
+    Lines Log() const {
+        Lines lines(static_cast<std::size_t>(SendMessageW(Item(IDC_SYNC_LOG), LB_GETCOUNT, 0, 0)));
+        for (std::size_t line = 0; line < lines.size(); ++line) {
+            wchar_t text[512] = {};
+            SendMessageW(Item(IDC_SYNC_LOG), LB_GETTEXT, line, reinterpret_cast<LPARAM>(text));
+            lines[line] = text;
+        }
+        return lines;
+    }
+    // How often the log holds the line.
+    std::ptrdiff_t Logged(const wchar_t* line) const {
+        const Lines log = Log();
+        return std::count(log.begin(), log.end(), line);
+    }
+    std::wstring Status() const { return Text(IDC_SYNC_STATUS); }
+    std::wstring Button() const { return Text(IDC_SYNC_CANCEL_EXIT); }
+    bool IsBarVisible() const { return IsWindowVisible(Item(IDC_SYNC_PROGRESS)) != FALSE; }
+    LRESULT BarMaximum() const { return SendMessageW(Item(IDC_SYNC_PROGRESS), PBM_GETRANGE, FALSE, 0); }
+    bool HasWorker() const {
+        bool runs = false;
+        Call([&](CWendlowDlg& dialog) { runs = dialog.HasRunningWorker(); });
+        return runs;
+    }
     // Presses "Synchronize" and waits until the run is complete. A press that is ignored fails the test.
-    void Synchronize() const;
+    void Synchronize() const {
+        const std::ptrdiff_t before = Logged(kComplete);
+        Press(IDC_SYNC_START);
+        ASSERT_TRUE(WaitUntil([this] { return Status() == kComplete && !IsBarVisible(); }));
+        ASSERT_EQ(Logged(kComplete), before + 1);
+    }
 
   private:
-    void Run();
-
-    HWND window_ = nullptr;
-    std::atomic<bool> ended_{false};
-    std::thread thread_;
+    static constexpr const wchar_t* kComplete = L"Synchronization complete.";
 };
 
-// The window of the file view; null when there is none.
-HWND FileView();
-
-// Job folders on both sides and settings that let every type take part and overwrite older files.
-class SyncTest : public ::testing::Test {
+// Settings that let every type take part and overwrite older files.
+class SyncTest : public JobFolders {
   protected:
-    void SetUp() override;
+    SyncTest() {
+        RegisterDialogClass();
+        Setting(L"SyncPath_DT", pc_.Path() + L"\\");
+        Setting(L"SyncPath_CE", L"\\Jobs\\");
+        for (const FileType& type : kFileTypes) {
+            Setting(ResourceString(type.setting), L"1");
+        }
+        Setting(L"Overwrite_old_files", L"1");
+    }
 
     // Sets a value of the settings for the dialogs that start from now on.
-    static void Setting(const std::wstring& name, const std::wstring& text);
-    std::wstring OnPc(const std::wstring& name) const { return pc_ / name; }
-    std::wstring OnDevice(const std::wstring& name) const { return device_.Root() + L"\\Jobs\\" + name; }
-    void PutOnPc(const std::wstring& name, std::string_view content, const FILETIME& time) const;
-    void PutOnDevice(const std::wstring& name, std::string_view content, const FILETIME& time) const;
+    static void Setting(const std::wstring& name, const std::wstring& text) {
+        EXPECT_TRUE(RegWriteString(HKEY_CURRENT_USER, L"Software\\Veltrano\\CE Devices", name, text));
+    }
     // "newer" on the PC and, a minute older, "older" on the device.
-    void PutNewerOnPc(const std::wstring& name) const;
+    void PutNewerOnPc(const std::wstring& name) const {
+        PutOnPc(name, 60, "newer");
+        PutOnDevice(name, 0, "older");
+    }
     // Creates files new_0.qvj, new_1.qvj, ... on the PC.
-    void PutManyOnPc(int count) const;
-    Lines PcFiles() const { return ListTree(pc_.Path()); }
-    Lines DeviceFiles() const { return ListTree(device_.PcPath(L"\\Jobs")); }
-
-    ScratchRegistry registry_;
-    FolderDevice device_;
-    TempFolder pc_;
-    const FILETIME noon_ = UtcTime(2024, 3, 1, 12);
+    void PutManyOnPc(int count) const {
+        for (int i = 0; i < count; ++i) {
+            PutOnPc(L"new_" + std::to_wstring(i) + L".qvj", 0, "content");
+        }
+    }
 };
+
+// A dialog of that caption that can be seen; null when there is none.
+inline HWND Shown(const wchar_t* caption) {
+    HWND window = FindWindowW(L"#32770", caption);
+    return window != nullptr && IsWindowVisible(window) ? window : nullptr;
+}
 
 }  // namespace orvane::testing

@@ -64,7 +64,7 @@ TEST_F(ClockCheckOnDevice, AsksWhenTheClocksDiffer) {
             ASSERT_EQ(seen.size(), c.answer == 0 ? 0U : 1U);
             for (const testing::SeenMessageBox& box : seen) {
                 EXPECT_EQ(box.caption, L"Syncronization");
-                EXPECT_EQ(box.style, 0x141U);
+                EXPECT_EQ(box.default_button, IDCANCEL);
                 const FILETIME device_now = testing::AddSeconds(now, _wtoi(c.offset));
                 EXPECT_EQ(box.text,
                           FormatDateDifferenceMessage(ToLocalCalendar(now), ToLocalCalendar(device_now)));

@@ -29,45 +29,17 @@ BOOL CALLBACK FindBox(HWND window, LPARAM found) {
     return FALSE;
 }
 
-UINT ButtonsOf(HWND box) {
-    if (GetDlgItem(box, IDYES) != nullptr) {
-        return MB_YESNO;
-    }
-    // A box with nothing but OK may use Cancel's id for it.
-    return GetDlgItem(box, IDOK) != nullptr && GetDlgItem(box, IDCANCEL) != nullptr ? MB_OKCANCEL : MB_OK;
-}
-
-// The system's icons of message boxes have consecutive numbers in the order of their styles.
-UINT StyleOfIcon(HICON icon) {
-    for (UINT kind = 1; kind <= 4; ++kind) {
-        if (icon == LoadIconW(nullptr, MAKEINTRESOURCEW(32512U + kind))) {
-            return kind * MB_ICONERROR;
-        }
-    }
-    return 0;
-}
-
 SeenMessageBox Describe(HWND box) {
-    SeenMessageBox seen;
-    seen.caption = ui::WindowText(box);
-    seen.owner = GetWindow(box, GW_OWNER);
-    seen.style = ButtonsOf(box);
-    if ((GetWindowLongPtrW(box, GWL_EXSTYLE) & WS_EX_TOPMOST) != 0) {
-        seen.style |= MB_SYSTEMMODAL;
-    }
-    UINT button_count = 0;
+    SeenMessageBox seen{.caption = ui::WindowText(box), .owner = GetWindow(box, GW_OWNER)};
     for (HWND child = GetWindow(box, GW_CHILD); child != nullptr; child = GetWindow(child, GW_HWNDNEXT)) {
         const LONG_PTR style = GetWindowLongPtrW(child, GWL_STYLE);
         if ((style & WS_VISIBLE) == 0) {
             continue;
         }
-        if ((SendMessageW(child, WM_GETDLGCODE, 0, 0) & DLGC_BUTTON) != 0) {
-            seen.style |= (style & BS_TYPEMASK) == BS_DEFPUSHBUTTON ? button_count * MB_DEFBUTTON2 : 0;
-            ++button_count;
-        } else if ((style & SS_TYPEMASK) == SS_ICON) {
-            seen.style |= StyleOfIcon(reinterpret_cast<HICON>(SendMessageW(child, STM_GETICON, 0, 0)));
-        } else {
+        if ((SendMessageW(child, WM_GETDLGCODE, 0, 0) & DLGC_BUTTON) == 0) {
             seen.text += ui::WindowText(child);
+        } else if ((style & BS_TYPEMASK) == BS_DEFPUSHBUTTON) {
+            seen.default_button = GetDlgCtrlID(child);
         }
     }
     return seen;
@@ -101,16 +73,15 @@ void MessageBoxAnswerer::Run() {
 
 void MessageBoxAnswerer::Answer(HWND box) {
     const SeenMessageBox seen = Describe(box);
-    WORD button = LOWORD(SendMessageW(box, DM_GETDEFID, 0, 0));
+    int button = seen.default_button;
     {
         const std::lock_guard lock(mutex_);
         if (seen_.size() < answers_.size() && GetDlgItem(box, answers_[seen_.size()]) != nullptr) {
-            button = static_cast<WORD>(answers_[seen_.size()]);
+            button = answers_[seen_.size()];
         }
         seen_.push_back(seen);
     }
-    PostMessageW(box, WM_COMMAND, MAKEWPARAM(button, BN_CLICKED),
-                 reinterpret_cast<LPARAM>(GetDlgItem(box, button)));
+    Press(box, button);
     // Until the box has taken the answer it would be found again.
     while (IsWindow(box) && IsWindowVisible(box) && !stop_) {
         Sleep(10);

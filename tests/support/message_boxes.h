@@ -11,12 +11,11 @@
 
 namespace orvane::testing {
 
-// What a message box looked like. `style` is told from its buttons (OK, OK and Cancel, Yes and No),
-// its icon, its default button and whether it is system-modal, as MessageBoxW takes it.
+// What a message box looked like.
 struct SeenMessageBox {
     std::wstring caption;
-    std::wstring text;
-    UINT style = 0;
+    std::wstring text{};
+    int default_button = 0;  // What Enter presses.
     HWND owner = nullptr;
 };
 

@@ -78,7 +78,7 @@ TEST_F(TransferTest, ReplacesOnlyWhatTheUserAllows) {
     run.Press(IDC_TRANSFER_SYNCHRONIZE);
 
     ASSERT_EQ(boxes.Seen().size(), 2U);
-    EXPECT_EQ(boxes.Seen()[0].style, 0x1121U);
+    EXPECT_EQ(boxes.Seen()[0].default_button, IDCANCEL);
     EXPECT_EQ(boxes.Seen()[0].text,
               L"The file:\n\\Jobs\\kept.qvj [ DEVICE ] \n\nWill be replaced by the file:\n" +
                   OnPc(L"kept.qvj") + L" [ PC ]");
