@@ -36,6 +36,7 @@ show_dialogs() {
   open "$main_window" 1010 "Options" options
   open "Options" 4 "Select Directory" folder_chooser
   close "Select Directory" 2
+  mkdir -p "$demo/device/Archive/"{01..80}  # So many that reading them can be seen.
   open "Options" 3 "#1026" loading
   drive wait "Mobile Device Browse"
   picture device_browser "Mobile Device Browse"
@@ -43,6 +44,7 @@ show_dialogs() {
   drive wait "Dialog"
   picture properties "Dialog"
   close "Dialog" 1
+  rm -r "$demo/device/Archive"
   close "Mobile Device Browse" 2
   close "Options" 2
 
