@@ -21,6 +21,9 @@ mkdir -p "$(dirname "$WINEPREFIX")"
     # What an interrupted attempt has left is no prefix.
     rm -rf "$WINEPREFIX"
     "$wine" wineboot -i
+    # This Wine looks for fonts in the prefix and in those of the system, not in its own folder, where the
+    # pictures of the caption's buttons are.
+    ln -s /usr/share/wine/fonts/marlett.ttf "$WINEPREFIX/drive_c/windows/Fonts/"
     # Without a window manager a managed window that closes can wait for two seconds.
     "$wine" reg add 'HKCU\Software\Wine\X11 Driver' /v Managed /d N /f
     /usr/lib/wine/wineserver -w
