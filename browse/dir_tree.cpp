@@ -4,6 +4,7 @@
 
 #include <array>
 #include <cwchar>
+#include <utility>
 
 #include "browse/file_property_dialog.h"
 #include "platform/resources.h"
@@ -11,16 +12,21 @@
 #include "qelutils/xlate.h"
 #include "res/ids.h"
 #include "ui/dialog.h"
+#include "ui/screen.h"
+#include "ui/waiting.h"
 
 namespace orvane {
 
 namespace {
 
-constexpr int kPicturePixels = 16;
+constexpr int kPicturePixels = 16;  // At 100 %.
 // How many characters a filter entry may have.
 constexpr std::size_t kMaxPatternChars = 15;
 // Time for the wait dialog to be seen before the thread is busy.
 constexpr DWORD kPauseBeforeReadMs = 500;
+// WM_DPICHANGED_AFTERPARENT: sent to a child when its top window has come to a screen of another density;
+// Windows 10.
+constexpr UINT kDpiChangedAfterParent = 0x02E3;
 
 constexpr DWORD kUsualStyle = WS_CHILD | WS_VISIBLE | WS_BORDER | WS_VSCROLL | WS_TABSTOP | TVS_HASBUTTONS |
                               TVS_HASLINES | TVS_LINESATROOT | TVS_DISABLEDRAGDROP | TVS_SHOWSELALWAYS;
@@ -70,7 +76,7 @@ UCeDirTree::~UCeDirTree() {
 }
 
 bool UCeDirTree::Create(DWORD style, DWORD ex_style, const RECT& place, HWND parent, int id) {
-    // The text is not shown: screen readers name the tree by it.
+    // The text is not shown: some screen readers name the tree by it, others by the hidden label before it.
     HWND window = CreateWindowExW(
         ex_style, WC_TREEVIEWW, Xlate(L"Mobile Device Browse").c_str(), style != 0 ? style : kUsualStyle,
         place.left, place.top, place.right - place.left, place.bottom - place.top, parent,
@@ -83,14 +89,16 @@ bool UCeDirTree::Create(DWORD style, DWORD ex_style, const RECT& place, HWND par
 }
 
 void UCeDirTree::LoadPictures() {
-    pictures_.Reset(ImageList_Create(kPicturePixels, kPicturePixels, ILC_COLOR32, 0, 4));
+    const int pixels = ui::Scaled(kPicturePixels, ui::DpiOf(Handle()));
+    UniqueImageList pictures(ImageList_Create(pixels, pixels, ILC_COLOR32, 0, 4));
     static constexpr std::array<int, 4> kIcons = {IDI_TREE_UNUSED, IDI_TREE_FOLDER_OPEN,
                                                   IDI_TREE_FOLDER_CLOSED, IDI_TREE_FILE};
     for (const int id : kIcons) {
-        const UniqueIcon icon = LoadOwnedIcon(id, kPicturePixels);
-        ImageList_AddIcon(pictures_.Get(), icon.Get());
+        const UniqueIcon icon = LoadOwnedIcon(id, pixels);
+        ImageList_AddIcon(pictures.Get(), icon.Get());
     }
-    TreeView_SetImageList(Handle(), pictures_.Get(), TVSIL_STATE);
+    TreeView_SetImageList(Handle(), pictures.Get(), TVSIL_STATE);
+    pictures_ = std::move(pictures);
 }
 
 bool UCeDirTree::AddFilter(const std::wstring& pattern) {
@@ -107,6 +115,8 @@ bool UCeDirTree::Reload() {
     ShowWaitDialog();
     Sleep(kPauseBeforeReadMs);
     reader_.ReadDeviceTree(L"\\", filters_, root_, Handle());
+    // Impatient clicks are not to start the next read, nor to press what comes up now.
+    ui::DropPendingInput();
     return false;
 }
 
@@ -216,6 +226,15 @@ std::optional<LRESULT> UCeDirTree::OnMessage(UINT message, WPARAM wparam, LPARAM
     switch (message) {
         case kDeviceTreeLoadedMessage:
             OnLoaded();
+            return 0;
+        case kDpiChangedAfterParent:
+            LoadPictures();
+            return std::nullopt;
+        case WM_KEYDOWN:
+            if (wparam != VK_F5) {
+                return std::nullopt;
+            }
+            OnRefresh();
             return 0;
         case WM_RBUTTONDOWN:
             SetCapture(Handle());

@@ -26,6 +26,8 @@ enum class TreePicture : unsigned { kOpenFolder = 1, kClosedFolder = 2, kFile = 
 // window's thread, behind a wait dialog; expanding an item never asks the device. Folders are shown in bold
 // type, which is also how the tree tells them from files.
 //
+// F5 refreshes; Shift+F10 and the menu key open the context menu that a right click opens.
+//
 // Items point into the nodes that the last read left, which the object owns: the items go before the nodes
 // do. The window belongs to its parent; the object may end before it or after it.
 class UCeDirTree : public ui::Control {
@@ -42,9 +44,9 @@ class UCeDirTree : public ui::Control {
     // entry has at most 15 characters: a longer one is refused with false. Without any entry all files show.
     bool AddFilter(const std::wstring& pattern);
 
-    // Empties the tree and reads the device, which takes a second or more and handles no posted messages.
-    // The tree is filled, or the failure told to the user, when the message loop runs next. Returns whether
-    // a thread of its own is reading, which is never so.
+    // Empties the tree and reads the device, which takes a second or more, handles no posted messages and
+    // drops the clicks and keys that came meanwhile. The tree is filled, or the failure told to the user,
+    // when the message loop runs next. Returns whether a thread of its own is reading, which is never so.
     bool Reload();
 
     // The selected item's path, with "\" at its end for a folder. No value when nothing is selected, or when

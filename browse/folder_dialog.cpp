@@ -39,6 +39,11 @@ class CurrentDirectoryKeeper {
     std::array<wchar_t, kPathBufferChars> directory_{};
 };
 
+bool IsFolder(const std::wstring& path) {
+    const DWORD attributes = GetFileAttributesW(path.c_str());
+    return attributes != INVALID_FILE_ATTRIBUTES && (attributes & FILE_ATTRIBUTE_DIRECTORY) != 0;
+}
+
 const wchar_t* NullIfEmpty(const std::wstring& text) {
     return text.empty() ? nullptr : text.c_str();
 }
@@ -151,6 +156,13 @@ void CFolderDialog::OnFirstPaint(HWND window) {
 
 void CFolderDialog::OnOk(HWND window) {
     ui::DataExchange(window, true).Text(IDC_FOLDER_DIRECTORY, chosen_directory_);
+    // The dialog would open a folder of the file's name in place of accepting the name. The current directory
+    // is the folder that it shows.
+    std::wstring file_name = ui::WindowText(GetDlgItem(window, IDC_FOLDER_FILE_NAME));
+    while (IsFolder(file_name)) {
+        file_name += L'_';
+    }
+    SetDlgItemTextW(window, IDC_FOLDER_FILE_NAME, file_name.c_str());
 }
 
 }  // namespace orvane

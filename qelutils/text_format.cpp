@@ -29,7 +29,8 @@ std::optional<Placeholder> ReadPlaceholder(std::wstring_view text, size_t argume
 
 }  // namespace
 
-std::wstring qel_safefmt_impl(std::wstring_view pattern, std::initializer_list<std::wstring_view> arguments) {
+CQelStringT<wchar_t> qel_safefmt_impl(std::wstring_view pattern,
+                                      std::initializer_list<std::wstring_view> arguments) {
     std::wstring text;
     while (!pattern.empty()) {
         const size_t literal = pattern.find(L'{');
@@ -53,7 +54,7 @@ std::wstring qel_safefmt_impl(std::wstring_view pattern, std::initializer_list<s
 
 namespace qel_formats {
 
-std::wstring IntToString(int number) {
+qel_text::CQelStringT<wchar_t> IntToString(int number) {
     return std::to_wstring(number);
 }
 

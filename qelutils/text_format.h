@@ -11,11 +11,15 @@
 
 namespace qel_text {
 
+// The string that the text helpers give.
+template <class Character>
+using CQelStringT = std::basic_string<Character>;
+
 // printf for numbers, for texts that are no sentences and so are never translated (dates, times). The
 // pattern is a literal of the caller and must fit the numbers; it takes no texts, so that no pattern can
 // make it follow a pointer. The result has at most 255 characters: a longer one comes back empty.
 template <std::integral... Numbers>
-std::wstring Format(const wchar_t* pattern, Numbers... numbers) {
+CQelStringT<wchar_t> Format(const wchar_t* pattern, Numbers... numbers) {
     std::array<wchar_t, 256> buffer{};
     const int length = std::swprintf(buffer.data(), buffer.size(), pattern, numbers...);
     // Not every runtime answers a text that does not fit with a negative number.
@@ -31,7 +35,8 @@ namespace detail {
 // the end) and a number without an argument ("{0}", "{9}", however many digits), so that a faulty
 // translation shows where it is faulty and reads nothing but the given arguments. The text of an argument
 // is never looked at for placeholders.
-std::wstring qel_safefmt_impl(std::wstring_view pattern, std::initializer_list<std::wstring_view> arguments);
+CQelStringT<wchar_t> qel_safefmt_impl(std::wstring_view pattern,
+                                      std::initializer_list<std::wstring_view> arguments);
 
 }  // namespace detail
 }  // namespace qel_text
@@ -39,6 +44,6 @@ std::wstring qel_safefmt_impl(std::wstring_view pattern, std::initializer_list<s
 namespace qel_formats {
 
 // The number in decimal, with a leading "-" if it is negative and without grouping.
-std::wstring IntToString(int number);
+qel_text::CQelStringT<wchar_t> IntToString(int number);
 
 }  // namespace qel_formats

@@ -170,19 +170,26 @@ TEST_F(BrowseDialog, FileNameFieldKeepsTheNameOnlyInItsMode) {
     }
 }
 
-TEST_F(BrowseDialog, RefreshReadsAgainAndShowsItsMessage) {
+TEST_F(BrowseDialog, RefreshReadsAgainOnceAndShowsItsMessage) {
     Run(kNoFiles, L"\\CF Card", [this](HWND dialog) {
         HWND tree = TreeOf(dialog);
+        SendMessageW(dialog, WM_NEXTDLGCTL, reinterpret_cast<WPARAM>(tree), TRUE);
         TreeView_SelectItem(tree, TreeView_GetNextSibling(tree, TreeView_GetRoot(tree)));
         testing::MakeFolder(device_.PcPath(L"\\Temp\\new"));
-        const testing::MessageBoxAnswerer boxes;
-        PostMessageW(TreeOf(dialog), WM_COMMAND, IDM_TREE_REFRESH, 0);
-        AwaitRead(dialog);
-        EXPECT_TRUE(WaitUntil([&] { return boxes.Seen().size() == 1 && IsWindowEnabled(dialog); }));
-        EXPECT_EQ(boxes.Seen()[0].text, kRefreshed);
-        EXPECT_EQ(boxes.Seen()[0].caption, L"Orvanelink");
-        EXPECT_EQ(Items(dialog).back(), L" 1*new");
-        EXPECT_EQ(ItemText(dialog, IDC_BROWSE_FOLDER), L"\\Temp\\");
+        for (const wchar_t* folder : {L"\\Temp\\", L"\\CF Card\\"}) {
+            const testing::MessageBoxAnswerer boxes;
+            PostMessageW(tree, WM_KEYDOWN, VK_F5, 0);
+            EXPECT_TRUE(WaitUntil([dialog] { return IsReading(dialog); }));
+            PostMessageW(tree, WM_KEYDOWN, VK_F5, 0);  // Impatiently.
+            EXPECT_TRUE(WaitUntil([&] { return boxes.Seen().size() == 1 && IsWindowEnabled(dialog); }));
+            EXPECT_EQ(boxes.Seen()[0].text, kRefreshed);
+            EXPECT_EQ(boxes.Seen()[0].caption, L"Orvanelink");
+            EXPECT_FALSE(IsReading(dialog));
+            // Where the folder has gone, the tree that has the focus begins anew.
+            EXPECT_EQ(ItemText(dialog, IDC_BROWSE_FOLDER), folder);
+            EXPECT_EQ(Items(dialog).back(), folder[1] == L'T' ? L" 1*new" : L"  1*b");
+            std::filesystem::remove_all(device_.PcPath(L"\\Temp"));
+        }
     });
 }
 

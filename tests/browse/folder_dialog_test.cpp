@@ -40,6 +40,19 @@ TEST(FolderDialog, AnswersTheFolderThatWasOpened) {
     EXPECT_EQ(std::filesystem::current_path(), current);
 }
 
+TEST(FolderDialog, AFolderOfTheFilesNameIsOneLikeAnyOther) {
+    const testing::TempFolder folder;
+    testing::MakeFolder(folder / L"Dummy\\Dummy");
+    for (const std::wstring& start : {folder.Path(), folder / L"Dummy", folder / L"Dummy\\Dummy"}) {
+        CFolderDialog dialog(start, start, 1, L"", nullptr);
+        EXPECT_EQ(testing::RunWithScript([&] { return dialog.DoModal(); },
+                                         [](HWND window) { testing::Press(window, IDOK); }),
+                  IDOK);
+        EXPECT_TRUE(EqualIgnoringCase(dialog.Chosen().folder, start)) << dialog.Chosen().folder;
+        EXPECT_TRUE(EqualIgnoringCase(dialog.Chosen().directory, start)) << dialog.Chosen().directory;
+    }
+}
+
 TEST(FolderDialog, PutsTheCurrentDirectoryBackAfterCancel) {
     const testing::TempFolder folder;
     const auto current = std::filesystem::current_path();

@@ -15,7 +15,11 @@ const Flags kAll = Named({L"Sync_all_files"});
 const Flags kOverwrite = Named({L"Overwrite_old_files"});
 const Flags kWarn = Named({L"Overwrite_warn"});
 const Flags kDependent = Named({L"Overwrite_warn", L"Overwrite_bkp"});
-const Flags kTypes = Those([](std::size_t i) { return i < kFileTypes.size(); });
+const Flags kTypes = Those([](std::size_t i) { return i < kTypeCount; });
+
+int BoxOf(std::size_t i) {
+    return i < kTypeCount ? kFileTypes[i].box : kFlagSettings[i - kTypeCount].box;
+}
 
 Flags Ticked(HWND dialog) {
     return Those([&](std::size_t i) { return IsDlgButtonChecked(dialog, BoxOf(i)) == BST_CHECKED; });
@@ -83,47 +87,32 @@ class OptionsDialog : public ::testing::Test {
 };
 
 TEST_F(OptionsDialog, TheBoxOfATypeDecidesOnAllFiles) {
-    // After a click: the boxes that are unticked, and what becomes of "All files." when it was on or off.
-    enum AllFiles { kCleared, kTicked, kLeft };
-    const struct {
-        const wchar_t* clicked;
-        std::vector<const wchar_t*> unticked;
-        AllFiles all;
-    } cases[] = {
-        {L".qvj", {}, kTicked},
-        {L".qvj", {L".qvj"}, kCleared},
-        {L".qvj", {L".bmp"}, kLeft},
-        {L".jpg", {}, kTicked},
-        {L".jpg", {L".jpg"}, kCleared},
-        {L".jpg", {L".bmp"}, kLeft},
-        {L".jpg", {L".txt"}, kLeft},
-        {L".bmp", {}, kLeft},
-        {L".bmp", {L".bmp"}, kLeft},
-        {L".img", {L".bmp"}, kTicked},
-        {L".img", {L".img"}, kCleared},
-        {L".img", {L".qvj"}, kLeft},
-        {L".wkf", {L".bmp"}, kTicked},
-        {L".wkf", {L".bmp", L".txt"}, kLeft},
-        {L".txt", {L".bmp", L".txt"}, kTicked},
-        {L".txt", {L".wkf"}, kCleared},
-        {L".txt", {L".tp3"}, kLeft},
+    // What is clicked, what is unticked after that, and whether "All files." is off ("0"), on ("1") or as it
+    // was.
+    const wchar_t* const cases[][3] = {
+        {L"qvj", L"", L"1"},        {L"qvj", L"qvj", L"0"}, {L"qvj", L"bmp", L""},  {L"jpg", L"", L"1"},
+        {L"jpg", L"txt", L""},      {L"bmp", L"", L""},     {L"bmp", L"bmp", L""},  {L"img", L"bmp", L"1"},
+        {L"img", L"img", L"0"},     {L"img", L"qvj", L""},  {L"wkf", L"bmp", L"1"}, {L"wkf", L"bmp txt", L""},
+        {L"txt", L"bmp txt", L"1"}, {L"txt", L"wkf", L"0"}, {L"txt", L"tp3", L""},
     };
-    const auto row = [](std::wstring_view extension) {
-        return static_cast<std::size_t>(std::ranges::find(kFileTypes, extension, &FileType::extension) -
-                                        kFileTypes.begin());
+    const auto types = [](std::wstring_view names) {
+        return Those([&](std::size_t i) {
+            return i < kTypeCount && names.find(kFileTypes[i].extension.substr(1)) != std::wstring_view::npos;
+        });
     };
     COptionsDlg dialog(block_, owner_);
     ASSERT_TRUE(dialog.Create());
-    for (const auto& c : cases) {
-        for (const Flags& all_before : {kAll, Flags()}) {
-            Flags types = kTypes;
-            for (const wchar_t* unticked : c.unticked) {
-                types.reset(row(unticked));
+    for (const auto& [clicked, unticked, all_files] : cases) {
+        for (const Flags& before : {kAll, Flags()}) {
+            const Flags ticked = kTypes & ~types(unticked);
+            Tick(dialog.Handle(), (ticked ^ types(clicked)) | before);
+            for (std::size_t i = 0; i < kTypeCount; ++i) {
+                if (types(clicked)[i]) {
+                    Click(dialog.Handle(), BoxOf(i));
+                }
             }
-            Tick(dialog.Handle(), (types | all_before).flip(row(c.clicked)));
-            Click(dialog.Handle(), BoxOf(row(c.clicked)));
-            const Flags all = c.all == kTicked ? kAll : c.all == kLeft ? all_before : Flags();
-            EXPECT_EQ(Ticked(dialog.Handle()), types | all) << (&c - cases);
+            const Flags all = *all_files == L'\0' ? before : *all_files == L'1' ? kAll : Flags();
+            EXPECT_EQ(Ticked(dialog.Handle()), ticked | all) << clicked << L" " << unticked;
         }
     }
 }
@@ -185,6 +174,22 @@ TEST_F(OptionsDialog, OkStoresAndCancelDoesNot) {
         EXPECT_EQ(Stored(L"SyncPath_DT"), ok ? L"C:\\typed\\" : L"C:\\stored\\");
         EXPECT_EQ(Stored(L"SyncPath_CE"), ok ? stored : L"\\stored\\");
     }
+}
+
+TEST_F(OptionsDialog, FieldsTakeWhatCanBeFoundAgain) {
+    Set({});
+    Run([&](HWND dialog) {
+        for (const int field : {IDC_OPTIONS_PC_FOLDER, IDC_OPTIONS_DEVICE_FOLDER}) {
+            SetDlgItemTextW(dialog, field, L"\\");
+            SendDlgItemMessageW(dialog, field, EM_SETSEL, 1, 1);
+            for (int i = 0; i < 600; ++i) {
+                SendDlgItemMessageW(dialog, field, WM_CHAR, L'x', 1);
+            }
+        }
+        Press(dialog, IDOK);
+    });
+    EXPECT_EQ(Stored(L"SyncPath_DT"), L"\\" + std::wstring(507, L'x') + L"\\");
+    EXPECT_EQ(Stored(L"SyncPath_CE"), L"\\" + std::wstring(257, L'x') + L"\\");
 }
 
 TEST_F(OptionsDialog, AutoStartFollowsTheBoxAfterOkOnly) {
