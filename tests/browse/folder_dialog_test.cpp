@@ -8,7 +8,6 @@
 #include "res/ids.h"
 #include "tests/support/dialog_script.h"
 #include "tests/support/temp_folder.h"
-#include "ui/dialog.h"
 
 namespace orvane {
 
@@ -53,20 +52,26 @@ TEST(FolderDialog, AFolderOfTheFilesNameIsOneLikeAnyOther) {
     }
 }
 
-TEST(FolderDialog, PutsTheCurrentDirectoryBackAfterCancel) {
-    const testing::TempFolder folder;
-    const auto current = std::filesystem::current_path();
-    for (const std::wstring& start : {folder.Path(), folder / L"missing"}) {
-        CFolderDialog dialog(start, start, 1, L"Jobs", nullptr);
-        const INT_PTR result =
-            testing::RunWithScript([&] { return dialog.DoModal(); },
-                                   [&](HWND window) {
-                                       EXPECT_EQ(ui::WindowText(window), L"Jobs");
-                                       EXPECT_EQ(ItemText(window, IDC_FOLDER_DIRECTORY), start);
-                                       testing::Press(window, IDCANCEL);
-                                   });
-        EXPECT_EQ(result, IDCANCEL);
-        EXPECT_EQ(std::filesystem::current_path(), current) << start;
+TEST(ChosenFolder, IsTheFieldUnlessThatIsAbbreviated) {
+    const struct {
+        const wchar_t* field;
+        const wchar_t* file_path;
+        std::size_t name_offset;
+        const wchar_t* folder;
+        const wchar_t* directory;
+    } cases[] = {
+        {L"c:\\data\\jobs\\\\", L"C:\\Data\\Jobs\\Dummy", 13, L"c:\\data\\jobs", L"C:\\Data\\Jobs"},
+        {L"c:\\...\\JOBS", L"C:\\Data\\Jobs\\Dummy", 13, L"C:\\Data\\Jobs", L"C:\\Data\\Jobs"},
+        // From where the directory's last component begins, whatever the field has there.
+        {L"c:\\...\\new", L"C:\\Dat\\Jobs\\Dummy", 12, L"C:\\Dat\\Jobs\\new", L"C:\\Dat\\Jobs"},
+        {L"c:\\...", L"C:\\Data\\Jobs\\Dummy", 13, L"C:\\Data\\Jobs", L"C:\\Data\\Jobs"},
+        {L"...", L"C:\\Dummy", 3, L"C:", L"C:"},
+        {L"...", L"", 0, L"", L""},
+    };
+    for (const auto& c : cases) {
+        const ChosenFolder chosen = ChosenFolderOf(c.field, c.file_path, c.name_offset);
+        EXPECT_EQ(chosen.folder, c.folder) << c.field;
+        EXPECT_EQ(chosen.directory, c.directory) << c.field;
     }
 }
 
