@@ -12,6 +12,7 @@
 #include "res/ids.h"
 #include "settings/options_dialog.h"
 #include "transfer/copy_progress.h"
+#include "transfer/job_folders.h"
 #include "transfer/selected_copy.h"
 #include "ui/screen.h"
 #include "ui/waiting.h"
@@ -87,14 +88,36 @@ bool CCeFileTransfDlg::OnInitDialog() {
     if (!IsWindowVisible(Parent())) {
         ShowInTaskBar();
     }
-    ShowWindow(Handle(), SW_SHOW);
-    UpdateWindow(Handle());
-    if (!date_check_done_ && CheckDeviceDateTimeForFileView(Handle(), device_tree_.StopEvent()) == 0) {
-        End(0);
-        return true;
+    const Busy busy(*this);
+    ShowPainted();
+    if (!date_check_done_) {
+        const ui::WaitCursor wait;
+        if (CheckDeviceDateTimeForFileView(Handle(), device_tree_.StopEvent()) == 0) {
+            End(0);
+            return true;
+        }
     }
     OnRefresh();
     return true;
+}
+
+void CCeFileTransfDlg::OnCancel() {
+    if (!busy_) {
+        Dialog::OnCancel();
+    }
+}
+
+bool CCeFileTransfDlg::OnKey(UINT key) {
+    const bool with_control = GetKeyState(VK_CONTROL) < 0;
+    if (key == VK_F5 && !with_control) {
+        OnClicked(IDC_TRANSFER_REFRESH);
+        return true;
+    }
+    if (key == 'A' && with_control) {
+        OnTickPage();
+        return true;
+    }
+    return false;
 }
 
 // The dialog is the program's only window, and has the button and icon that its owner would have.
@@ -140,6 +163,9 @@ void CCeFileTransfDlg::ShowFolders() {
 }
 
 bool CCeFileTransfDlg::OnClicked(int id) {
+    if (busy_) {
+        return true;
+    }
     switch (id) {
         case IDC_TRANSFER_REFRESH:
             UpdateData(true);
@@ -189,12 +215,19 @@ std::optional<LRESULT> CCeFileTransfDlg::OnMessage(UINT message, WPARAM wparam, 
             }
             OnListingReady(lparam == 0 ? kDevicePage : kPcPage);
             return 0;
+        case WM_SYSCOLORCHANGE:
+            // Top-level windows alone are told.
+            for (HWND control : {tabs_.Handle(), pages_[0].list.Handle(), pages_[1].list.Handle()}) {
+                SendMessageW(control, message, wparam, lparam);
+            }
+            return std::nullopt;
         default:
             return std::nullopt;
     }
 }
 
 void CCeFileTransfDlg::OnRefresh() {
+    const Busy busy(*this);
     const ui::WaitCursor wait;
     for (Page& page : pages_) {
         page.candidates.clear();
@@ -215,26 +248,29 @@ void CCeFileTransfDlg::OnRefresh() {
     UpdateData(false);
 }
 
-// False when the device was not read (the lists stay empty then) or a build was stopped.
+// False when the lists stay empty: a folder was not read, which the user has been told, or the user wanted to
+// leave and the dialog ends.
 bool CCeFileTransfDlg::ReadListings() {
     Comparison comparison = {.types = settings_.types, .overwrite_old_files = settings_.overwrite_old_files};
-    {
-        FileNode device_root;
-        if (!device_tree_.ReadDeviceTree(WithTrailingBackslash(settings_.sync_path_ce), {}, device_root,
-                                         Handle())) {
-            ui::ShowMessageBox(Handle(), Xlate(L"Failed to read from remote device."));
-            return false;
+    std::vector<sFileDate> from_pc;
+    std::vector<sFileDate> from_device;
+    const auto build = [&] {
+        BuildCandidates(comparison, comparison.pc, comparison.device, from_pc);
+        BuildCandidates(comparison, comparison.device, comparison.pc, from_device);
+    };
+    const ui::Waited waited =
+        ReadJobFolders(Handle(), settings_, device_tree_, XlateKey(L"Failed to read from remote device."),
+                       comparison.pc, comparison.device, build);
+    ShowFolders();
+    if (waited != ui::Waited::kDone) {
+        if (waited == ui::Waited::kClosed) {
+            Dialog::OnCancel();
         }
-        comparison.device = JobTable(device_root);
-    }
-    comparison.pc = ListPcJobFolder(settings_.sync_path_dt);
-    if (!BuildCandidates(comparison, comparison.pc, comparison.device, ready_listing_.emplace())) {
         return false;
     }
+    ready_listing_ = std::move(from_pc);
     SendMessageW(Handle(), kListingReady, 0, 1);
-    if (!BuildCandidates(comparison, comparison.device, comparison.pc, ready_listing_.emplace())) {
-        return false;
-    }
+    ready_listing_ = std::move(from_device);
     SendMessageW(Handle(), kListingReady, 0, 0);
     return true;
 }
@@ -274,7 +310,7 @@ void CCeFileTransfDlg::OnPageChanged(int number) {
 
 void CCeFileTransfDlg::OnListDoubleClick(HWND list) {
     Page* page = PageOfList(list);
-    if (page == nullptr) {
+    if (page == nullptr || busy_) {
         return;
     }
     UpdateData(true);
@@ -309,6 +345,16 @@ void CCeFileTransfDlg::OnSelectAll(Page& page) {
     page.list.TickAll(page.all_ticked);
 }
 
+// As a press on the box "Select all file(s)" of the page that is shown.
+void CCeFileTransfDlg::OnTickPage() {
+    Page& page = pages_[static_cast<std::size_t>(current_page_)];
+    if (!busy_ && page.list.ItemCount() > 0) {
+        page.all_ticked = true;
+        UpdateData(false);
+        OnSelectAll(page);
+    }
+}
+
 void CCeFileTransfDlg::OnSettings() {
     SyncSettings changed = settings_;
     if (!RunOptions(changed)) {
@@ -335,6 +381,7 @@ void CCeFileTransfDlg::OnCopySelected() {
     }
     UpdateData(true);
     {
+        const Busy busy(*this);
         const ui::WaitCursor wait;
         CopyFiles(current_page_, Names(pages_[static_cast<std::size_t>(current_page_)], true),
                   /*more_follows=*/false);
@@ -344,6 +391,7 @@ void CCeFileTransfDlg::OnCopySelected() {
 }
 
 void CCeFileTransfDlg::OnCopyAll(bool ticked_only) {
+    const Busy busy(*this);
     const ui::WaitCursor wait;
     const std::vector<std::wstring> from_pc = Names(pages_[kPcPage], ticked_only);
     const std::vector<std::wstring> from_device = Names(pages_[kDevicePage], ticked_only);

@@ -4,6 +4,7 @@
 #include <array>
 #include <optional>
 #include <string>
+#include <utility>
 #include <vector>
 
 #include "controls/page_tab.h"
@@ -22,8 +23,9 @@ inline constexpr UINT kListingReady = WM_USER + 1;
 
 // The "File Transfer - Copy From" dialog: on one page the PC's files that would be copied to the device, on
 // the other the device's files that would be copied to the PC. The user ticks files and has them copied,
-// which happens on the dialog's thread; only the progress window has a thread of its own. A modal dialog on
-// the user-interface thread. It ends with 0 at once when the user declines the clock check.
+// which happens on the dialog's thread; only the progress window has a thread of its own, and the job folders
+// are read on a worker. F5 refreshes, Ctrl+A ticks all entries of the page. A modal dialog on the
+// user-interface thread. It ends with 0 at once when the user declines the clock check.
 class CCeFileTransfDlg : public ui::Dialog {
   public:
     // `date_check_done` leaves the clock check out.
@@ -34,6 +36,8 @@ class CCeFileTransfDlg : public ui::Dialog {
 
   protected:
     bool OnInitDialog() override;
+    void OnCancel() override;
+    bool OnKey(UINT key) override;
     bool OnClicked(int id) override;
     std::optional<LRESULT> OnMessage(UINT message, WPARAM wparam, LPARAM lparam) override;
     void DoDataExchange(ui::DataExchange& exchange) override;
@@ -64,12 +68,28 @@ class CCeFileTransfDlg : public ui::Dialog {
     void SetUpTabs();
     void ShowFolders();
 
+    // One thing at a time: while it lives the user's commands are dropped, those included that reach the
+    // dialog as sent messages.
+    class Busy {
+      public:
+        explicit Busy(CCeFileTransfDlg& dialog)
+            : dialog_(dialog), before_(std::exchange(dialog.busy_, true)) {}
+        ~Busy() { dialog_.busy_ = before_; }
+        Busy(const Busy&) = delete;
+        Busy& operator=(const Busy&) = delete;
+
+      private:
+        CCeFileTransfDlg& dialog_;
+        const bool before_;
+    };
+
     // Commands.
     void OnRefresh();
     void OnSettings();
     void OnCopySelected();
     void OnCopyAll(bool ticked_only);
     void OnSelectAll(Page& page);
+    void OnTickPage();
 
     // Messages.
     void OnPageChanged(int number);
@@ -89,6 +109,7 @@ class CCeFileTransfDlg : public ui::Dialog {
     SyncSettings settings_;
     const bool date_check_done_;
     DeviceTreeReader device_tree_;  // Its stop event serves all operations on the device.
+    bool busy_ = false;
     int current_page_ = -1;
     CSTabCtrl tabs_;
     std::array<Page, 2> pages_;

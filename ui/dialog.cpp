@@ -1,5 +1,7 @@
 #include "ui/dialog.h"
 
+#include <utility>
+
 #include "platform/resources.h"
 #include "qelutils/xlate.h"
 #include "res/ids.h"
@@ -69,9 +71,43 @@ Dialog::~Dialog() {
     Destroy();
 }
 
+// The system's loop of a modal dialog offers each message to the thread's hook first; dialogs above this one
+// share it.
 INT_PTR Dialog::DoModal() {
-    return DialogBoxParamW(ResourceModule(), MAKEINTRESOURCEW(template_id_), parent_, Thunk,
-                           reinterpret_cast<LPARAM>(this));
+    thread_local HHOOK key_hook = nullptr;
+    const bool is_first = key_hook == nullptr;
+    if (is_first) {
+        key_hook = SetWindowsHookExW(WH_MSGFILTER, KeyHook, nullptr, GetCurrentThreadId());
+    }
+    const INT_PTR result = DialogBoxParamW(ResourceModule(), MAKEINTRESOURCEW(template_id_), parent_, Thunk,
+                                           reinterpret_cast<LPARAM>(this));
+    if (is_first) {
+        UnhookWindowsHookEx(std::exchange(key_hook, nullptr));
+    }
+    return result;
+}
+
+LRESULT CALLBACK Dialog::KeyHook(int code, WPARAM wparam, LPARAM lparam) noexcept {
+    const MSG& message = *reinterpret_cast<const MSG*>(lparam);
+    if (code == MSGF_DIALOGBOX && message.message == WM_KEYDOWN) {
+        HWND root = GetAncestor(message.hwnd, GA_ROOT);
+        auto* dialog = reinterpret_cast<Dialog*>(GetWindowLongPtrW(root, DWLP_USER));
+        // A message box is a dialog, too, but none of this layer.
+        const bool is_ours =
+            GetWindowLongPtrW(root, DWLP_DLGPROC) == reinterpret_cast<LONG_PTR>(Dialog::Thunk);
+        if (is_ours && dialog != nullptr && dialog->DispatchKey(static_cast<UINT>(message.wParam))) {
+            return TRUE;
+        }
+    }
+    return CallNextHookEx(nullptr, code, wparam, lparam);
+}
+
+bool Dialog::DispatchKey(UINT key) noexcept {
+    try {
+        return OnKey(key);
+    } catch (...) {
+        return true;  // As in Dispatch.
+    }
 }
 
 bool Dialog::Create() {

@@ -69,6 +69,8 @@ class Dialog {
     // with IDOK, that of OnCancel ends with IDCANCEL.
     virtual void OnOK();
     virtual void OnCancel();
+    // A key pressed anywhere in the dialog, before the control with the focus gets it. True: it is used up.
+    virtual bool OnKey(UINT /*key*/) { return false; }
     // A click on a button. False: it is none of the dialog's own; OK and Cancel get their handlers then.
     virtual bool OnClicked(int /*id*/) { return false; }
     // Any other message, other commands included. No value means default processing, which is all that the
@@ -82,6 +84,8 @@ class Dialog {
     static INT_PTR CALLBACK Thunk(HWND window, UINT message, WPARAM wparam, LPARAM lparam) noexcept;
     std::optional<LRESULT> Dispatch(UINT message, WPARAM wparam, LPARAM lparam) noexcept;
     std::optional<LRESULT> HandleMessage(UINT message, WPARAM wparam, LPARAM lparam);
+    static LRESULT CALLBACK KeyHook(int code, WPARAM wparam, LPARAM lparam) noexcept;
+    bool DispatchKey(UINT key) noexcept;
     bool Initialise();
     bool HandleClick(int id);
 
