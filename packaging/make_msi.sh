@@ -46,12 +46,16 @@ wixl --arch x64 --output "$installer" -D Version="$version" -D ProductCode="$(co
   -D Icon="$(realpath --relative-to=. "$here/../res/orvanelink.ico")" \
   -D Kilobytes="$(du -sk --apparent-size . | cut -f1)" "$here/orvanelink.wxs" "$work/contents.wxs"
 
+# edit TABLE EXPRESSION: what wixl cannot say, by sed in the table's lines.
+edit() {
+  msiinfo export "$installer" "$1" | sed -E "$2" >"$work/$1.idt"
+  msibuild "$installer" -i "$work/$1.idt"
+}
+# Another program of the same version is replaced too: both ends of the range count (256 and 512).
+edit Upgrade 's/\t256\t\tOLDERVERSION/\t768\t\tOLDERVERSION/'
 # The auto-start entry is written on demand and for all users only, and stays unless the action that looks at
 # it removes it: 64-bit (256), permanent (16), with a registry value as its key (4).
-msibuild "$installer" \
-  -q "UPDATE \`Component\` SET \`Condition\`='ALLUSERS=1 AND AUTOSTART=1', \`Attributes\`=276 WHERE \`Component\`='AutoStart'" \
-  -q "UPDATE \`Property\` SET \`Value\`='OLDERVERSION;NEWERVERSION;AUTOSTART' WHERE \`Property\`='SecureCustomProperties'"
+edit Component 's/^(AutoStart\t[^\t]*\t[^\t]*)\t[0-9]*\t\t/\1\t276\tALLUSERS=1 AND AUTOSTART=1\t/'
+edit Property 's/^(SecureCustomProperties\t[^\r]*)/\1;AUTOSTART/'
 time=$(TZ=UTC date -d "@$SOURCE_DATE_EPOCH" '+%Y\/%m\/%d %H:%M:%S')
-msiinfo export "$installer" _SummaryInformation |
-  sed "s/^9\t[^\r]*/9\t{$(code package)}/; s/^\(12\|13\)\t[^\r]*/\1\t$time/" >"$work/_SummaryInformation.idt"
-msibuild "$installer" -i "$work/_SummaryInformation.idt"
+edit _SummaryInformation "s/^9\t[^\r]*/9\t{$(code package)}/; s/^(12|13)\t[^\r]*/\1\t$time/"

@@ -10,11 +10,15 @@ packed=$trial/orvanelink-$version
 installer=$root/build/package/orvanelink-$version-x64.msi
 archive=$root/build/package/orvanelink-$version-x64.zip
 
-# The next version's program is another file.
+# Another program of this version, and the next version with a third.
+for other in same next; do
+  cp -rp "$packed" "$trial/$other"
+  echo $other >>"$trial/$other/orvanelink.exe"
+done
+same_installer=$trial/same.msi
+"$root/packaging/make_msi.sh" "$trial/same" "$version" "$same_installer"
 next=${version%.*}.$((${version##*.} + 1))
-next_installer=$trial/orvanelink-$next-x64.msi
-cp -rp "$packed" "$trial/next"
-echo >>"$trial/next/orvanelink.exe"
+next_installer=$trial/next.msi
 "$root/packaging/make_msi.sh" "$trial/next" "$next" "$next_installer"
 
 done_with() { echo "  $*"; }
@@ -70,6 +74,11 @@ diff -r "$packed" "$folder" || fail "other files were installed than are packed"
 grep -q '/Start Menu/.*/Orvanelink.lnk' <<<"$(drive_files)" || fail "the Start menu has no entry"
 DLL_FOLDER=$folder/folder_device FOLDER_DEVICE_ROOT='J:\device' synchronize "$folder/orvanelink.exe"
 done_with "installed for one user; the installed program synchronizes"
+
+msi /i "$same_installer" || fail "another program of the same version does not install"
+[ "$(installed)" = "$version" ] || fail "after it the versions are $(installed)"
+diff -r "$trial/same" "$folder" || fail "another program of the same version was not installed"
+done_with "another program of the same version takes its place"
 
 # Wine hands pages to this browser; without Wine's own they are of no type.
 wine reg add 'HKCR\.html' /ve /d htmlfile /f >>"$trial/wine.log"
