@@ -4,13 +4,12 @@
 //
 //   window_driver wait CAPTION               until the window is shown and takes input
 //   window_driver gone CAPTION               until there is no such window
-//   window_driver click CAPTION ID           presses a button, without waiting for what it does
-//   window_driver wait-text CAPTION ID TEXT  until the control's text is TEXT
-//   window_driver wait-disabled CAPTION ID   until the control takes no input
-//   window_driver rect CAPTION               prints where the window is, as WIDTHxHEIGHT+LEFT+TOP
-//   window_driver list CAPTION ID            prints the lines of a list box, in UTF-8
-//   window_driver tab CAPTION ID INDEX       turns to a page of a tab control
-//   window_driver command CAPTION ID NUMBER  sends the control a menu command; ID 0: the window, a command of
+//   window_driver click CAPTION ID           presses a button once it takes input, without waiting for what
+//   it does window_driver wait-text CAPTION ID TEXT  until the control's text is TEXT window_driver
+//   wait-disabled CAPTION ID   until the control takes no input window_driver rect CAPTION prints where the
+//   window is, as WIDTHxHEIGHT+LEFT+TOP window_driver list CAPTION ID            prints the lines of a list
+//   box, in UTF-8 window_driver tab CAPTION ID INDEX       turns to a page of a tab control window_driver
+//   command CAPTION ID NUMBER  sends the control a menu command; ID 0: the window, a command of
 //                                            its system menu
 //
 // The windows are looked for on the desktop that the environment variable WINDOW_DESKTOP names, by default
@@ -125,7 +124,8 @@ bool RunOnControl(const std::wstring& verb, HWND dialog, int id, const std::wstr
         return false;
     }
     if (verb == L"click") {
-        return PostMessageW(control, BM_CLICK, 0, 0) != FALSE;
+        return WaitUntil([&] { return IsWindowEnabled(control) != FALSE; }) &&
+               PostMessageW(control, BM_CLICK, 0, 0) != FALSE;
     }
     if (verb == L"wait-text") {
         return WaitUntil([&] { return TextOf(control) == text; });

@@ -233,10 +233,9 @@ void CCeFileTransfDlg::OnRefresh() {
         page.candidates.clear();
         page.list.SetItems(page.candidates);
     }
-    if (!ReadListings()) {
-        // No list was delivered; what the buttons show must still go with the empty lists.
-        OnPageChanged(current_page_);
-    }
+    // What the buttons show goes with the empty lists until others are delivered.
+    OnPageChanged(current_page_);
+    ReadListings();
     for (const int id : {IDC_TRANSFER_REFRESH, IDC_TRANSFER_SETTINGS, IDC_TRANSFER_CLOSE}) {
         EnableItem(id, true);
     }
@@ -248,9 +247,9 @@ void CCeFileTransfDlg::OnRefresh() {
     UpdateData(false);
 }
 
-// False when the lists stay empty: a folder was not read, which the user has been told, or the user wanted to
-// leave and the dialog ends.
-bool CCeFileTransfDlg::ReadListings() {
+// The lists stay empty when a folder was not read, which the user has been told, or when the user wanted to
+// leave: the dialog ends then.
+void CCeFileTransfDlg::ReadListings() {
     Comparison comparison = {.types = settings_.types, .overwrite_old_files = settings_.overwrite_old_files};
     std::vector<sFileDate> from_pc;
     std::vector<sFileDate> from_device;
@@ -266,13 +265,12 @@ bool CCeFileTransfDlg::ReadListings() {
         if (waited == ui::Waited::kClosed) {
             Dialog::OnCancel();
         }
-        return false;
+        return;
     }
     ready_listing_ = std::move(from_pc);
     SendMessageW(Handle(), kListingReady, 0, 1);
     ready_listing_ = std::move(from_device);
     SendMessageW(Handle(), kListingReady, 0, 0);
-    return true;
 }
 
 void CCeFileTransfDlg::OnListingReady(int number) {

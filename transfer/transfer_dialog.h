@@ -97,7 +97,7 @@ class CCeFileTransfDlg : public ui::Dialog {
     void OnListItemsDrawn(HWND list);
     void OnListingReady(int number);
 
-    bool ReadListings();
+    void ReadListings();
     std::vector<std::wstring> Names(const Page& page, bool ticked_only) const;
     bool CopyFiles(int number, const std::vector<std::wstring>& names, bool more_follows);
     void FinishCopy(Page& page);
