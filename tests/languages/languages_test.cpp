@@ -115,7 +115,7 @@ HWND CreateScaled(UINT id, int percent) {
     const auto* bytes = static_cast<const char*>(LockResource(LoadResource(nullptr, resource)));
     std::vector<DWORD> content(SizeofResource(nullptr, resource) / sizeof(DWORD) + 1);
     std::memcpy(content.data(), bytes, SizeofResource(nullptr, resource));
-    content[3] &= ~WS_VISIBLE;  // The style of an extended template.
+    content[3] &= ~DWORD{WS_VISIBLE};  // The style of an extended template.
     WORD* item = reinterpret_cast<WORD*>(content.data()) + 13;
     for (int name = 0; name < 3; ++name) {  // Menu, class and caption: a number behind 0xFFFF, or a string.
         item += *item == 0xFFFF ? 2 : wcslen(reinterpret_cast<wchar_t*>(item)) + 1;
