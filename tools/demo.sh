@@ -95,6 +95,7 @@ file_view_demo() {
   "$root/tools/settings.sh" Start_File_View 1
   start_program 10
   drive wait "$file_view"
+  drive wait-disabled "$file_view" 1044  # Both sides are listed.
   drive click "$file_view" 1040
   screenshot file_view_pc
   drive tab "$file_view" 1046 1

@@ -58,6 +58,7 @@ show_dialogs() {
   # What is left goes over in the manual view.
   drive click "$main_window" 1011
   drive wait "$file_view"
+  drive wait-disabled "$file_view" 1044  # Both sides are listed.
   drive click "$file_view" 1040
   picture file_view_pc "$file_view"
   drive tab "$file_view" 1046 1
