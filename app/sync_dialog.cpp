@@ -13,6 +13,7 @@
 #include "res/ids.h"
 #include "selection/job_table.h"
 #include "settings/options_dialog.h"
+#include "transfer/job_folders.h"
 #include "transfer/transfer_dialog.h"
 #include "ui/waiting.h"
 
@@ -211,36 +212,16 @@ void CWendlowDlg::OnSynchronize() {
 
 // False when there is nothing to start from. The user knows why, or wanted to leave: the dialog ends then.
 bool CWendlowDlg::ReadJobFolders(JobTable& pc, JobTable& device) {
-    bool device_read = false;
-    const auto read = [&] {
-        if (settings_.sync_path_ce.empty()) {
-            settings_.sync_path_ce = FindDeviceJobFolder();  // The device may have come since the start.
-        }
-        FileNode device_root;
-        // An empty folder would be the device's whole storage.
-        device_read = !settings_.sync_path_ce.empty() &&
-                      device_tree_.ReadDeviceTree(settings_.sync_path_ce, {}, device_root, Handle());
-        if (device_read) {
-            device = JobTable(device_root);
-            pc = ListPcJobFolder(settings_.sync_path_dt);
-        }
-    };
+    const ui::WaitCursor wait;
     reads_job_folders_ = true;
-    ui::Waited waited = ui::Waited::kFailed;
-    {
-        const ui::WaitCursor wait;
-        waited = ui::RunAndPaint(read, device_tree_.StopEvent(), DeviceTreeReader::kStackBytes);
-    }
+    const ui::Waited waited =
+        orvane::ReadJobFolders(Handle(), settings_, device_tree_,
+                               XlateKey(L"failed to read from remote device."), pc, device, [] {});
     reads_job_folders_ = false;
     if (waited == ui::Waited::kClosed) {
         Dialog::OnCancel();
-        return false;
     }
-    if (waited == ui::Waited::kFailed || !device_read) {
-        ui::ShowMessageBox(Handle(), Xlate(L"failed to read from remote device."));
-        return false;
-    }
-    return true;
+    return waited == ui::Waited::kDone;
 }
 
 void CWendlowDlg::FillTask(JobTable pc, JobTable device) {

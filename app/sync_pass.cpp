@@ -6,11 +6,12 @@
 #include <utility>
 
 #include "app/sync_task.h"
-#include "device/file_copy.h"
-#include "platform/handles.h"
+#include "copy/entry_copy.h"
+#include "copy/target_folder.h"
+#include "copy/target_path.h"
+#include "device/connect.h"
 #include "qelutils/xlate.h"
 #include "selection/copy_rules.h"
-#include "selection/entry_copy.h"
 #include "ui/dialog.h"
 
 namespace orvane {
@@ -21,7 +22,7 @@ namespace {
 struct PassKind {
     SyncSide SyncTask::*source;
     SyncSide SyncTask::*target;
-    bool to_device;
+    Direction direction;
     const wchar_t* source_label;
     const wchar_t* target_label;
     std::wstring (*copy_line)();  // The log line of a copy, up to the name; ends with the opening quote.
@@ -34,7 +35,7 @@ struct PassKind {
 // program's texts are.
 constexpr PassKind kToDevice = {&SyncTask::pc,
                                 &SyncTask::device,
-                                true,
+                                Direction::kPcToDevice,
                                 L" [PC]",
                                 L" [Device]",
                                 [] { return std::wstring(L"[Desktop to Mobile Device] File copy: \""); },
@@ -43,7 +44,7 @@ constexpr PassKind kToDevice = {&SyncTask::pc,
                                 kTaskCompleteDt2Ce};
 constexpr PassKind kToPc = {&SyncTask::device,
                             &SyncTask::pc,
-                            false,
+                            Direction::kDeviceToPc,
                             L" [Device]",
                             L" [PC]",
                             [] { return Xlate(L"[Mobile Device to Desktop] File copy: \""); },
@@ -54,17 +55,22 @@ constexpr PassKind kToPc = {&SyncTask::device,
 // One run of a pass, on the worker's thread.
 class SyncPass {
   public:
-    SyncPass(SyncTask& task, const PassKind& kind)
+    SyncPass(SyncTask& task, const PassKind& kind, const CancelEvent& cancel)
         : task_(task),
           kind_(kind),
           source_(task.*kind.source),
           target_(task.*kind.target),
-          index_(target_.listing.table, target_.listing.rows),
-          // A PC listing that broke off lacks files that are there: none of them is replaced without a
-          // backup.
-          make_backup_(task.overwrite_bkp || (!kind.to_device && !target_.listing.complete)) {
+          folders_{task.pc.folder, task.device.folder},
+          context_{kind.direction, Purpose::kPass, Session::kOwn,
+                   task.overwrite_bkp ? OldFile::kKept : OldFile::kReplaced, cancel},
+          companions_{task.overwrite_old_files, task.types},
+          index_(target_.listing.table, target_.listing.rows) {
         if (task_.overwrite_warn) {
-            ask_replace_ = [this](std::wstring_view name) { return AskReplace(name); };
+            // Asked is only about files that would be copied. (A folder has no time by which it could be
+            // newer.) All others come to the gates behind the question, which pass over them.
+            ask_replace_ = [this](std::wstring_view name) {
+                return !PassesExtensionFilter(name, task_.types) || AskReplace(name);
+            };
         }
     }
 
@@ -81,43 +87,49 @@ class SyncPass {
   private:
     // kComplete when the pass goes on.
     PassEnd HandleRow(std::size_t row) {
-        const std::wstring_view name = source_.listing.table.names[row];
-        const FILETIME& write_time = source_.listing.table.write_times[row];
-        if (ShouldSkipCopy(task_.overwrite_old_files, write_time, name, index_, ask_replace_)) {
+        const FileTable& table = source_.listing.table;
+        const std::wstring_view name = table.names[row];
+        if (target_.listing.IsUnknown(name) ||
+            ShouldSkipCopy(task_.overwrite_old_files, table.write_times[row], name, index_, ask_replace_)) {
             Report(kIncrementProgress);
             return PassEnd::kComplete;
         }
-        if (source_.listing.table.kinds[row] != kKindFile || !PassesExtensionFilter(name, task_.types)) {
+        if (table.kinds[row] != kKindFile || !PassesExtensionFilter(name, task_.types)) {
             return PassEnd::kComplete;
         }
-        return CopyRow(name, write_time);
+        return CopyRow(row);
     }
 
-    PassEnd CopyRow(std::wstring_view name, const FILETIME& write_time) {
-        const EntryCopy entry = {task_.pc.folder, task_.device.folder, name, kind_.to_device};
-        const HANDLE cancel = task_.copy_cancel_event;
-        const bool can_copy = CanCopyEntry(entry, kind_.to_device && make_backup_);
-        if (can_copy) {
-            EnsureTargetFolder(entry, cancel, /*nested=*/false);
-        }
-        Report(kAddInfoDisplay, CopyLine(name));
-        const DeviceResult result = can_copy ? CopyFile(entry, write_time, cancel) : DeviceResult::kFailed;
+    PassEnd CopyRow(std::size_t row) {
+        const std::wstring_view name = source_.listing.table.names[row];
+        const FileToCopy file = {folders_ + name, source_.listing.table.write_times[row],
+                                 source_.listing.table.sizes[row], TargetTime(name)};
+        const bool keeps_backup = file.target_time && context_.old_file == OldFile::kKept;
+        // What fails here must not reach an operation on the device.
+        const bool can_copy = CanCopy(file.paths, name, kind_.direction, keeps_backup);
+        const bool has_folder = can_copy && EnsureTargetFolder(file.paths, context_);
+        Report(kAddInfoDisplay, kind_.copy_line() + std::wstring(name) + L'"');
+        const DeviceResult result =
+            has_folder ? CopyEntry(file, name, context_, companions_).result : DeviceResult::kFailed;
         if (result == DeviceResult::kDiskFull) {
             Report(kAddInfoDisplay, Xlate(kind_.disk_full));
             return PassEnd::kDiskFull;
         }
         if (result != DeviceResult::kDone) {
             Report(kErrorInfoDisplay, Xlate(kind_.failure));
+            if (can_copy && !task_.cancelled && !IsDeviceThere(context_.cancel) && !task_.cancelled) {
+                Report(kAddInfoDisplay, Xlate(L"Communication Error."));
+                return PassEnd::kConnectionLost;
+            }
         }
-        CopyCompanionFolder(entry, cancel, /*nested=*/false);
         return PassEnd::kComplete;
     }
 
-    DeviceResult CopyFile(const EntryCopy& entry, const FILETIME& write_time, HANDLE cancel) const {
-        return kind_.to_device ? CopyPcFileToDeviceWithBackup(write_time, entry.PcPath(), entry.DevicePath(),
-                                                              cancel, make_backup_)
-                               : CopyDeviceFileToPcWithBackup(write_time, entry.DevicePath(), entry.PcPath(),
-                                                              cancel, false, make_backup_);
+    // The write time of the file that the copy would replace, as it was listed; nothing where none was.
+    std::optional<FILETIME> TargetTime(std::wstring_view name) const {
+        const std::int32_t row = index_.Find(name);
+        return row < 0 ? std::nullopt
+                       : std::optional(target_.listing.table.write_times[static_cast<std::size_t>(row)]);
     }
 
     // The question has no owner window: it stands above all windows, whatever the dialog does meanwhile.
@@ -129,10 +141,6 @@ class SyncPass {
                                   Xlate(L"Synchronization - Warning")) == IDOK;
     }
 
-    std::wstring CopyLine(std::wstring_view name) const {
-        return kind_.copy_line() + std::wstring(name) + L'"';
-    }
-
     void Report(std::wstring_view command, std::wstring info_text = {}) {
         task_.reports.Push({.command = command, .info_text = std::move(info_text)});
     }
@@ -141,8 +149,10 @@ class SyncPass {
     const PassKind& kind_;
     const SyncSide& source_;
     const SyncSide& target_;
-    FileIndex index_;
-    const bool make_backup_;
+    const EntryPaths folders_;
+    const CopyContext context_;
+    const CompanionRules companions_;
+    const FileIndex index_;
     std::function<bool(std::wstring_view)> ask_replace_;  // Empty when the user wants no warning.
 };
 
@@ -150,8 +160,9 @@ void RunPass(void* task, const PassKind& kind) noexcept {
     auto& sync_task = *static_cast<SyncTask*>(task);
     PassEnd end = PassEnd::kOutOfMemory;
     try {
-        sync_task.copy_cancel_event = NewManualResetEvent().Release();
-        end = SyncPass(sync_task, kind).Run();
+        const HANDLE event = NewManualResetEvent().Release();
+        sync_task.copy_cancel_event = event;
+        end = SyncPass(sync_task, kind, event).Run();
     } catch (...) {
         // Out of memory: what was copied stays.
     }

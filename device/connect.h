@@ -4,6 +4,7 @@
 #include <windows.h>
 
 #include "device/remote_api.h"
+#include "platform/cancel_event.h"
 
 namespace orvane {
 
@@ -17,13 +18,17 @@ namespace orvane {
 // `cancel_event` is no event.
 HRESULT ConnectDevice(HANDLE cancel_event);
 
+// Whose session an operation works in: one of its own, or the one that its caller holds on the same thread.
+enum class Session { kOwn, kCallers };
+
 // A session for the length of a scope: opened by ConnectDevice, closed at the end on the same thread if it
-// stands. Code that cannot go on without a device tests it first. A nested operation works in the session
-// that its caller holds on this thread: then nothing is opened and nothing closed here.
+// stands. Code that cannot go on without a device tests it first. With kCallers nothing is opened and nothing
+// closed here.
 class DeviceSession {
   public:
-    explicit DeviceSession(HANDLE cancel_event, bool nested = false)
-        : owned_(!nested && SUCCEEDED(ConnectDevice(cancel_event))), stands_(nested || owned_) {}
+    explicit DeviceSession(const CancelEvent& cancel, Session session = Session::kOwn)
+        : owned_(session == Session::kOwn && SUCCEEDED(ConnectDevice(cancel.Handle()))),
+          stands_(session == Session::kCallers || owned_) {}
     DeviceSession(const DeviceSession&) = delete;
     DeviceSession& operator=(const DeviceSession&) = delete;
     ~DeviceSession() { Close(); }
@@ -44,5 +49,11 @@ class DeviceSession {
     bool owned_;
     bool stands_;
 };
+
+// Whether a session can be opened now. What failed in a session that stands may so be told from a connection
+// that is gone. Takes as long as ConnectDevice.
+inline bool IsDeviceThere(const CancelEvent& cancel) {
+    return static_cast<bool>(DeviceSession(cancel));
+}
 
 }  // namespace orvane

@@ -5,6 +5,7 @@
 #include <memory>
 #include <optional>
 
+#include "device/connect.h"
 #include "device/remote_api.h"
 #include "platform/handles.h"
 #include "platform/paths.h"
@@ -90,17 +91,17 @@ void CopyRecord(const rapi::FindData& record, std::wstring_view name, FileNode& 
 class Lister {
   public:
     Lister(const std::wstring& folder, std::span<const std::wstring> extensions, bool recursive,
-           HANDLE cancel_event)
+           const CancelEvent& cancel)
         : path_(WithTrailingBackslash(folder)),
           extensions_(extensions),
           recursive_(recursive),
-          cancel_event_(cancel_event) {}
+          cancel_(cancel) {}
 
     // Lists the folder that path_ names into `node`.
     DeviceResult List(FileNode& node) {
         node.child_count = 0;
         node.children.reset();
-        if (IsSignalled(cancel_event_)) {
+        if (cancel_.IsSignalled()) {
             return DeviceResult::kListingCancelled;
         }
         FoundRecords found;
@@ -144,8 +145,12 @@ class Lister {
     DeviceResult ListSubFolder(FileNode& folder) {
         const std::size_t length = path_.size();
         path_.append(folder.name).append(1, L'\\');
-        const DeviceResult result = List(folder);
+        DeviceResult result = List(folder);
         path_.resize(length);
+        if (result == DeviceResult::kFailed && IsDeviceThere(cancel_)) {
+            folder.unread = true;
+            result = DeviceResult::kDone;
+        }
         return result;
     }
 
@@ -157,14 +162,14 @@ class Lister {
     std::wstring path_;  // Ends in "\".
     std::span<const std::wstring> extensions_;
     bool recursive_;
-    HANDLE cancel_event_;
+    const CancelEvent& cancel_;
 };
 
 }  // namespace
 
 DeviceResult ListDeviceFolder(const std::wstring& folder, std::span<const std::wstring> extensions,
-                              bool recursive, FileNode& root, HANDLE cancel_event) {
-    return Lister(folder, extensions, recursive, cancel_event).List(root);
+                              bool recursive, FileNode& root, const CancelEvent& cancel) {
+    return Lister(folder, extensions, recursive, cancel).List(root);
 }
 
 DeviceResult ListDeviceFolderFlat(const std::wstring& folder, FileNode& root) {

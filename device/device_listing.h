@@ -9,6 +9,7 @@
 
 #include "device/file_node.h"
 #include "device/result_codes.h"
+#include "platform/cancel_event.h"
 
 namespace orvane {
 
@@ -16,15 +17,16 @@ namespace orvane {
 // are dropped: every sub-folder, and every file that MatchesExtension keeps, in the device's order; with
 // `recursive` every sub-folder's own entries likewise. The caller holds a session on this thread.
 //
-// Answers kDone, kFailed when the device refused a folder or answered nonsense, kListingCancelled when
-// `cancel_event` (null for none) was found signalled before a folder was listed. On the last two the tree
-// stays as far as it was read. May throw std::bad_alloc.
+// Answers kDone, kFailed when the device refused the folder or answered nonsense or the connection was lost,
+// kListingCancelled when the event was found signalled before a folder was listed. On the last two the tree
+// stays as far as it was read. A sub-folder that the device refuses is an empty one, marked `unread`. May
+// throw std::bad_alloc.
 //
 // Nothing that a device reports is trusted: an entry whose name cannot be one component of a path is left
 // out, and a folder whose path leaves no room for a search pattern shows no entries, which ends the
 // descent. Needs less than 64 KiB of stack at the greatest depth that a path can have (some 130 levels).
 DeviceResult ListDeviceFolder(const std::wstring& folder, std::span<const std::wstring> extensions,
-                              bool recursive, FileNode& root, HANDLE cancel_event);
+                              bool recursive, FileNode& root, const CancelEvent& cancel);
 
 // Lists all entries of one folder, without what lies below, not to be cancelled.
 DeviceResult ListDeviceFolderFlat(const std::wstring& folder, FileNode& root);

@@ -17,6 +17,7 @@ struct FileNode {
     std::unique_ptr<FileNode[]> children;
     std::int32_t child_count = 0;
     std::uint8_t is_folder = 0;  // 1 for a folder.
+    bool unread = false;         // A folder whose entries a listing could not get: it has none here.
     std::uint32_t attributes = 0;
     FILETIME creation_time = {};
     FILETIME last_access_time = {};
@@ -24,6 +25,7 @@ struct FileNode {
     std::uint32_t size_high = 0;
     std::uint32_t size_low = 0;
 
+    std::uint64_t Size() const { return (std::uint64_t{size_high} << 32U) | size_low; }
     std::span<const FileNode> Children() const {
         return {children.get(), static_cast<std::size_t>(child_count)};
     }

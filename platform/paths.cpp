@@ -56,6 +56,10 @@ bool IsUncRoot(std::wstring_view path) {
     return path.starts_with(L"\\\\") && std::ranges::count(path.substr(2), L'\\') <= 1;
 }
 
+bool IsPcFolderNamed(std::wstring_view folder) {
+    return !WithoutTrailingBackslashes(folder).empty();
+}
+
 bool IsPathComponent(std::wstring_view name) {
     static constexpr std::wstring_view kForbidden = L"<>:\"/\\|?*";
     return !name.empty() && name != L"." && name != L".." &&

@@ -31,6 +31,10 @@ std::wstring_view ParentPath(std::wstring_view path);
 // folder that a program could make.
 bool IsUncRoot(std::wstring_view path);
 
+// Whether the text names a folder of the PC. An empty one, and "\" alone, would come to mean the root of
+// whatever drive is the current one; who means the root of a drive names the drive.
+bool IsPcFolderNamed(std::wstring_view folder);
+
 // Whether `name` can be one component of a path at all: not empty, not "." or "..", free of control
 // characters and of < > : " / \ | ? *. Names listed by a device are not trusted before they pass this.
 bool IsPathComponent(std::wstring_view name);

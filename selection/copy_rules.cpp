@@ -14,6 +14,11 @@ bool IsSameVersion(const FILETIME& a, const FILETIME& b, int bound_seconds) {
     return first.SameDate(second) && std::abs(first.SecondOfDay() - second.SecondOfDay()) < bound_seconds;
 }
 
+bool Replaces(bool overwrite, const FILETIME& source_write_time, const FILETIME& target_write_time) {
+    return overwrite && CompareFileTime(&source_write_time, &target_write_time) > 0 &&
+           !IsSameVersion(source_write_time, target_write_time, kSameVersionSeconds);
+}
+
 bool ShouldSkipCopy(bool overwrite, const FILETIME& source_write_time, std::wstring_view name,
                     const FileIndex& target, const std::function<bool(std::wstring_view)>& ask_replace) {
     const std::int32_t row = target.Find(name);
@@ -21,11 +26,7 @@ bool ShouldSkipCopy(bool overwrite, const FILETIME& source_write_time, std::wstr
         return false;
     }
     const FILETIME& target_write_time = target.Table().write_times[static_cast<std::size_t>(row)];
-    if (!overwrite || SameFileTime(source_write_time, target_write_time)) {
-        return true;
-    }
-    const bool source_is_newer = CompareFileTime(&source_write_time, &target_write_time) > 0;
-    if (!source_is_newer || IsSameVersion(source_write_time, target_write_time, kSameVersionSeconds)) {
+    if (!Replaces(overwrite, source_write_time, target_write_time)) {
         return true;
     }
     return ask_replace && !ask_replace(name);

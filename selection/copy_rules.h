@@ -22,6 +22,9 @@ inline constexpr int kSameVersionSecondsReplaceCheck = 11;
 // than `bound_seconds`. Two seconds across midnight are two versions.
 bool IsSameVersion(const FILETIME& a, const FILETIME& b, int bound_seconds);
 
+// Whether the source may replace that target: replacing is allowed, and it is newer and not the same version.
+bool Replaces(bool overwrite, const FILETIME& source_write_time, const FILETIME& target_write_time);
+
 // Whether the source file is left alone: `target` has a file of its name that may not be overwritten
 // (`overwrite` off), has an equal time, is the same version, is newer, or is one that the user keeps.
 // `ask_replace`, empty when the user wants no warning, is called with the name only for a target that would

@@ -60,6 +60,7 @@ void FlattenTree(FileTable& table, std::int32_t& row, const FileNode& node, std:
         table.kinds.reserve(rows);
         table.creation_times.reserve(rows);
         table.write_times.reserve(rows);
+        table.sizes.reserve(rows);
         table.text = std::make_unique<std::pmr::monotonic_buffer_resource>((rows + 1) * kUsualNameBytes);
     }
     for (const FileNode& child : node.Children()) {
@@ -73,6 +74,7 @@ void FlattenTree(FileTable& table, std::int32_t& row, const FileNode& node, std:
         table.kinds.push_back(is_folder ? kKindFolder : kKindFile);
         table.creation_times.push_back(is_folder ? FILETIME{} : child.creation_time);
         table.write_times.push_back(is_folder ? FILETIME{} : child.last_write_time);
+        table.sizes.push_back(child.Size());
         if (is_folder) {
             FlattenTree(table, row, child, name, capacity);
         }

@@ -18,12 +18,13 @@ namespace orvane {
 inline constexpr std::wstring_view kKindFile = L"file";
 inline constexpr std::wstring_view kKindFolder = L"dir";
 
-// Four parallel arrays of one capacity. How many rows are in use is kept by whoever fills the table.
+// Parallel arrays of one capacity. How many rows are in use is kept by whoever fills the table.
 struct FileTable {
     std::vector<std::wstring_view> names;  // Path below the job folder, beginning with "\".
     std::vector<std::wstring_view> kinds;  // kKindFile or kKindFolder.
     std::vector<FILETIME> creation_times;  // Set for files only.
     std::vector<FILETIME> write_times;     // Last write; 0 for a folder.
+    std::vector<std::uint64_t> sizes{};    // Bytes; of the PC's files the low 32 bits of that number.
 
     // Where FlattenTree puts the text of the names, one behind the other. Names of another origin belong to
     // whoever fills them in.

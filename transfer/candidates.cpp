@@ -39,13 +39,20 @@ bool BuildCandidates(const Comparison& comparison, const JobTable& source, const
         const std::wstring_view name = source.table.names[row];
         const FILETIME& write_time = source.table.write_times[row];
         // The user decides by ticking: nothing is asked here.
-        if (source.table.kinds[row] != kKindFile ||
+        if (source.table.kinds[row] != kKindFile || target.IsUnknown(name) ||
             ShouldSkipCopy(comparison.overwrite_old_files, write_time, name, index, {})) {
             continue;
         }
         const std::wstring_view relative = name.substr(1);
         if (IsListedType(relative, comparison.types)) {
-            candidates.push_back({std::wstring(relative), DateText(write_time)});
+            sFileDate& entry = candidates.emplace_back();
+            entry.first_text = relative;
+            entry.second_text = DateText(write_time);
+            entry.write_time = write_time;
+            entry.size = source.table.sizes[row];
+            if (const std::int32_t target_row = index.Find(name); target_row >= 0) {
+                entry.target_time = target.table.write_times[static_cast<std::size_t>(target_row)];
+            }
         }
     }
     return true;

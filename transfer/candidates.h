@@ -2,6 +2,8 @@
 // version of. No windows, no threads of its own.
 #pragma once
 
+#include <cstdint>
+#include <optional>
 #include <string>
 #include <vector>
 
@@ -13,7 +15,12 @@ namespace orvane {
 
 // One entry of a list. Its first text is the name below the job folder, without "\" in front
 // ("Job1\pic.jpg"); its second one is the source's last-write time in local time, "dd/mm/yyyy hh:mm:ss".
-using sFileDate = SortedListRecord;
+// Behind that stands what the listings knew of the file.
+struct sFileDate : SortedListRecord {
+    FILETIME write_time = {};
+    std::uint64_t size = 0;               // Bytes.
+    std::optional<FILETIME> target_time;  // Write time of the file that a copy would replace.
+};
 
 // What the two lists are made from.
 struct Comparison {

@@ -18,7 +18,7 @@ constexpr DWORD kPollMs = 100;
 
 }  // namespace
 
-CCeShwCopyFileDlg::CCeShwCopyFileDlg(CopyDirection direction)
+CCeShwCopyFileDlg::CCeShwCopyFileDlg(Direction direction)
     : ui::Dialog(IDD_COPY_PROGRESS), direction_(direction), ready_(NewManualResetEvent()) {}
 
 bool CCeShwCopyFileDlg::OnInitDialog() {
@@ -88,8 +88,8 @@ void CCeShwCopyFileDlg::OnClose() {
     End(0);
 }
 
-std::wstring CopyProgressTitle(int number, int count, CopyDirection direction) {
-    const bool to_pc = direction == CopyDirection::kDeviceToPc;
+std::wstring CopyProgressTitle(int number, int count, Direction direction) {
+    const bool to_pc = direction == Direction::kDeviceToPc;
     const std::wstring direction_text =
         Xlate(to_pc ? XlateKey(L"From Device to PC") : XlateKey(L"From PC to Device"));
     // The doubled brace stands for one; the single one at the end stays as it is.
@@ -99,7 +99,7 @@ std::wstring CopyProgressTitle(int number, int count, CopyDirection direction) {
         {qel_formats::IntToString(number), qel_formats::IntToString(count), direction_text});
 }
 
-CopyProgress::CopyProgress(CopyDirection direction)
+CopyProgress::CopyProgress(Direction direction)
     : dialog_(direction), thread_(CreateThread(nullptr, 0, Run, &dialog_, 0, nullptr)) {
     if (thread_) {
         // The thread ends at once when the dialog cannot be created.

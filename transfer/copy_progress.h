@@ -6,13 +6,11 @@
 #include <atomic>
 #include <string>
 
+#include "copy/copy_context.h"
 #include "platform/handles.h"
 #include "ui/dialog.h"
 
 namespace orvane {
-
-// Which way files are copied; the number is that of the page whose list they come from.
-enum class CopyDirection { kPcToDevice = 0, kDeviceToPc = 1 };
 
 // Whether the user wants the copy to stop.
 enum class StopState { kRunning = 0, kAsking = 1, kStopped = 2 };
@@ -32,7 +30,7 @@ inline constexpr UINT kCopyAskReplace = WM_USER + 1011;
 // but GetStopState belongs to the thread that calls DoModal.
 class CCeShwCopyFileDlg : public ui::Dialog {
   public:
-    explicit CCeShwCopyFileDlg(CopyDirection direction);
+    explicit CCeShwCopyFileDlg(Direction direction);
 
     // Any thread. kAsking while the user is asked.
     StopState GetStopState() const { return stop_state_; }
@@ -54,13 +52,13 @@ class CCeShwCopyFileDlg : public ui::Dialog {
     bool OnAskReplace(const std::wstring& question);
     void OnClose();
 
-    const CopyDirection direction_;
+    const Direction direction_;
     const UniqueEvent ready_;
     std::atomic<StopState> stop_state_{StopState::kRunning};
 };
 
 // The window's title while file `number` (counted from 1) of `count` is copied.
-std::wstring CopyProgressTitle(int number, int count, CopyDirection direction);
+std::wstring CopyProgressTitle(int number, int count, Direction direction);
 
 // Runs the progress dialog on a thread of its own while it lives; used by one other thread, the one that
 // copies, which needs to handle no messages. A window that does not come up, or that the user closed by
@@ -68,7 +66,7 @@ std::wstring CopyProgressTitle(int number, int count, CopyDirection direction);
 class CopyProgress {
   public:
     // Returns when the window is there, or when it is clear that there will be none.
-    explicit CopyProgress(CopyDirection direction);
+    explicit CopyProgress(Direction direction);
     // Closes the window and ends its thread.
     ~CopyProgress();
     CopyProgress(const CopyProgress&) = delete;

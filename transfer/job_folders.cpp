@@ -1,6 +1,10 @@
 #include "transfer/job_folders.h"
 
+#include <optional>
+#include <utility>
+
 #include "device/file_node.h"
+#include "platform/handles.h"
 #include "platform/paths.h"
 #include "ui/dialog.h"
 
@@ -10,6 +14,7 @@ ui::Waited ReadJobFolders(HWND dialog, SyncSettings& settings, DeviceTreeReader&
                           qel_text::TextKey device_unread, JobTable& pc, JobTable& device,
                           const std::function<void()>& build) {
     bool device_read = false;
+    bool pc_read = false;
     const auto read = [&] {
         std::wstring& folder = settings.sync_path_ce;
         if (folder.empty()) {
@@ -18,19 +23,24 @@ ui::Waited ReadJobFolders(HWND dialog, SyncSettings& settings, DeviceTreeReader&
         FileNode root;
         device_read =
             !folder.empty() && reader.ReadDeviceTree(WithTrailingBackslash(folder), {}, root, dialog);
-        if (!device_read || WaitForSingleObject(reader.StopEvent(), 0) == WAIT_OBJECT_0) {
+        if (!device_read || IsSignalled(reader.StopEvent())) {
             return;
         }
         device = JobTable(root);
-        pc = ListPcJobFolder(settings.sync_path_dt);
-        build();
+        std::optional<JobTable> listed = ListPcJobFolder(settings.sync_path_dt);
+        pc_read = listed.has_value();
+        if (pc_read) {
+            pc = std::move(*listed);
+            build();
+        }
     };
     const ui::Waited waited = ui::RunAndPaint(read, reader.StopEvent(), DeviceTreeReader::kStackBytes);
-    if (waited != ui::Waited::kClosed && !device_read) {
-        ui::ShowMessageBox(dialog, Xlate(device_unread));
-        return ui::Waited::kFailed;
+    if (waited == ui::Waited::kClosed || (waited == ui::Waited::kDone && pc_read)) {
+        return waited;
     }
-    return waited;
+    ui::ShowMessageBox(dialog,
+                       device_read ? UnreadableFolderText(settings.sync_path_dt) : Xlate(device_unread));
+    return ui::Waited::kFailed;
 }
 
 }  // namespace orvane

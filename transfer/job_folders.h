@@ -18,7 +18,8 @@ namespace orvane {
 // folder is in memory the store is asked again, and what it knows is left in `settings`: an empty folder
 // would come to mean the device's whole storage.
 //
-// kFailed has been told to the user in a box, with `device_unread` for the device's folder.
+// kFailed has been told to the user in a box, with `device_unread` for the device's folder; `build` has not
+// run then.
 ui::Waited ReadJobFolders(HWND dialog, SyncSettings& settings, DeviceTreeReader& reader,
                           qel_text::TextKey device_unread, JobTable& pc, JobTable& device,
                           const std::function<void()>& build);

@@ -381,7 +381,7 @@ void CCeFileTransfDlg::OnCopySelected() {
     {
         const Busy busy(*this);
         const ui::WaitCursor wait;
-        CopyFiles(current_page_, Names(pages_[static_cast<std::size_t>(current_page_)], true),
+        CopyFiles(current_page_, Chosen(pages_[static_cast<std::size_t>(current_page_)], true),
                   /*more_follows=*/false);
     }
     EnableItem(IDC_TRANSFER_COPY_ALL, AnyCandidates());
@@ -391,10 +391,10 @@ void CCeFileTransfDlg::OnCopySelected() {
 void CCeFileTransfDlg::OnCopyAll(bool ticked_only) {
     const Busy busy(*this);
     const ui::WaitCursor wait;
-    const std::vector<std::wstring> from_pc = Names(pages_[kPcPage], ticked_only);
-    const std::vector<std::wstring> from_device = Names(pages_[kDevicePage], ticked_only);
-    if (CopyFiles(kPcPage, from_pc, /*more_follows=*/!from_device.empty())) {
-        CopyFiles(kDevicePage, from_device, /*more_follows=*/false);
+    std::vector<sFileDate> from_pc = Chosen(pages_[kPcPage], ticked_only);
+    std::vector<sFileDate> from_device = Chosen(pages_[kDevicePage], ticked_only);
+    if (CopyFiles(kPcPage, std::move(from_pc), /*more_follows=*/!from_device.empty())) {
+        CopyFiles(kDevicePage, std::move(from_device), /*more_follows=*/false);
     }
     EnableItem(IDC_TRANSFER_COPY_ALL, AnyCandidates());
     if (!AnyCandidates()) {
@@ -403,22 +403,22 @@ void CCeFileTransfDlg::OnCopyAll(bool ticked_only) {
 }
 
 // In the order in which the list shows the entries.
-std::vector<std::wstring> CCeFileTransfDlg::Names(const Page& page, bool ticked_only) const {
-    std::vector<std::wstring> names;
+std::vector<sFileDate> CCeFileTransfDlg::Chosen(const Page& page, bool ticked_only) const {
+    std::vector<sFileDate> files;
     const int count = page.list.ItemCount();
     for (int index = 0; index < count; ++index) {
         const SortedListRecord* record = page.list.RecordAt(index);
         if (record != nullptr && (record->ticked || !ticked_only)) {
-            names.push_back(record->first_text);
+            files.push_back(static_cast<const sFileDate&>(*record));
         }
     }
-    return names;
+    return files;
 }
 
 // Copies the files of one page to the other side. Without a device nothing happens. False when the user does
 // not want what follows: a stop question that is still open is waited for, but only if something follows.
-bool CCeFileTransfDlg::CopyFiles(int number, const std::vector<std::wstring>& names, bool more_follows) {
-    if (names.empty()) {
+bool CCeFileTransfDlg::CopyFiles(int number, std::vector<sFileDate> files, bool more_follows) {
+    if (files.empty()) {
         return true;
     }
     DeviceSession session(device_tree_.StopEvent());
@@ -426,15 +426,17 @@ bool CCeFileTransfDlg::CopyFiles(int number, const std::vector<std::wstring>& na
         return true;
     }
     Page& page = pages_[static_cast<std::size_t>(number)];
-    const auto direction = static_cast<CopyDirection>(number);
+    const auto direction = static_cast<Direction>(number);
     CopyProgress progress(direction);
-    const TransferOutcome outcome = CopySelectedFiles({.direction = direction,
-                                                       .pc_folder = settings_.sync_path_dt,
-                                                       .device_folder = settings_.sync_path_ce,
-                                                       .names = names,
-                                                       .warn_before_replacing = settings_.overwrite_warn,
-                                                       .stop_event = device_tree_.StopEvent()},
-                                                      progress);
+    const CancelEvent stop(device_tree_.StopEvent());
+    const TransferOutcome outcome = CopySelectedFiles(
+        {.direction = direction,
+         .folders = {settings_.sync_path_dt, settings_.sync_path_ce},
+         .files = std::move(files),
+         .warn_before_replacing = settings_.overwrite_warn,
+         .companions = {.overwrite_old_files = settings_.overwrite_old_files, .own_rows = settings_.types},
+         .stop = stop},
+        progress);
     // Before anything can paint the list, which shows the entries where they lie.
     RemoveCandidates(page.candidates, outcome.copied);
     page.list.SetItems(page.candidates);
@@ -443,8 +445,8 @@ bool CCeFileTransfDlg::CopyFiles(int number, const std::vector<std::wstring>& na
         // The progress window, which belongs to another thread, would cover the box.
         SetForegroundWindow(Handle());
         ui::ShowMessageBox(Handle(),
-                           Xlate(direction == CopyDirection::kPcToDevice ? XlateKey(L"Device Disk Full!")
-                                                                         : XlateKey(L"PC Disk Full!")),
+                           Xlate(direction == Direction::kPcToDevice ? XlateKey(L"Device Disk Full!")
+                                                                     : XlateKey(L"PC Disk Full!")),
                            MB_OK | MB_ICONINFORMATION, Xlate(L"Copying File"));
     }
     bool go_on = true;

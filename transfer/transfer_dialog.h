@@ -98,8 +98,8 @@ class CCeFileTransfDlg : public ui::Dialog {
     void OnListingReady(int number);
 
     void ReadListings();
-    std::vector<std::wstring> Names(const Page& page, bool ticked_only) const;
-    bool CopyFiles(int number, const std::vector<std::wstring>& names, bool more_follows);
+    std::vector<sFileDate> Chosen(const Page& page, bool ticked_only) const;
+    bool CopyFiles(int number, std::vector<sFileDate> files, bool more_follows);
     void FinishCopy(Page& page);
     bool AnyCandidates() const;
     Page* PageOfList(HWND list);

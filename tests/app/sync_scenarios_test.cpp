@@ -79,7 +79,7 @@ const Scenario kScenarios[] = {
     {.what = "AFailedFileDoesNotStopTheNext",
      .pc = {{L"a.qvj", "pc"}, {L"locked.qvj", "pc"}, {L"z.qvj", "pc"}},
      .device = {{L"b.txt", "device"}, {L"y.txt", "device"}},
-     .faults = {{L"REFUSE", L"CeCreateFile@\\Jobs\\a.qvj=5;CeCreateFile@\\Jobs\\b.txt=32"}},
+     .faults = {{L"REFUSE", L"CeCreateFile@\\Jobs\\a.qvj.orvane-part=5;CeCreateFile@\\Jobs\\b.txt=32"}},
      .to_pc = {{L"y.txt", "device"}},
      .to_device = {{L"z.qvj", "pc"}},
      // The lines of the failed files stay as they are, and no error text reaches the log.

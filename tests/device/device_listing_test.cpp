@@ -78,8 +78,13 @@ TEST_F(DeviceListing, StopsWhereItIsCancelledOrRefused) {
     EXPECT_EQ(List(L"\\Missing"), DeviceResult::kFailed);
     EXPECT_EQ(root_.child_count, 0);
     device_.Set(L"REFUSE", L"CeFindAllFiles#2=5");
-    EXPECT_EQ(List(L"\\Jobs"), DeviceResult::kFailed);
+    EXPECT_EQ(List(L"\\Jobs"), DeviceResult::kDone);
     EXPECT_EQ(PathsOf(root_), Texts{L"Sub\\"});
+    EXPECT_TRUE(root_.children[0].unread);
+    device_.Set(L"REFUSE", L"");
+    device_.Set(L"VANISH", L"2");
+    EXPECT_EQ(List(L"\\Jobs"), DeviceResult::kFailed);
+    device_.Set(L"VANISH", L"");
     device_.Set(L"REFUSE", L"");
 
     device_.Set(L"CALL_DELAY", L"400");

@@ -76,6 +76,32 @@ void WriteTextFile(const std::wstring& path, std::string_view content, std::opti
     EXPECT_TRUE(!last_write || SetFileTime(file.Get(), nullptr, nullptr, &*last_write));
 }
 
+bool MakeLink(const std::wstring& path, const std::wstring& target) {
+    using UnixName = char*(CDECL*)(const wchar_t*);  // Wine's own: the path as the host system has it.
+    const auto unix_name = reinterpret_cast<UnixName>(
+        reinterpret_cast<void*>(GetProcAddress(GetModuleHandleW(L"kernel32"), "wine_get_unix_file_name")));
+    if (unix_name == nullptr) {
+        return false;
+    }
+    std::wstring command = L"ln -s";
+    for (const std::wstring& each : {target, path}) {
+        char* name = unix_name(each.c_str());
+        command += L" \"" + std::filesystem::path(name).wstring() + L"\"";
+        HeapFree(GetProcessHeap(), 0, name);
+    }
+    STARTUPINFOW start{};
+    start.cb = sizeof(start);
+    PROCESS_INFORMATION process{};
+    if (!CreateProcessW(L"\\\\?\\unix\\bin\\ln", command.data(), nullptr, nullptr, FALSE, 0, nullptr, nullptr,
+                        &start, &process)) {
+        return false;
+    }
+    WaitForSingleObject(process.hProcess, INFINITE);
+    CloseHandle(process.hThread);
+    CloseHandle(process.hProcess);
+    return true;
+}
+
 std::optional<std::string> ReadTextFile(const std::wstring& path) {
     std::ifstream file(fs::path(path), std::ios::binary);
     if (!file) {

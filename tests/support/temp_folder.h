@@ -32,6 +32,8 @@ void MakeFolder(const std::wstring& path);
 // Writes the file, creating its folder where that is missing; with a last-write time if one is given.
 void WriteTextFile(const std::wstring& path, std::string_view content,
                    std::optional<FILETIME> last_write = std::nullopt);
+// Makes a link of the test system's own at `path` that leads to `target`. False where there are none.
+bool MakeLink(const std::wstring& path, const std::wstring& target);
 // The file's content; nothing when it cannot be opened.
 std::optional<std::string> ReadTextFile(const std::wstring& path);
 bool Exists(const std::wstring& path);

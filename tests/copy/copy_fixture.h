@@ -6,8 +6,8 @@
 #include <optional>
 #include <string>
 
+#include "copy/copy_context.h"
 #include "device/connect.h"
-#include "platform/handles.h"
 #include "tests/support/folder_device.h"
 #include "tests/support/temp_folder.h"
 
@@ -26,6 +26,8 @@ class CopyTest : public ::testing::Test {
     }
     std::wstring OnPc(std::wstring_view relative) const { return *pc_ / relative; }
     std::wstring OnDevice(const std::wstring& relative) const { return device_->Root() + L"\\" + relative; }
+    // The paths of one name on both sides, as the program uses them.
+    EntryPaths Paths(const std::wstring& relative) const { return {OnPc(relative), L"\\" + relative}; }
 
     // Every session was closed, and nothing was asked of the device outside of one, but for the second
     // closing of file and session that is meant after a full disk.
@@ -45,6 +47,16 @@ class CopyTest : public ::testing::Test {
         EXPECT_EQ(open, 0);
         EXPECT_EQ(outside, after_full_disk ? 2 : 0);
     }
+    // No side holds a copy in the making.
+    void ExpectNothingAside() const {
+        ExpectNothingAside(pc_->Path());
+        ExpectNothingAside(device_->Root());
+    }
+    static void ExpectNothingAside(const std::wstring& folder) {
+        for (const std::wstring& name : ListTree(folder)) {
+            EXPECT_FALSE(name.ends_with(L".orvane-part")) << ::testing::PrintToString(name);
+        }
+    }
 
     // Bytes that differ from chunk to chunk.
     static std::string Content(std::size_t size) {
@@ -57,7 +69,7 @@ class CopyTest : public ::testing::Test {
 
     std::optional<FolderDevice> device_;
     std::optional<TempFolder> pc_;
-    UniqueEvent cancel_ = NewManualResetEvent();
+    CancelEvent cancel_;
 };
 
 }  // namespace orvane::testing

@@ -1,4 +1,4 @@
-#include "selection/pc_listing.h"
+#include "selection/job_table.h"
 
 #include <gtest/gtest.h>
 

@@ -1,7 +1,6 @@
-#include "device/ensure_folder.h"
+#include "copy/target_folder.h"
 
 #include "device/connect.h"
-#include "device/device_path.h"
 #include "device/remote_api.h"
 
 namespace orvane {
@@ -14,7 +13,7 @@ void CreateDeviceLevels(std::wstring_view path, bool look_up_first) {
     for (std::size_t end = levels.find(L'\\', 1); end != std::wstring::npos;
          end = levels.find(L'\\', end + 1)) {
         const std::wstring level = levels.substr(0, end);
-        if (!look_up_first || DeviceEntry(level) == EntryKind::kNone) {
+        if (!look_up_first || Side::Device().Find(level).kind == EntryKind::kNone) {
             CeCreateDirectory(PathBuffer(level).Get(), nullptr);
         }
     }
@@ -22,27 +21,36 @@ void CreateDeviceLevels(std::wstring_view path, bool look_up_first) {
 
 }  // namespace
 
-void EnsureDeviceFolder(std::wstring_view path, HANDLE cancel_event) {
-    const DeviceSession session(cancel_event);
+bool EnsureDeviceFolder(std::wstring_view path, const CancelEvent& cancel) {
+    const DeviceSession session(cancel);
     if (session) {
         CreateDeviceLevels(path, /*look_up_first=*/false);
     }
-}
-
-void EnsureDeviceFolderInSession(std::wstring_view path) {
-    CreateDeviceLevels(path, /*look_up_first=*/true);
+    return static_cast<bool>(session);
 }
 
 void EnsurePcFolder(const std::wstring& path) {
-    if (!PcPathFits(path.size())) {
+    if (!PathFits(path.size()) || IsUncRoot(path)) {
         return;
     }
     // Ends because each parent is shorter; a path without a parent gives an empty one.
     const std::wstring parent(ParentPath(path));
-    if (!parent.empty() && PcEntry(parent) == EntryKind::kNone) {
+    if (!parent.empty() && Side::Pc().Find(parent).kind == EntryKind::kNone) {
         EnsurePcFolder(parent);
     }
     CreateDirectoryW(path.c_str(), nullptr);
+}
+
+bool EnsureTargetFolder(const EntryPaths& paths, const CopyContext& context) {
+    const std::wstring_view folder = ParentPath(paths.Target(context.direction));
+    if (context.direction == Direction::kDeviceToPc) {
+        EnsurePcFolder(std::wstring(folder));
+    } else if (context.session == Session::kOwn) {
+        return EnsureDeviceFolder(folder, context.cancel);
+    } else {
+        CreateDeviceLevels(folder, /*look_up_first=*/true);
+    }
+    return true;
 }
 
 }  // namespace orvane

@@ -1,0 +1,303 @@
+#include "copy/file_copy.h"
+
+#include "copy/target_path.h"
+#include "device/connect.h"
+#include "device/remote_api.h"
+#include "platform/file_time.h"
+#include "platform/text_case.h"
+
+namespace orvane {
+
+namespace {
+
+constexpr DWORD kChunkBytes = 8192;
+
+// Writes all of it, in as many calls as the side wants: once also for a chunk of nothing. A Win32 code.
+DWORD WriteAll(const Side& to, HANDLE target, const BYTE* data, DWORD wanted) {
+    do {
+        DWORD written = 0;
+        if (!to.Write(target, data, wanted, written)) {
+            return to.LastError();
+        }
+        // No progress is no success, and a count beyond the chunk no count.
+        if (written > wanted || (written == 0 && wanted > 0)) {
+            return ERROR_WRITE_FAULT;
+        }
+        data += written;
+        wanted -= written;
+    } while (wanted > 0);
+    return ERROR_SUCCESS;
+}
+
+// Copies from where the source's handle stands to its end, which is a chunk shorter than asked for once
+// `size` bytes are reached; so a source of full chunks only ends with a chunk of 0 bytes. Neither handle is
+// closed.
+DeviceResult CopyChunks(const CopyContext& context, HANDLE source, HANDLE target, std::uint64_t size) {
+    BYTE chunk[kChunkBytes];
+    std::uint64_t copied = 0;
+    while (!context.cancel.IsSignalled()) {
+        DWORD read = 0;
+        // A count beyond the buffer is no count: the device's answers are not trusted.
+        if (!context.Source().Read(source, chunk, kChunkBytes, read) || read > kChunkBytes ||
+            (read == 0 && copied < size)) {
+            return DeviceResult::kFailed;
+        }
+        const DWORD error = WriteAll(context.Target(), target, chunk, read);
+        if (error != ERROR_SUCCESS) {
+            return error == ERROR_DISK_FULL ? DeviceResult::kDiskFull : DeviceResult::kFailed;
+        }
+        copied += read;
+        if (read < kChunkBytes && copied >= size) {
+            return DeviceResult::kDone;
+        }
+    }
+    return DeviceResult::kCancelled;
+}
+
+// All three times of the source; the present time where they cannot be read.
+FileTimes TimesOf(const Side& side, HANDLE source) {
+    FileTimes times{};
+    if (!side.GetTimes(source, times)) {
+        GetSystemTimeAsFileTime(&times.last_write);
+        times.creation = times.last_access = times.last_write;
+    }
+    return times;
+}
+
+// `times` are the source's. Of a pass it is meant that the times of an open file are asked for first and the
+// answer thrown away: on the device with the PC's handle.
+bool Date(const CopyContext& context, const FileToCopy& file, const FileTimes& times, HANDLE source,
+          HANDLE target) {
+    const Side& side = context.Target();
+    if (context.purpose == Purpose::kManualView) {
+        return side.SetTimes(target, &times.creation, &times.last_access, times.last_write);
+    }
+    if (context.purpose == Purpose::kPass) {
+        if (context.direction == Direction::kPcToDevice) {
+            CeGetFileTime(source, nullptr, nullptr, nullptr);
+        } else {
+            GetFileTime(target, nullptr, nullptr, nullptr);
+        }
+    }
+    return side.SetTimes(target, nullptr, nullptr, file.write_time);
+}
+
+// The last step: the whole copy beside the target takes its name.
+class Placing {
+  public:
+    Placing(const FileToCopy& file, const CopyContext& context, const std::wstring& aside)
+        : file_(file),
+          context_(context),
+          side_(context.Target()),
+          target_(file.paths.Target(context.direction)),
+          aside_(aside) {}
+
+    DeviceResult Run() const {
+        const bool placed = Place();
+        // Where the old file is gone and the new one has not got its name, a whole copy stays beside it.
+        if (!placed && !(file_.target_time && Look().kind == EntryKind::kNone)) {
+            side_.Delete(aside_);
+        }
+        return placed ? DeviceResult::kDone : DeviceResult::kFailed;
+    }
+
+  private:
+    bool Place() const {
+        // A move refuses to replace what no listing has seen; nothing need be looked at first.
+        const FoundEntry old_file = file_.target_time ? Look() : FoundEntry{};
+        switch (old_file.kind) {
+            case EntryKind::kNone:
+                return side_.Move(aside_, target_);
+            case EntryKind::kFolder:
+                return false;
+            case EntryKind::kFile:
+                break;
+        }
+        // By another name it is found where the target's is the short name of that file.
+        const std::wstring target = JoinPath(ParentPath(target_), old_file.name);
+        if (!SameFileTime(old_file.write_time, *file_.target_time) || !EqualIgnoringCase(target, target_)) {
+            return false;
+        }
+        return context_.old_file == OldFile::kKept ? PlaceAndKeep(target) : side_.MoveOver(aside_, target);
+    }
+
+    // In place of the old file, whose name stays in the case that it has.
+    bool PlaceAndKeep(const std::wstring& target) const {
+        const std::wstring backup = MoveToBackup(side_, target);
+        if (backup.empty()) {
+            return false;
+        }
+        if (side_.Move(aside_, target)) {
+            return true;
+        }
+        side_.Move(backup, target);
+        return false;
+    }
+
+    FoundEntry Look() const {
+        return side_.Find(target_,
+                          context_.session == Session::kOwn ? SearchEnd::kWithSession : SearchEnd::kNow);
+    }
+
+    const FileToCopy& file_;
+    const CopyContext& context_;
+    const Side& side_;
+    const std::wstring& target_;
+    const std::wstring& aside_;
+};
+
+DeviceResult PlaceAfter(const BeforePlacing& before_placing, const FileToCopy& file,
+                        const CopyContext& context, const std::wstring& aside) {
+    if (before_placing) {
+        const DeviceResult result = before_placing();
+        if (result != DeviceResult::kDone) {
+            context.Target().Delete(aside);
+            return result;
+        }
+    }
+    return Placing(file, context, aside).Run();
+}
+
+// Ends a copy to the device that failed: closes and deletes what was written, and closes the session if it is
+// the copy's own.
+void AbandonOnDevice(DeviceResult result, HANDLE target, const std::wstring& aside, DeviceSession& session,
+                     const CopyContext& context) {
+    if (context.session == Session::kCallers) {
+        Side::Device().Close(target);
+        Side::Device().Delete(aside);
+        return;
+    }
+    DeleteDeviceFileAfterClose(target, aside);
+    session.Release();
+    if (result == DeviceResult::kDiskFull) {
+        // Meant: after a full disk the handle and the session are closed a second time.
+        CeCloseHandle(target);
+        CeRapiUninit();
+    }
+}
+
+CopyOutcome NotBegun() {
+    return {DeviceResult::kFailed, /*begun=*/false};
+}
+
+CopyOutcome CopyToDevice(const FileToCopy& file, const CopyContext& context,
+                         const BeforePlacing& before_placing) {
+    const SideFile source(Side::Pc(), Side::Pc().OpenSource(file.paths.pc));
+    LARGE_INTEGER size{};
+    if (!source || !GetFileSizeEx(source.Get(), &size)) {
+        return NotBegun();
+    }
+    const FileTimes times = TimesOf(Side::Pc(), source.Get());
+    DeviceSession session(context.cancel, context.session);
+    if (!session) {
+        return {DeviceResult::kFailed};
+    }
+    if (context.cancel.IsSignalled()) {
+        return {DeviceResult::kCancelled};
+    }
+    const std::wstring aside = AsidePath(file.paths.device);
+    SideFile target(Side::Device(), Side::Device().Create(aside));
+    if (!target) {
+        return NotBegun();
+    }
+    DeviceResult result =
+        CopyChunks(context, source.Get(), target.Get(), static_cast<std::uint64_t>(size.QuadPart));
+    if (result == DeviceResult::kDone && !Date(context, file, times, source.Get(), target.Get())) {
+        result = DeviceResult::kFailed;
+    }
+    if (result != DeviceResult::kDone) {
+        AbandonOnDevice(result, target.Release(), aside, session, context);
+        return {result};
+    }
+    if (!target.Close()) {
+        Side::Device().Delete(aside);
+        return {DeviceResult::kFailed};
+    }
+    return {PlaceAfter(before_placing, file, context, aside)};
+}
+
+CopyOutcome CopyToPc(const FileToCopy& file, const CopyContext& context,
+                     const BeforePlacing& before_placing) {
+    DeviceSession session(context.cancel, context.session);
+    if (!session) {
+        return {DeviceResult::kFailed};
+    }
+    SideFile source(Side::Device(), Side::Device().OpenSource(file.paths.device));
+    if (!source) {
+        return NotBegun();
+    }
+    if (context.cancel.IsSignalled()) {
+        return {DeviceResult::kCancelled};
+    }
+    const std::wstring aside = AsidePath(file.paths.pc);
+    SideFile target(Side::Pc(), Side::Pc().Create(aside));
+    if (!target) {
+        return NotBegun();
+    }
+    FileTimes times{};
+    if (context.purpose == Purpose::kManualView) {
+        times = TimesOf(Side::Device(), source.Get());
+    }
+    DeviceResult result = CopyChunks(context, source.Get(), target.Get(), file.size);
+    if (result == DeviceResult::kDone && !Date(context, file, times, source.Get(), target.Get())) {
+        result = DeviceResult::kFailed;
+    }
+    if (result == DeviceResult::kDiskFull) {
+        // Meant: at once, while the file is still open. Where the system refuses that because the file is not
+        // shared, it is deleted below like any other.
+        Side::Pc().Delete(aside);
+    }
+    source.Close();
+    session.Close();
+    if (!target.Close() && result == DeviceResult::kDone) {
+        result = DeviceResult::kFailed;
+    }
+    if (result != DeviceResult::kDone) {
+        Side::Pc().Delete(aside);
+        return {result};
+    }
+    return {PlaceAfter(before_placing, file, context, aside)};
+}
+
+}  // namespace
+
+CopyOutcome CopyPcFileToDeviceWithBackup(const FileToCopy& file, const CopyContext& context,
+                                         const BeforePlacing& before_placing) {
+    return CopyToDevice(file, context, before_placing);
+}
+
+CopyOutcome CopyDeviceFileToPcWithBackup(const FileToCopy& file, const CopyContext& context,
+                                         const BeforePlacing& before_placing) {
+    return CopyToPc(file, context, before_placing);
+}
+
+CopyOutcome CopyPcFileToDevice(const FileToCopy& file, const CopyContext& context) {
+    return CopyToDevice(file, context, {});
+}
+
+CopyOutcome CopyDeviceFileToPc(const FileToCopy& file, const CopyContext& context) {
+    return CopyToPc(file, context, {});
+}
+
+HANDLE OpenDeviceFile(const std::wstring& device_path, DWORD access, DWORD share_mode, DWORD creation,
+                      const CancelEvent& cancel, Session session) {
+    DeviceSession own(cancel, session);
+    if (!own) {
+        return INVALID_HANDLE_VALUE;
+    }
+    const HANDLE file = CeCreateFile(PathBuffer(device_path).Get(), access, share_mode, nullptr, creation,
+                                     FILE_ATTRIBUTE_NORMAL, nullptr);
+    if (file != INVALID_HANDLE_VALUE) {
+        own.Release();  // The caller's, with the file.
+    }
+    return file;
+}
+
+BOOL DeleteDeviceFileAfterClose(HANDLE file, const std::wstring& device_path) {
+    CeCloseHandle(file);
+    const BOOL deleted = CeDeleteFile(PathBuffer(device_path).Get());
+    CeRapiUninit();  // Meant: also when the session is a caller's.
+    return deleted;
+}
+
+}  // namespace orvane
