@@ -6,17 +6,15 @@ dialogs=(sync about options folder_chooser loading device_browser properties run
 
 # picture NAME WINDOW: the window as it stands on the desktop.
 picture() {
-  local place
-  place=$(drive rect "$2")
-  sleep 0.5  # What was pressed just now is painted.
-  import -window root png:- | convert - -crop "$place" +repage "$shots/$WINDOW_LANGUAGE/$1.png"
+  take "$1" "$(drive rect "$2")"
 }
-
 # open PRESSED ID WINDOW NAME: presses a button and takes a picture of the window that opens.
 open() {
-  drive click "$1" "$2"
-  drive wait "$3"
-  picture "$4" "$3"
+  take "$4" "$(drive open "$1" "$2" "$3")"
+}
+take() {
+  sleep 0.5  # What was pressed just now is painted.
+  import -window root png:- | convert - -crop "$2" +repage "$shots/$WINDOW_LANGUAGE/$1.png"
 }
 close() {
   drive click "$1" "$2"

@@ -4,13 +4,15 @@
 //
 //   window_driver wait CAPTION               until the window is shown and takes input
 //   window_driver gone CAPTION               until there is no such window
-//   window_driver click CAPTION ID           presses a button once it takes input, without waiting for what
-//   it does window_driver wait-text CAPTION ID TEXT  until the control's text is TEXT window_driver
-//   wait-disabled CAPTION ID   until the control takes no input window_driver rect CAPTION prints where the
-//   window is, as WIDTHxHEIGHT+LEFT+TOP window_driver list CAPTION ID            prints the lines of a list
-//   box, in UTF-8 window_driver tab CAPTION ID INDEX       turns to a page of a tab control window_driver
-//   command CAPTION ID NUMBER  sends the control a menu command; ID 0: the window, a command of
-//                                            its system menu
+//   window_driver rect CAPTION               prints where the window is: WIDTHxHEIGHT+LEFT+TOP
+//   window_driver open CAPTION ID OTHER      presses a button and prints where the other window is
+//   window_driver click CAPTION ID           presses a button once it takes input, and waits no longer
+//   window_driver wait-text CAPTION ID TEXT  until the control's text is TEXT
+//   window_driver wait-disabled CAPTION ID   until the control takes no input
+//   window_driver list CAPTION ID            prints the lines of a list box, in UTF-8
+//   window_driver tab CAPTION ID INDEX       turns to a page of a tab control
+//   window_driver command CAPTION ID NUMBER  sends the control a menu command; ID 0: the window one of its
+//                                            system menu
 //
 // The windows are looked for on the desktop that the environment variable WINDOW_DESKTOP names, by default
 // on that of the driver itself. Captions and texts are those in English; WINDOW_LANGUAGE ("de", "pt-BR")
@@ -146,22 +148,37 @@ bool RunOnControl(const std::wstring& verb, HWND dialog, int id, const std::wstr
     return false;
 }
 
+HWND AwaitDialog(const std::wstring& caption) {
+    HWND dialog = nullptr;
+    WaitUntil([&] { return (dialog = FindDialog(caption)) != nullptr; });
+    return dialog;
+}
+
+bool PrintPlace(HWND dialog) {
+    RECT place{};
+    if (!GetWindowRect(dialog, &place)) {
+        return false;
+    }
+    std::printf("%ldx%ld+%ld+%ld\n", place.right - place.left, place.bottom - place.top, place.left,
+                place.top);
+    return true;
+}
+
 bool Run(const std::wstring& verb, const std::wstring& caption, int id, const std::wstring& text) {
     if (verb == L"gone") {
         return WaitUntil([&] { return FindDialog(caption) == nullptr; });
     }
-    HWND dialog = nullptr;
-    if (!WaitUntil([&] { return (dialog = FindDialog(caption)) != nullptr; })) {
-        return false;
+    HWND dialog = AwaitDialog(caption);
+    if (dialog == nullptr || verb == L"wait") {
+        return dialog != nullptr;
     }
     if (verb == L"rect") {
-        RECT place{};
-        GetWindowRect(dialog, &place);
-        std::printf("%ldx%ld+%ld+%ld\n", place.right - place.left, place.bottom - place.top, place.left,
-                    place.top);
-        return true;
+        return PrintPlace(dialog);
     }
-    return verb == L"wait" || RunOnControl(verb, dialog, id, text);
+    if (verb == L"open") {
+        return RunOnControl(L"click", dialog, id, L"") && PrintPlace(AwaitDialog(text));
+    }
+    return RunOnControl(verb, dialog, id, text);
 }
 
 // Windows of another desktop are out of reach. Wine's virtual desktops are desktops of their own.
