@@ -8,7 +8,6 @@
 #include "app/sync_pass.h"
 #include "device/clock_check.h"
 #include "platform/paths.h"
-#include "platform/resources.h"
 #include "qelutils/xlate.h"
 #include "res/ids.h"
 #include "selection/job_table.h"
@@ -58,18 +57,14 @@ bool CanBeCancelled(RunState state) {
 }  // namespace
 
 CWendlowDlg::CWendlowDlg()
-    : Dialog(IDD_SYNC),
-      background_(CreateSolidBrush(kBackground)),
-      icon_(LoadIconW(ResourceModule(), MAKEINTRESOURCEW(IDI_APPLICATION_ICON))),
-      settings_(LoadSettings()) {}
+    : Dialog(IDD_SYNC), background_(CreateSolidBrush(kBackground)), settings_(LoadSettings()) {}
 
 bool CWendlowDlg::HasRunningWorker() const {
     return worker_ && WaitForSingleObject(worker_.Get(), 0) == WAIT_TIMEOUT;
 }
 
 bool CWendlowDlg::OnInitDialog() {
-    SendMessageW(Handle(), WM_SETICON, ICON_BIG, reinterpret_cast<LPARAM>(icon_));
-    SendMessageW(Handle(), WM_SETICON, ICON_SMALL, reinterpret_cast<LPARAM>(icon_));
+    icons_.Set(Handle(), IDI_APPLICATION_ICON);
     SetWindowTextW(Handle(), Xlate(L"Desktop-Mobile Device Synchronization").c_str());
     Enter(RunState::kIdle);
 
@@ -156,7 +151,10 @@ std::optional<LRESULT> CWendlowDlg::OnMessage(UINT message, WPARAM wparam, LPARA
         case WM_PAINT:
             return OnPaint() ? std::optional<LRESULT>(0) : std::nullopt;
         case WM_QUERYDRAGICON:
-            return reinterpret_cast<LRESULT>(icon_);
+            return reinterpret_cast<LRESULT>(icons_.Big());
+        case WM_DPICHANGED:
+            icons_.Set(Handle(), IDI_APPLICATION_ICON);
+            return std::nullopt;
         case WM_CTLCOLORMSGBOX:
         case WM_CTLCOLOREDIT:
         case WM_CTLCOLORLISTBOX:
@@ -176,7 +174,7 @@ bool CWendlowDlg::OnPaint() {
     RECT client{};
     GetClientRect(Handle(), &client);
     DrawIcon(dc, (client.right - GetSystemMetrics(SM_CXICON) + 1) / 2,
-             (client.bottom - GetSystemMetrics(SM_CYICON) + 1) / 2, icon_);
+             (client.bottom - GetSystemMetrics(SM_CYICON) + 1) / 2, icons_.Big());
     EndPaint(Handle(), &paint);
     return true;
 }

@@ -10,6 +10,7 @@
 #include "platform/handles.h"
 #include "settings/settings_store.h"
 #include "ui/dialog.h"
+#include "ui/screen.h"
 
 namespace orvane {
 
@@ -65,7 +66,7 @@ class CWendlowDlg : public ui::Dialog {
 
     bool stay_hidden_ = false;
     UniqueBrush background_;
-    HICON icon_;
+    ui::WindowIcons icons_;
     SyncSettings settings_;
     DeviceTreeReader device_tree_;
     bool reads_job_folders_ = false;  // All input is dropped.

@@ -6,7 +6,6 @@
 #include "device/clock_check.h"
 #include "device/connect.h"
 #include "platform/paths.h"
-#include "platform/resources.h"
 #include "platform/text_case.h"
 #include "qelutils/xlate.h"
 #include "res/ids.h"
@@ -14,7 +13,6 @@
 #include "transfer/copy_progress.h"
 #include "transfer/job_folders.h"
 #include "transfer/selected_copy.h"
-#include "ui/screen.h"
 #include "ui/waiting.h"
 
 namespace orvane {
@@ -123,9 +121,7 @@ bool CCeFileTransfDlg::OnKey(UINT key) {
 // The dialog is the program's only window, and has the button and icon that its owner would have.
 void CCeFileTransfDlg::ShowInTaskBar() {
     SetWindowLongPtrW(Handle(), GWL_EXSTYLE, GetWindowLongPtrW(Handle(), GWL_EXSTYLE) | WS_EX_APPWINDOW);
-    HICON icon = LoadIconW(ResourceModule(), MAKEINTRESOURCEW(IDI_APPLICATION_ICON));
-    SendMessageW(Handle(), WM_SETICON, ICON_BIG, reinterpret_cast<LPARAM>(icon));
-    SendMessageW(Handle(), WM_SETICON, ICON_SMALL, reinterpret_cast<LPARAM>(icon));
+    icons_.Set(Handle(), IDI_APPLICATION_ICON);
 }
 
 void CCeFileTransfDlg::SetUpList(Page& page) {
@@ -215,6 +211,11 @@ std::optional<LRESULT> CCeFileTransfDlg::OnMessage(UINT message, WPARAM wparam, 
             }
             OnListingReady(lparam == 0 ? kDevicePage : kPcPage);
             return 0;
+        case WM_DPICHANGED:
+            if (icons_.Big() != nullptr) {
+                icons_.Set(Handle(), IDI_APPLICATION_ICON);
+            }
+            return std::nullopt;
         case WM_SYSCOLORCHANGE:
             // Top-level windows alone are told.
             for (HWND control : {tabs_.Handle(), pages_[0].list.Handle(), pages_[1].list.Handle()}) {

@@ -14,6 +14,7 @@
 #include "transfer/candidates.h"
 #include "transfer/copy_progress.h"
 #include "ui/dialog.h"
+#include "ui/screen.h"
 
 namespace orvane {
 
@@ -110,6 +111,7 @@ class CCeFileTransfDlg : public ui::Dialog {
     const bool date_check_done_;
     DeviceTreeReader device_tree_;  // Its stop event serves all operations on the device.
     bool busy_ = false;
+    ui::WindowIcons icons_;  // When the dialog stands in for the main window; empty otherwise.
     int current_page_ = -1;
     CSTabCtrl tabs_;
     std::array<Page, 2> pages_;

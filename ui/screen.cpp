@@ -1,5 +1,9 @@
 #include "ui/screen.h"
 
+#include <utility>
+
+#include "platform/resources.h"
+
 namespace orvane::ui {
 
 int DpiOf(HWND window) {
@@ -16,6 +20,16 @@ int DpiOf(HWND window) {
     const int system_dpi = dc != nullptr ? GetDeviceCaps(dc, LOGPIXELSX) : 0;
     ReleaseDC(nullptr, dc);
     return system_dpi != 0 ? system_dpi : USER_DEFAULT_SCREEN_DPI;
+}
+
+void WindowIcons::Set(HWND window, int icon_id) {
+    // The window shows the new ones before the old ones go.
+    UniqueIcon big_icon = LoadOwnedIcon(icon_id, Scaled(32, DpiOf(window)));
+    UniqueIcon small_icon = LoadOwnedIcon(icon_id, Scaled(16, DpiOf(window)));
+    SendMessageW(window, WM_SETICON, ICON_BIG, reinterpret_cast<LPARAM>(big_icon.Get()));
+    SendMessageW(window, WM_SETICON, ICON_SMALL, reinterpret_cast<LPARAM>(small_icon.Get()));
+    big_ = std::move(big_icon);
+    small_ = std::move(small_icon);
 }
 
 bool HasHighContrast() {
