@@ -37,7 +37,7 @@ void Fill(HDC dc, const RECT& rect, COLORREF color) {
 }
 
 // The outline of the tick, in tenths of the box.
-constexpr std::array<POINT, 6> kTickOutline = {{{2, 4}, {4, 6}, {8, 2}, {8, 5}, {4, 9}, {2, 7}}};
+constexpr std::array<POINT, 7> kTickOutline = {{{2, 4}, {4, 6}, {8, 2}, {8, 5}, {5, 8}, {3, 8}, {2, 7}}};
 
 void DrawBox(HDC dc, const RECT& box, bool ticked, bool selected, int line) {
     const BoxColors colors = ColorsOfBox(selected);

@@ -356,7 +356,7 @@ TEST_F(TransferTest, AFullOrLostDeviceEndsTheCopy) {
         EXPECT_TRUE(WaitUntil([&] { return (box = GetLastActivePopup(run.Window())) != run.Window(); }));
         EXPECT_EQ(ui::WindowText(box), L"Copying File");
         EXPECT_EQ(ItemText(box, 0xFFFF), each.text);
-        run.Press(IDC_TRANSFER_REFRESH);
+        run.Press(IDC_TRANSFER_SYNCHRONIZE);  // Dropped.
         const Lines left = run.OnPcPage();
         Press(box, IDOK);
         EXPECT_TRUE(WaitUntil([&] { return GetLastActivePopup(run.Window()) == run.Window(); }));
