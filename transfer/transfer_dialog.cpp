@@ -416,15 +416,16 @@ std::vector<sFileDate> CCeFileTransfDlg::Chosen(const Page& page, bool ticked_on
     return files;
 }
 
-// Copies the files of one page to the other side. Without a device nothing happens. False when the user does
-// not want what follows: a stop question that is still open is waited for, but only if something follows.
+// Copies the files of one page to the other side. False when nothing may follow: the device is gone, or the
+// user does not want more. A stop question that is still open is waited for, but only if something follows.
 bool CCeFileTransfDlg::CopyFiles(int number, std::vector<sFileDate> files, bool more_follows) {
     if (files.empty()) {
         return true;
     }
     DeviceSession session(device_tree_.StopEvent());
     if (!session) {
-        return true;
+        TellEnd(XlateKey(L"Communication Error."));
+        return false;
     }
     Page& page = pages_[static_cast<std::size_t>(number)];
     const auto direction = static_cast<Direction>(number);
@@ -443,15 +444,13 @@ bool CCeFileTransfDlg::CopyFiles(int number, std::vector<sFileDate> files, bool 
     page.list.SetItems(page.candidates);
     ui::DropPendingInput();
     if (outcome.disk_full) {
-        // The progress window, which belongs to another thread, would cover the box.
-        SetForegroundWindow(Handle());
-        ui::ShowMessageBox(Handle(),
-                           Xlate(direction == Direction::kPcToDevice ? XlateKey(L"Device Disk Full!")
-                                                                     : XlateKey(L"PC Disk Full!")),
-                           MB_OK | MB_ICONINFORMATION, Xlate(L"Copying File"));
+        TellEnd(direction == Direction::kPcToDevice ? XlateKey(L"Device Disk Full!")
+                                                    : XlateKey(L"PC Disk Full!"));
+    } else if (outcome.connection_lost) {
+        TellEnd(XlateKey(L"Communication Error."));
     }
-    bool go_on = true;
-    if (more_follows) {
+    bool go_on = !outcome.connection_lost;
+    if (go_on && more_follows) {
         go_on = progress.MayGoOn();
         ui::DropPendingInput();  // What came while the question was open.
     }
@@ -459,6 +458,13 @@ bool CCeFileTransfDlg::CopyFiles(int number, std::vector<sFileDate> files, bool 
     session.Close();
     FinishCopy(page);
     return go_on;
+}
+
+// Why a copy came to its end ahead of time.
+void CCeFileTransfDlg::TellEnd(qel_text::TextKey text) {
+    // The progress window, which belongs to another thread, would cover the box.
+    SetForegroundWindow(Handle());
+    ui::ShowMessageBox(Handle(), Xlate(text), MB_OK | MB_ICONINFORMATION, Xlate(L"Copying File"));
 }
 
 void CCeFileTransfDlg::FinishCopy(Page& page) {

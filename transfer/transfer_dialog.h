@@ -10,6 +10,7 @@
 #include "controls/page_tab.h"
 #include "controls/record_list.h"
 #include "device/device_tree_reader.h"
+#include "qelutils/xlate.h"
 #include "settings/settings_store.h"
 #include "transfer/candidates.h"
 #include "transfer/copy_progress.h"
@@ -101,6 +102,7 @@ class CCeFileTransfDlg : public ui::Dialog {
     void ReadListings();
     std::vector<sFileDate> Chosen(const Page& page, bool ticked_only) const;
     bool CopyFiles(int number, std::vector<sFileDate> files, bool more_follows);
+    void TellEnd(qel_text::TextKey text);
     void FinishCopy(Page& page);
     bool AnyCandidates() const;
     Page* PageOfList(HWND list);
