@@ -223,7 +223,7 @@ bool CWendlowDlg::ReadJobFolders(JobTable& pc, JobTable& device) {
 }
 
 void CWendlowDlg::FillTask(JobTable pc, JobTable device) {
-    task_.cancelled = false;
+    task_.cancel.Reset();
     task_.pc = {std::move(pc), std::wstring(WithoutTrailingBackslashes(settings_.sync_path_dt))};
     task_.device = {std::move(device), std::wstring(WithoutTrailingBackslashes(settings_.sync_path_ce))};
     task_.types = SynchronizedTypes(settings_.types);
@@ -281,10 +281,7 @@ void CWendlowDlg::OnFileView() {
 }
 
 void CWendlowDlg::CancelRun() {
-    task_.cancelled = true;
-    if (const HANDLE event = task_.copy_cancel_event) {
-        SetEvent(event);
-    }
+    task_.cancel.Signal();
     Enter(RunState::kCancelled);
 }
 

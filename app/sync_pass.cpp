@@ -55,14 +55,14 @@ constexpr PassKind kToPc = {&SyncTask::device,
 // One run of a pass, on the worker's thread.
 class SyncPass {
   public:
-    SyncPass(SyncTask& task, const PassKind& kind, const CancelEvent& cancel)
+    SyncPass(SyncTask& task, const PassKind& kind)
         : task_(task),
           kind_(kind),
           source_(task.*kind.source),
           target_(task.*kind.target),
           folders_{task.pc.folder, task.device.folder},
           context_{kind.direction, Purpose::kPass, Session::kOwn,
-                   task.overwrite_bkp ? OldFile::kKept : OldFile::kReplaced, cancel},
+                   task.overwrite_bkp ? OldFile::kKept : OldFile::kReplaced, task.cancel},
           companions_{task.overwrite_old_files, task.types},
           index_(target_.listing.table, target_.listing.rows) {
         if (task_.overwrite_warn) {
@@ -75,13 +75,13 @@ class SyncPass {
     }
 
     PassEnd Run() {
-        for (std::int32_t row = 0; row < source_.listing.rows && !task_.cancelled; ++row) {
+        for (std::int32_t row = 0; row < source_.listing.rows && !task_.cancel.WasSignalled(); ++row) {
             const PassEnd end = HandleRow(static_cast<std::size_t>(row));
             if (end != PassEnd::kComplete) {
                 return end;
             }
         }
-        return task_.cancelled ? PassEnd::kCancelled : PassEnd::kComplete;
+        return task_.cancel.WasSignalled() ? PassEnd::kCancelled : PassEnd::kComplete;
     }
 
   private:
@@ -117,7 +117,8 @@ class SyncPass {
         }
         if (result != DeviceResult::kDone) {
             Report(kErrorInfoDisplay, Xlate(kind_.failure));
-            if (can_copy && !task_.cancelled && !IsDeviceThere(context_.cancel) && !task_.cancelled) {
+            // A cancelled run opens no session, which tells nothing of the connection.
+            if (can_copy && !IsDeviceThere(task_.cancel) && !task_.cancel.WasSignalled()) {
                 Report(kAddInfoDisplay, Xlate(L"Communication Error."));
                 return PassEnd::kConnectionLost;
             }
@@ -160,9 +161,7 @@ void RunPass(void* task, const PassKind& kind) noexcept {
     auto& sync_task = *static_cast<SyncTask*>(task);
     PassEnd end = PassEnd::kOutOfMemory;
     try {
-        const HANDLE event = NewManualResetEvent().Release();
-        sync_task.copy_cancel_event = event;
-        end = SyncPass(sync_task, kind, event).Run();
+        end = SyncPass(sync_task, kind).Run();
     } catch (...) {
         // Out of memory: what was copied stays.
     }

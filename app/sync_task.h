@@ -3,11 +3,11 @@
 
 #include <windows.h>
 
-#include <atomic>
 #include <string>
 #include <string_view>
 
 #include "jobs/file_types.h"
+#include "platform/cancel_event.h"
 #include "selection/job_table.h"
 #include "ui/report_queue.h"
 
@@ -41,16 +41,14 @@ struct SyncSide {
     std::wstring folder;
 };
 
-// One per dialog, reused by every synchronization. Everything but the atomics and the queue is filled by the
+// One per dialog, reused by every synchronization. Everything but the event and the queue is filled by the
 // dialog before a worker starts and only read by the worker.
 struct SyncTask {
     SyncSide pc;
     SyncSide device;
-    // Made anew by each worker when it starts, handed to all its device and file operations, signalled by
-    // "Cancel". Never closed: an operation of a cancelled worker may still look at an earlier one.
-    std::atomic<HANDLE> copy_cancel_event = nullptr;
-    // Read by the worker before each row.
-    std::atomic<bool> cancelled = false;
+    // Handed to all device and file operations of a run, looked at before each row, and signalled by
+    // "Cancel". Reset by the dialog before a run, when no worker lives.
+    CancelEvent cancel;
     FileTypes types;  // Those that take part.
     bool overwrite_old_files = false;
     bool overwrite_bkp = false;

@@ -1,5 +1,6 @@
 #include "copy/file_copy.h"
 
+#include "copy/content_copy.h"
 #include "copy/target_path.h"
 #include "device/connect.h"
 #include "device/remote_api.h"
@@ -9,50 +10,6 @@
 namespace orvane {
 
 namespace {
-
-constexpr DWORD kChunkBytes = 8192;
-
-// Writes all of it, in as many calls as the side wants: once also for a chunk of nothing. A Win32 code.
-DWORD WriteAll(const Side& to, HANDLE target, const BYTE* data, DWORD wanted) {
-    do {
-        DWORD written = 0;
-        if (!to.Write(target, data, wanted, written)) {
-            return to.LastError();
-        }
-        // No progress is no success, and a count beyond the chunk no count.
-        if (written > wanted || (written == 0 && wanted > 0)) {
-            return ERROR_WRITE_FAULT;
-        }
-        data += written;
-        wanted -= written;
-    } while (wanted > 0);
-    return ERROR_SUCCESS;
-}
-
-// Copies from where the source's handle stands to its end, which is a chunk shorter than asked for once
-// `size` bytes are reached; so a source of full chunks only ends with a chunk of 0 bytes. Neither handle is
-// closed.
-DeviceResult CopyChunks(const CopyContext& context, HANDLE source, HANDLE target, std::uint64_t size) {
-    BYTE chunk[kChunkBytes];
-    std::uint64_t copied = 0;
-    while (!context.cancel.IsSignalled()) {
-        DWORD read = 0;
-        // A count beyond the buffer is no count: the device's answers are not trusted.
-        if (!context.Source().Read(source, chunk, kChunkBytes, read) || read > kChunkBytes ||
-            (read == 0 && copied < size)) {
-            return DeviceResult::kFailed;
-        }
-        const DWORD error = WriteAll(context.Target(), target, chunk, read);
-        if (error != ERROR_SUCCESS) {
-            return error == ERROR_DISK_FULL ? DeviceResult::kDiskFull : DeviceResult::kFailed;
-        }
-        copied += read;
-        if (read < kChunkBytes && copied >= size) {
-            return DeviceResult::kDone;
-        }
-    }
-    return DeviceResult::kCancelled;
-}
 
 // All three times of the source; the present time where they cannot be read.
 FileTimes TimesOf(const Side& side, HANDLE source) {
@@ -201,7 +158,7 @@ CopyOutcome CopyToDevice(const FileToCopy& file, const CopyContext& context,
         return NotBegun();
     }
     DeviceResult result =
-        CopyChunks(context, source.Get(), target.Get(), static_cast<std::uint64_t>(size.QuadPart));
+        CopyContent(context, source.Get(), target.Get(), static_cast<std::uint64_t>(size.QuadPart));
     if (result == DeviceResult::kDone && !Date(context, file, times, source.Get(), target.Get())) {
         result = DeviceResult::kFailed;
     }
@@ -238,7 +195,7 @@ CopyOutcome CopyToPc(const FileToCopy& file, const CopyContext& context,
     if (context.purpose == Purpose::kManualView) {
         times = TimesOf(Side::Device(), source.Get());
     }
-    DeviceResult result = CopyChunks(context, source.Get(), target.Get(), file.size);
+    DeviceResult result = CopyContent(context, source.Get(), target.Get(), file.size);
     if (result == DeviceResult::kDone && !Date(context, file, times, source.Get(), target.Get())) {
         result = DeviceResult::kFailed;
     }

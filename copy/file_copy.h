@@ -1,4 +1,4 @@
-// Copies of single files between the PC and the device, in chunks of 8192 bytes on the device.
+// Copies of single files between the PC and the device.
 //
 // The promise, in both directions: a name never stands for part of a file, and nothing is replaced unseen.
 // - A copy is written beside its target under a name of its own (AsidePath), dated and closed there, and only
@@ -15,9 +15,8 @@
 //   goes and has the listed time, so that it is found newer the next time.
 // - A target that cannot be dated is not put in place: it would pass for a newer one.
 //
-// Paths are absolute; the device's must satisfy PathFits (copy/side.h), else the process ends. The cancel
-// event is looked at before the first chunk and polled after every full one. Any thread may copy; of two that
-// copy to one target at the same time the later one fails. Nothing is ever shown.
+// Paths are absolute; the device's must satisfy PathFits (copy/side.h), else the process ends. Any thread may
+// copy; of two that copy to one target at the same time the later one fails. Nothing is ever shown.
 //
 // Results: kDone; kCancelled when the event was found signalled (but kFailed when that was already so while
 // the copy connected); kDiskFull when a write failed with error 112; kFailed for all else.

@@ -33,6 +33,8 @@ class CancelEvent {
     void Signal();
     void Reset();
 
+    // Whether Signal was called; the event is not looked at.
+    bool WasSignalled() const { return signalled_; }
     // Looks at the event itself.
     bool IsSignalled() const;
     // The same for loops: true at once after Signal, at most kLookInterval late after SetEvent on the handle.

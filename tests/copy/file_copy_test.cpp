@@ -9,6 +9,7 @@
 #include "copy/target_path.h"
 #include "platform/handles.h"
 #include "tests/copy/copy_fixture.h"
+#include "tests/support/dialog_script.h"
 
 namespace orvane {
 namespace {
@@ -235,26 +236,28 @@ TEST_P(FileCopyTest, FullDeviceDiskIsTold) {
 }
 
 TEST_P(FileCopyTest, CancelledItLeavesTheOldFile) {
-    for (const bool at_start : {true, false}) {
+    enum class By { kAtStart, kProgram, kPlainEvent };
+    for (const By by : {By::kAtStart, By::kProgram, By::kPlainEvent}) {
         SetUpFiles();
-        WriteTextFile(source_, Content(1 << 20));
-        device_->Set(L"CALL_DELAY", at_start ? L"" : L"10");
+        content_ = Content(1 << 20);
+        WriteTextFile(source_, content_);
+        file_.size = content_.size();
+        device_->Set(L"CALL_DELAY", by == By::kAtStart ? L"" : L"10");
+        const std::wstring aside = AsidePath(target_);
         std::jthread canceller([&] {
-            WIN32_FILE_ATTRIBUTE_DATA data = {};
-            while (!at_start && data.nFileSizeLow < 3 * 8192) {
-                GetFileAttributesExW(AsidePath(target_).c_str(), GetFileExInfoStandard, &data);
-                Sleep(1);
-            }
-            cancel_.Signal();
+            testing::WaitUntil([&] { return by == By::kAtStart || Exists(aside); });
+            by == By::kPlainEvent ? static_cast<void>(SetEvent(cancel_.Handle())) : cancel_.Signal();
         });
-        if (at_start) {
+        if (by == By::kAtStart) {
             canceller.join();
         }
         // Of a copy that connects itself the connection ends first.
-        EXPECT_EQ(Run(), at_start && kind_.session == Session::kOwn ? kFailed : kCancelled);
+        EXPECT_EQ(Run(), by == By::kAtStart && kind_.session == Session::kOwn ? kFailed : kCancelled);
         EXPECT_TRUE(ReadTextFile(target_) == "old");
         ExpectNothingAside();
-        if (!at_start) {
+        // At the next chunk, or so soon that some are left of 128.
+        EXPECT_LT(device_->CallsOf(to_device_ ? L"CeWriteFile" : L"CeReadFile"), 100u);
+        if (by != By::kAtStart) {
             canceller.join();
         }
         cancel_.Reset();
