@@ -242,9 +242,6 @@ void CCeFileTransfDlg::OnRefresh() {
     }
     EnableItem(IDC_TRANSFER_COPY_ALL, false);
     EnableItem(IDC_TRANSFER_SYNCHRONIZE, AnyCandidates());
-    for (const Page& page : pages_) {
-        InvalidateRect(page.list.Handle(), nullptr, TRUE);
-    }
     UpdateData(false);
 }
 
