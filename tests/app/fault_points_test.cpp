@@ -170,6 +170,35 @@ TEST_P(FaultPoints, CostNoFile) {
     std::printf("%zu points\n", calls);
 }
 
+// What lies in a folder that cannot be read is neither missing nor older, and a link that leads back is no
+// second copy of the job folder.
+TEST_F(JobFolders, PcFoldersThatCannotBeReadArePassedOver) {
+    for (const wchar_t* name : {L"locked\\a.qvj", L"locked\\deep\\b.qvj", L"z.qvj"}) {
+        PutOnPc(name, 0, "on the PC");
+        PutOnDevice(name, 60, "newer on the device");
+    }
+    PutOnDevice(L"locked\\new.qvj");
+    PutOnPc(L"sub\\c.qvj", 0, "on the PC");
+    const bool has_link = MakeLink(OnPc(L"sub\\back"), pc_.Path());
+    const UniqueFile lock(CreateFileW(OnPc(L"locked").c_str(), FILE_LIST_DIRECTORY, 0, nullptr, OPEN_EXISTING,
+                                      FILE_FLAG_BACKUP_SEMANTICS, nullptr));
+    EXPECT_TRUE(Synchronize(pc_.Path(), /*backups=*/false));
+    EXPECT_EQ(ReadTextFile(OnPc(L"locked\\a.qvj")), "on the PC");
+    EXPECT_EQ(ReadTextFile(OnPc(L"locked\\deep\\b.qvj")), "on the PC");
+    EXPECT_FALSE(Exists(OnPc(L"locked\\new.qvj")));
+    EXPECT_EQ(ReadTextFile(OnPc(L"z.qvj")), "newer on the device");
+    EXPECT_EQ(ReadTextFile(OnDevice(L"sub\\c.qvj")), "on the PC");
+    EXPECT_FALSE(Exists(OnDevice(L"sub\\back")));
+    EXPECT_TRUE(has_link) << "no links to be had here";
+    DeleteFileW(OnPc(L"sub\\back").c_str());
+    RemoveDirectoryW(OnPc(L"sub\\back").c_str());
+    // The job folder itself.
+    const UniqueFile root(CreateFileW(pc_.Path().c_str(), FILE_LIST_DIRECTORY, 0, nullptr, OPEN_EXISTING,
+                                      FILE_FLAG_BACKUP_SEMANTICS, nullptr));
+    EXPECT_FALSE(ListPcJobFolder(pc_.Path()));
+    EXPECT_TRUE(ListPcJobFolder(OnPc(L"missing")));
+}
+
 INSTANTIATE_TEST_SUITE_P(Synchronization, FaultPoints,
                          ::testing::Values(Fault{L"FAIL_CALL", true}, Fault{L"FAIL_CALL", false},
                                            Fault{L"LOSE_CALL", true}, Fault{L"LOSE_CALL", false},
