@@ -38,9 +38,18 @@ constexpr const wchar_t* kRunning = L"Synchronization in progress...";
 constexpr const wchar_t* kCancelled = L"Sychronization cancelled";
 constexpr const wchar_t* kStart = L"Checking files...";
 
-TEST_F(SyncTest, ShowsHowFarARunIs) {
+std::atomic<int> announced{0};
+
+void CALLBACK CountAnnouncement(HWINEVENTHOOK, DWORD, HWND window, LONG object, LONG, DWORD, DWORD) {
+    announced += object == OBJID_CLIENT && GetDlgCtrlID(window) == IDC_SYNC_STATUS ? 1 : 0;
+}
+
+TEST_F(SyncTest, ShowsAndAnnouncesHowFarARunIs) {
     PutOnPc(L"a.qvj");
     PutOnDevice(L"b.txt");
+    const HWINEVENTHOOK hook =
+        SetWinEventHook(EVENT_OBJECT_NAMECHANGE, EVENT_OBJECT_NAMECHANGE, GetModuleHandleW(nullptr),
+                        CountAnnouncement, GetCurrentProcessId(), 0, WINEVENT_INCONTEXT);
     const SyncRun run;
     EXPECT_EQ(run.Button(), L"Exit");
     EXPECT_EQ(run.Status(), L"");
@@ -52,6 +61,8 @@ TEST_F(SyncTest, ShowsHowFarARunIs) {
     EXPECT_EQ(run.Log()[1], L"[Desktop to Mobile Device] File copy: \"\\a.qvj\"");
     EXPECT_EQ(run.Log()[2], L"[Mobile Device to Desktop] File copy: \"\\b.txt\"");
     EXPECT_EQ(TicksOf(LastWriteTime(OnPc(L"b.txt"))), TicksOf(noon_));
+    EXPECT_EQ(announced, 2);  // That it runs and that it is complete.
+    UnhookWinEvent(hook);
 }
 
 TEST_F(SyncTest, StartsAsAFileViewerOnRequest) {
@@ -171,24 +182,6 @@ TEST_F(SyncTest, DoesOneThingAtATime) {
     EXPECT_TRUE(WaitUntil([&] { return run.HasEnded(); }));
     EXPECT_LT(GetTickCount64() - left, 900U);
     device_.Set(L"CALL_DELAY", L"");
-}
-
-TEST_F(SyncTest, AnOpenQuestionHoldsUpTheNextStart) {
-    Setting(L"Overwrite_warn", L"1");
-    PutNewerOnPc(L"a.qvj");
-    const SyncRun run;
-    const auto question = [] { return Shown(L"Synchronization - Warning"); };
-    run.Press(IDC_SYNC_START);
-    EXPECT_TRUE(WaitUntil([&] { return question() != nullptr; }));
-    run.Press(IDC_SYNC_CANCEL_EXIT);
-    run.Press(IDC_SYNC_START);
-    EXPECT_EQ(run.Log(), Lines{kStart});
-
-    PostMessageW(question(), WM_COMMAND, IDOK, 0);
-    EXPECT_TRUE(WaitUntil([&] { return !run.HasWorker(); }));
-    const MessageBoxAnswerer answers({IDOK});
-    run.Synchronize();
-    EXPECT_EQ(ReadTextFile(OnDevice(L"a.qvj")), "newer");
 }
 
 // The window lives while the device is read, drops what is pressed, and can be closed.

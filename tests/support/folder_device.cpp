@@ -32,7 +32,6 @@ TraceLine ParseTraceLine(const std::wstring& text) {
             .sessions = std::stoul(columns[2]),
             .function = columns[3],
             .arguments = columns[4].empty() ? std::vector<std::wstring>() : SplitAt(columns[4], L" | "),
-            .result = std::stoull(columns[5], nullptr, 0),
             .error = std::stoul(columns[6], nullptr, 0)};
 }
 
@@ -47,29 +46,18 @@ FolderDevice::FolderDevice() : library_(LoadLibraryW(L"RAPI.DLL")) {
         ADD_FAILURE() << "RAPI.DLL of the folder device is not on the PATH";
         return;
     }
-    ClearAll();
     Set(L"ROOT", Root());
     HaveSettingsRead();
 }
 
 FolderDevice::~FolderDevice() {
-    ClearAll();
+    for (const std::wstring& name : set_) {
+        Clear(name);
+    }
     if (init_ != nullptr) {
         HaveSettingsRead();
     }
     FreeLibrary(library_);
-}
-
-void FolderDevice::ClearAll() {
-    wchar_t* const block = GetEnvironmentStringsW();
-    std::wstring_view text;
-    for (const wchar_t* entry = block; *entry != L'\0'; entry += text.size() + 1) {
-        text = entry;
-        if (text.starts_with(kPrefix)) {
-            SetEnvironmentVariableW(std::wstring(text.substr(0, text.find(L'='))).c_str(), nullptr);
-        }
-    }
-    FreeEnvironmentStringsW(block);
 }
 
 void FolderDevice::HaveSettingsRead() {
@@ -91,6 +79,7 @@ int FolderDevice::CloseSessions() {
 }
 
 void FolderDevice::Set(const std::wstring& name, const std::wstring& value) {
+    set_.insert(name);
     SetEnvironmentVariableW((std::wstring(kPrefix) + name).c_str(), value.c_str());
 }
 

@@ -9,6 +9,7 @@
 #include <windows.h>
 
 #include <cstdint>
+#include <set>
 #include <string>
 #include <string_view>
 #include <vector>
@@ -25,7 +26,6 @@ struct TraceLine {
     std::size_t sessions = 0;  // Of that thread, when the call ended.
     std::wstring function;     // "CeCreateFile".
     std::vector<std::wstring> arguments;
-    std::uint64_t result = 0;
     DWORD error = 0;  // A Win32 code or an HRESULT, 0 after a success.
 };
 
@@ -59,9 +59,9 @@ class FolderDevice {
     int CloseSessions();
 
   private:
-    void ClearAll();
     void HaveSettingsRead();
 
+    std::set<std::wstring> set_;  // The settings that are set.
     TempFolder root_;
     TempFolder aside_;  // Holds the registry and the trace, which are no files of the device.
     HMODULE library_;

@@ -5,7 +5,6 @@
 #include <functional>
 #include <stdexcept>
 #include <string>
-#include <utility>
 
 #include "ui/control.h"
 
@@ -21,7 +20,7 @@ using Handler = std::function<std::optional<LRESULT>(UINT)>;
 class TestDialog : public Dialog {
   public:
     TestDialog() : Dialog(30000) {}
-    HWND Control(int id) const { return Item(id); }
+    HWND Edit() const { return Item(kEdit); }
 
     Handler handler = [](UINT) { return std::nullopt; };
     std::wstring text;
@@ -42,11 +41,10 @@ class TestDialog : public Dialog {
 class TestControl : public Control {
   public:
     Handler handler = [](UINT) { return std::nullopt; };
-    Handler reflected = [](UINT) { return std::nullopt; };
 
   protected:
     std::optional<LRESULT> OnMessage(UINT message, WPARAM, LPARAM) override { return handler(message); }
-    std::optional<LRESULT> OnReflected(UINT message, WPARAM, LPARAM) override { return reflected(message); }
+    std::optional<LRESULT> OnReflected(UINT message, WPARAM, LPARAM) override { return handler(message); }
 };
 
 std::optional<LRESULT> Throw(UINT) {
@@ -81,48 +79,28 @@ TEST(Dialog, ExchangesDataAndEndsByItsButtons) {
     }
 }
 
-TEST(Control, GetsItsNotificationsBeforeTheDialog) {
+TEST(Control, HandlesItsMessagesAndItsNotificationsBeforeTheDialog) {
     TestDialog dialog;
     TestControl control;
     ASSERT_TRUE(dialog.Create());
-    HWND edit = dialog.Control(kEdit);
-    ASSERT_TRUE(control.Attach(edit));
-    int commands = 0;
-    dialog.handler = [&](UINT message) {
-        commands += message == WM_COMMAND ? 1 : 0;
-        return std::nullopt;
+    const auto code = [&] { return SendMessageW(dialog.Edit(), WM_GETDLGCODE, 0, 0); };
+    const auto notify = [&] {
+        NMHDR header{dialog.Edit(), kEdit, 1};
+        return SendMessageW(dialog.Handle(), WM_NOTIFY, kEdit, reinterpret_cast<LPARAM>(&header));
     };
-    SetWindowTextW(edit, L"a");
-    EXPECT_GT(std::exchange(commands, 0), 0) << "left to the dialog";
-    control.reflected = [](UINT message) { return message; };
-    SetWindowTextW(edit, L"b");
-    EXPECT_EQ(commands, 0);
-
-    NMHDR notify{edit, kEdit, 1};
-    const auto send = [&](UINT message, void* data) {
-        return SendMessageW(dialog.Handle(), message, kEdit, reinterpret_cast<LPARAM>(data));
-    };
-    EXPECT_EQ(send(WM_NOTIFY, &notify), WM_NOTIFY);
-    MEASUREITEMSTRUCT measure{ODT_MENU, kEdit, 0, 0, 0, 0};
-    EXPECT_EQ(send(WM_MEASUREITEM, &measure), 0) << "a menu's item of the control's number";
-    control.reflected = Throw;
-    EXPECT_EQ(send(WM_NOTIFY, &notify), 0);
-}
-
-TEST(Control, HandlesItsMessagesUntilItIsDetached) {
-    TestDialog dialog;
-    TestControl control;
-    ASSERT_TRUE(dialog.Create());
-    HWND edit = dialog.Control(kEdit);
-    const LRESULT system_answer = SendMessageW(edit, WM_GETDLGCODE, 0, 0);
-    ASSERT_TRUE(control.Attach(edit));
-    control.handler = Throw;
-    EXPECT_EQ(SendMessageW(edit, WM_GETDLGCODE, 0, 0), system_answer);
+    const LRESULT system_answer = code();
+    dialog.handler = [](UINT message) { return message == WM_NOTIFY ? std::optional(7) : std::nullopt; };
+    ASSERT_TRUE(control.Attach(dialog.Edit()));
+    EXPECT_EQ(notify(), 7) << "left to the dialog";
     control.handler = [](UINT) { return kWide; };
-    EXPECT_EQ(SendMessageW(edit, WM_GETDLGCODE, 0, 0), kWide);
-    control.Detach();
-    EXPECT_EQ(SendMessageW(edit, WM_GETDLGCODE, 0, 0), system_answer);
-    ASSERT_TRUE(control.Attach(edit));
+    EXPECT_EQ(notify(), kWide);
+    EXPECT_EQ(code(), kWide);
+    MEASUREITEMSTRUCT measure{ODT_MENU, kEdit, 0, 0, 0, 0};
+    EXPECT_EQ(SendMessageW(dialog.Handle(), WM_MEASUREITEM, kEdit, reinterpret_cast<LPARAM>(&measure)), 0)
+        << "a menu's item of the control's number";
+    control.handler = Throw;
+    EXPECT_EQ(notify(), 0);
+    EXPECT_EQ(code(), system_answer);
     dialog.Destroy();
     EXPECT_EQ(control.Handle(), nullptr);
 }
