@@ -10,7 +10,6 @@
 #include "platform/paths.h"
 #include "qelutils/xlate.h"
 #include "res/ids.h"
-#include "selection/job_table.h"
 #include "settings/options_dialog.h"
 #include "transfer/job_folders.h"
 #include "transfer/transfer_dialog.h"
@@ -199,27 +198,21 @@ void CWendlowDlg::OnSynchronize() {
     ShowStatus(StatusText(RunState::kRunning));
     JobTable pc;
     JobTable device;
-    if (!ReadJobFolders(pc, device)) {
+    reads_job_folders_ = true;
+    const ui::Waited waited =
+        ReadJobFolders(Handle(), settings_, device_tree_, XlateKey(L"failed to read from remote device."), pc,
+                       device, [] {});
+    reads_job_folders_ = false;
+    if (waited != ui::Waited::kDone) {
         ShowStatus({});
+        if (waited == ui::Waited::kClosed) {
+            Dialog::OnCancel();
+        }
         return;
     }
     FillTask(std::move(pc), std::move(device));
     ShowStart();
     StartWorker(SyncThreadDT2CE);
-}
-
-// False when there is nothing to start from. The user knows why, or wanted to leave: the dialog ends then.
-bool CWendlowDlg::ReadJobFolders(JobTable& pc, JobTable& device) {
-    const ui::WaitCursor wait;
-    reads_job_folders_ = true;
-    const ui::Waited waited =
-        orvane::ReadJobFolders(Handle(), settings_, device_tree_,
-                               XlateKey(L"failed to read from remote device."), pc, device, [] {});
-    reads_job_folders_ = false;
-    if (waited == ui::Waited::kClosed) {
-        Dialog::OnCancel();
-    }
-    return waited == ui::Waited::kDone;
 }
 
 void CWendlowDlg::FillTask(JobTable pc, JobTable device) {

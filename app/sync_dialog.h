@@ -49,7 +49,6 @@ class CWendlowDlg : public ui::Dialog {
     std::optional<LRESULT> OnCtlColor(UINT message, HDC dc);
 
     // A run from its start to its end.
-    bool ReadJobFolders(JobTable& pc, JobTable& device);
     void FillTask(JobTable pc, JobTable device);
     void ShowStart();
     void StartWorker(LPTHREAD_START_ROUTINE procedure);

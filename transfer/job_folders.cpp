@@ -34,7 +34,11 @@ ui::Waited ReadJobFolders(HWND dialog, SyncSettings& settings, DeviceTreeReader&
             build();
         }
     };
-    const ui::Waited waited = ui::RunAndPaint(read, reader.StopEvent(), DeviceTreeReader::kStackBytes);
+    ui::Waited waited = ui::Waited::kFailed;
+    {
+        const ui::WaitCursor wait;
+        waited = ui::RunAndPaint(read, reader.StopEvent(), DeviceTreeReader::kStackBytes);
+    }
     if (waited == ui::Waited::kClosed || (waited == ui::Waited::kDone && pc_read)) {
         return waited;
     }

@@ -234,8 +234,10 @@ TEST_F(SyncTest, SettingsOfTheFileViewHoldHereToo) {
     const SyncRun run;
     run.PressAndGoOn(IDC_SYNC_FILE_VIEW);
     const wchar_t* view = L"File Transfer - Copy From";
-    ASSERT_TRUE(WaitUntil(
-        [&] { return SendDlgItemMessageW(Shown(view), IDC_TRANSFER_PC_LIST, LVM_GETITEMCOUNT, 0, 0) == 2; }));
+    ASSERT_TRUE(WaitUntil([&] {  // Until it has listed what to copy.
+        return SendDlgItemMessageW(Shown(view), IDC_TRANSFER_PC_LIST, LVM_GETITEMCOUNT, 0, 0) == 2 &&
+               IsWindowEnabled(GetDlgItem(Shown(view), IDC_TRANSFER_SYNCHRONIZE));
+    }));
     PostMessageW(Shown(view), WM_COMMAND, IDC_TRANSFER_SETTINGS, 0);
     const wchar_t* options = L"Options";
     ASSERT_TRUE(WaitUntil([&] { return Shown(options) != nullptr; }));
