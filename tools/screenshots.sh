@@ -34,7 +34,7 @@ show_dialogs() {
   open "$main_window" 1010 "Options" options
   open "Options" 4 "Select Directory" folder_chooser
   close "Select Directory" 2
-  mkdir -p "$demo/device/Archive/"{001..200}  # So many that reading them can be seen.
+  mkdir -p "$demo/device/Archive/"{001..400}  # So many that reading them can be seen.
   open "Options" 3 "#1026" loading
   drive wait "Mobile Device Browse"
   picture device_browser "Mobile Device Browse"
