@@ -14,12 +14,15 @@ namespace orvane::bench {
 bool RunDecision(std::int32_t count, std::int32_t per_folder, int seconds_behind, int stride);
 
 // One synchronization by the real dialog, of the PC folder and the device's "\Jobs".
-bool RunSync(const std::wstring& pc_folder);
+bool RunSync(const std::wstring& pc_folder, bool with_backup);
 
 // Listing the device's "\Jobs" with all that lies below.
 bool RunListing();
 
 // What a user does with the lists of the real manual view.
 bool RunLists(const std::wstring& pc_folder);
+
+// Starts of the program itself, an executable's path, until its window is painted.
+bool RunStart(const std::wstring& program);
 
 }  // namespace orvane::bench

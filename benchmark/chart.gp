@@ -3,7 +3,7 @@
 set terminal pngcairo size 1100, 60 + 22 * count font "Liberation Sans,10"
 set output picture
 set datafile separator "\t"
-set title "Measured, in multiples of the most that is wanted (left of the line is good)"
+set title "In multiples of what is wanted (left is good)"
 set logscale x
 set xrange [0.001:*]
 set yrange [count:-1]

@@ -67,8 +67,8 @@ class DialogThread {
 };
 
 // Gives this process a registry of its own with settings for the two job folders: all types take part, older
-// files are overwritten, no backups, no questions.
-inline void UseBenchSettings(const std::wstring& pc_folder) {
+// files are overwritten, no questions.
+inline void UseBenchSettings(const std::wstring& pc_folder, bool with_backup) {
     HKEY key = nullptr;
     RegDeleteTreeW(HKEY_CURRENT_USER, L"Software\\orvane_bench");
     RegCreateKeyExW(HKEY_CURRENT_USER, L"Software\\orvane_bench", 0, nullptr, REG_OPTION_NON_VOLATILE,
@@ -82,7 +82,7 @@ inline void UseBenchSettings(const std::wstring& pc_folder) {
     set(L"SyncPath_CE", L"\\Jobs\\");
     set(L"Sync_qvj_files", L"1");
     set(L"Overwrite_old_files", L"1");
-    set(L"Overwrite_bkp", L"0");
+    set(L"Overwrite_bkp", with_backup ? L"1" : L"0");
     set(L"Overwrite_warn", L"0");
     set(L"Start_File_View", L"0");
 }

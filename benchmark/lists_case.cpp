@@ -119,7 +119,7 @@ class View {
 }  // namespace
 
 bool RunLists(const std::wstring& pc_folder) {
-    UseBenchSettings(pc_folder);
+    UseBenchSettings(pc_folder, /*with_backup=*/false);
     const View view;
     if (!view.IsUp() || view.Count(IDC_TRANSFER_DEVICE_LIST) == 0) {
         std::fputs("the manual view did not come up with its lists filled\n", stderr);
@@ -133,8 +133,11 @@ bool RunLists(const std::wstring& pc_folder) {
     constexpr int kInTickColumn = 440;
     for (int run = 0; run < kRuns; ++run) {
         JsonLine line;
+        if (run == 0) {
+            line.Add("first_fill_ms", Milliseconds(view.FillTicks()));
+        }
         line.Add("refresh_ms", view.Press(IDC_TRANSFER_REFRESH));
-        line.Add("fill_ms", Milliseconds(view.FillTicks()));
+        line.Add("refill_ms", Milliseconds(view.FillTicks()));
         line.Add("to_device_page_ms", view.SelectPage(kDevicePage));
         line.Add("select_all_ms", view.Press(IDC_TRANSFER_DEVICE_ALL));
         line.Add("select_none_ms", view.Press(IDC_TRANSFER_DEVICE_ALL));

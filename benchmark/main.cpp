@@ -16,8 +16,8 @@ bool Run(const std::vector<std::wstring>& arguments) {
     if (name == L"decision" && arguments.size() == 5) {
         return orvane::bench::RunDecision(number(1), number(2), number(3), number(4));
     }
-    if (name == L"sync" && arguments.size() == 2) {
-        return orvane::bench::RunSync(arguments[1]);
+    if (name == L"sync" && arguments.size() == 3) {
+        return orvane::bench::RunSync(arguments[1], number(2) != 0);
     }
     if (name == L"listing" && arguments.size() == 1) {
         return orvane::bench::RunListing();
@@ -25,8 +25,13 @@ bool Run(const std::vector<std::wstring>& arguments) {
     if (name == L"lists" && arguments.size() == 2) {
         return orvane::bench::RunLists(arguments[1]);
     }
-    std::fputs("decision COUNT PER_FOLDER SECONDS STRIDE | sync PC_FOLDER | listing | lists PC_FOLDER\n",
-               stderr);
+    if (name == L"start" && arguments.size() == 2) {
+        return orvane::bench::RunStart(arguments[1]);
+    }
+    std::fputs(
+        "decision COUNT PER_FOLDER SECONDS STRIDE | sync PC_FOLDER BACKUPS | listing | lists PC_FOLDER | "
+        "start PROGRAM\n",
+        stderr);
     return false;
 }
 

@@ -1,5 +1,6 @@
 # From the lines that the cases gave to the rows of the table: an array of
-# {row, name, unit, median, min, max, wanted}. `wanted` is the most that is wanted, null where nothing is.
+# {row, name, unit, median, min, max, wanted}. `wanted` is the most that is wanted, with `at_least` the least,
+# null where nothing is.
 # In: all lines as one array. $scale: the divisor of all sizes.
 
 def values($case; $metric): [.[] | select(.case == $case) | .[$metric] | select(. != null)];
@@ -10,6 +11,7 @@ def spread:
 def row($number; $name; $unit; $wanted; $values):
   ($values | spread) as $spread
   | if $spread == null then empty else {row: $number, name: $name, unit: $unit, wanted: $wanted} + $spread end;
+def at_least: . + {at_least: true};
 # Each value of one case by each of the other.
 def by_each($a; $b): [$a[] as $x | $b[] as $y | select($y != 0) | $x / $y];
 # One metric as a percentage of another, run by run.
@@ -56,20 +58,33 @@ def memory:
       [values("nothing \(size(40000))"; "peak_bytes")[] as $big
        | values("nothing \(size(10000))"; "peak_bytes")[] as $small | ($big - $small) / $more]);
 
-# The calls that the steps of a copy need, the mean of both ways: to the device a session with two folders to
-# create and a session with create, the chunks, three time calls (a first date while the file is not complete)
-# and close; from it a session with create, the chunks and close.
-def calls_needed($bytes): ($bytes / 8192 | floor + 1) as $chunks | ((2 + 2) + (2 + 1 + $chunks + 4) + (2 + 1 + $chunks + 1)) / 2;
+# The calls that the steps of a copy need. To the device: a session with its two folders to create; a session
+# with create, the chunks, two time calls, close and the move to its name. What is replaced is found and deleted
+# before that; what is kept is found, its backup's name looked up and taken. From the device: a session with open,
+# the chunks and close; what becomes of the PC's old file takes no call.
+def calls_needed($to; $bytes; $old):
+  ($bytes / 8192 | floor + 1) as $chunks
+  | if $to == "device" then (2 + 2) + (2 + 1 + $chunks + 2 + 1 + 1) + {new: 0, replaced: 2, kept: 3}[$old]
+    else 2 + 1 + $chunks + 1 end;
 # The calls of the listing that comes first are left out.
 def calls_per_file($case; $files):
   [.[] | select(.case == $case)
-   | (.remote_calls - .calls_CeFindAllFiles - .calls_CeRapiFreeBuffer - 2
-      - (.calls_CeRegOpenKeyEx // 0) - (.calls_CeRegQueryValueEx // 0) - (.calls_CeRegCloseKey // 0))
-     / (2 * $files)];
-def first($case; $files; $bytes; $what):
-  row("3"; "first synchronization, \($what) a side"; "ms"; null; values($case; "ms")),
-  row("3"; "  Remote API calls per file, \(calls_needed($bytes)) needed"; "calls"; calls_needed($bytes);
-      calls_per_file($case; $files)),
+   | (.remote_calls - .calls_CeFindAllFiles - (.calls_CeRapiFreeBuffer // 0) - 2
+      - (.calls_CeRegOpenKeyEx // 0) - (.calls_CeRegQueryValueEx // 0) - (.calls_CeRegCloseKey // 0)) / $files];
+def copy_calls:
+  . as $all
+  | (["device", "the device"], ["pc", "the PC"]) as [$to, $place]
+  | (["new", "Remote API calls of a copy to \($place): new file"], ["replaced", "  file replaced"],
+     ["kept", "  file replaced, with a backup"]) as [$old, $name]
+  | $all | row("3"; $name; "calls"; calls_needed($to; 1024; $old);
+      calls_per_file("calls \($to) \($old)"; 100 / $scale));
+
+# $looks: the share of looking whether cancelled that is wanted.
+def first($case; $files; $bytes; $what; $looks):
+  ([calls_needed("device", "pc"; $bytes; "new")] | add / 2) as $needed
+  | row("3"; "first synchronization, \($what) a side"; "ms"; null; values($case; "ms")),
+  row("3"; "  Remote API calls per file, \($needed) needed"; "calls"; $needed;
+      calls_per_file($case; 2 * $files)),
   row("3"; "  in Remote API calls"; "%"; null; percent($case; .remote_ms)),
   row("3"; "  in PC file calls"; "%"; null; percent($case; .pc_file_ms)),
   row("3"; "  in waits of the copy's steps"; "%"; null; percent($case; .wait_ms)),
@@ -78,7 +93,7 @@ def first($case; $files; $bytes; $what):
       percent($case; calls("CeRapiInitEx") + calls("CeRapiUninit") + calls("MsgWaitForMultipleObjects"))),
   row("3"; "  fixed: folder creation before each copy"; "%"; null;
       percent($case; calls("CeCreateDirectory") + calls("CreateDirectoryW"))),
-  row("3"; "  fixed: looking whether cancelled"; "%"; null; percent($case; calls("WaitForSingleObject"))),
+  row("3"; "  fixed: looking whether cancelled"; "%"; $looks; percent($case; calls("WaitForSingleObject"))),
   row("3"; "  fixed: chunks of 8192 bytes"; "%"; null;
       percent($case; calls("CeReadFile") + calls("CeWriteFile") + calls("ReadFile") + calls("WriteFile"))),
   row("3"; "  longest time without an answer"; "ms"; 100; values($case; "no_answer_ms"));
@@ -91,21 +106,30 @@ def latency:
     ($all | row("4"; "  by the time of the calls and waits"; "x"; 1.05;
         [.[] | select(.case == $case) | .ms / (.remote_ms + .pc_file_ms + .wait_ms)]));
 
+# A device whose listing alone takes seconds.
+def slow:
+  row("4"; "\(shown(50)) folders, each call 20 ms longer"; "ms"; null; values("slow calls"; "ms")),
+  row("4"; "  of that, both listings"; "ms"; null; values("slow calls"; "listing_ms")),
+  row("4"; "  longest time without an answer"; "ms"; 100; values("slow calls"; "no_answer_ms"));
+
 # The start of two Windows programs is taken out of xcopy's time, as ours does not begin with its start.
 def start: row("5"; "start of two Windows programs, taken out of xcopy's times"; "ms"; null; values("start xcopy"; "ms"));
-def instead($ours; $other; $what):
+# $wanted: {xcopy, rsync}, the least that is wanted; null where nothing is.
+def instead($case; $what; $wanted):
   . as $all
   | ("xcopy", "rsync") as $tool
   | (if $tool == "xcopy" then $all | values("start xcopy"; "ms") | spread.median // 0 else 0 end) as $start
-  | $all | row("5"; "\($tool), \($what), by ours"; "x"; null;
-      by_each([[values("\($other) \($tool)"; "ms")[] - $start, 0] | max]; values($ours; "ms")));
+  | $all | row("5"; "\($tool), \($what), by ours"; "x"; $wanted[$tool];
+      by_each([values("\($case) \($tool)"; "ms")[] | [. - $start, 0] | max]; values($case; "ms")))
+  | at_least;
 
 def lists:
   . as $all
   | (10000, 100000) as $n
   | "lists \(size($n))" as $case
   | ($all | row("6"; "manual view, \(shown($n)) entries a list: refresh, with both listings"; "ms"; null; values($case; "refresh_ms"))),
-    ( ["fill a list", "fill_ms", 500], ["tick all", "select_all_ms", 300], ["untick all", "select_none_ms", 300],
+    ( ["fill a list", "first_fill_ms", 500], ["refill it", "refill_ms", 500],
+      ["tick all", "select_all_ms", 300], ["untick all", "select_none_ms", 300],
       ["one tick", "tick_ms", 100], ["double click", "double_click_ms", 100],
       ["sort by date", "sort_by_date_ms", 500], ["sort by name", "sort_by_name_ms", 500],
       ["sort backwards", "sort_reverse_ms", 500], ["sort by tick", "sort_by_tick_ms", 500],
@@ -118,6 +142,8 @@ def listing:
   row("7"; "  calls per folder"; "calls"; 2; values("listing"; "calls_per_folder")),
   row("7"; "  outside of the calls"; "%"; null; values("listing"; "outside_percent"));
 
+def program_start: row("8"; "program's start to its painted window"; "ms"; 1000; values("start"; "painted_ms"));
+
 [
   decision("folders"; "folders of 100"),
   decision("one"; "one folder"),
@@ -125,13 +151,16 @@ def listing:
   row("1"; "decide \(shown(40000)) rows a side in another order, per row"; "us"; 2; values("decision strewn"; "us_per_row")),
   nothing,
   memory,
-  first("first small"; 1000 / $scale; 20480; "\(shown(1000)) files of 20 KB"),
-  first("first big"; 20 / $scale; 8388608; "\(shown(20)) files of 8 MB"),
+  first("first small"; 1000 / $scale; 20480; "\(shown(1000)) files of 20 KB"; null),
+  first("first big"; 20 / $scale; 8388608; "\(shown(20)) files of 8 MB"; 1),
+  copy_calls,
   latency,
+  slow,
   start,
-  instead("first small"; "first small"; "first copy of 20 KB files"),
-  instead("first big"; "first big"; "first copy of 8 MB files"),
-  instead("nothing \(size(10000))"; "nothing \(size(10000))"; "nothing to do"),
+  instead("first small"; "first copy of 20 KB files"; null),
+  instead("first big"; "first copy of 8 MB files"; {xcopy: 0.8, rsync: 1}),
+  instead("nothing \(size(10000))"; "nothing to do"; null),
   lists,
-  listing
+  listing,
+  program_start
 ]

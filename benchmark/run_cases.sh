@@ -4,13 +4,14 @@ work=$root/build/bench
 raw=$work/raw.jsonl
 windows_path() { printf 'Z:%s' "${1//\//\\}"; }
 
-# lay SIDE LETTER COUNT BYTES: files LETTER<number>.qvj in folders of 100, alike on every side.
+# lay SIDE LETTER COUNT BYTES [PER_FOLDER]: files LETTER<number>.qvj in folders of 100 or so many, alike on
+# every side.
 lay() {
-  local first number names folder
-  for ((first = 0; first < $3; first += 100)); do
-    folder=$work/$1/Jobs/site$((first / 100))
+  local first number names folder each=${5:-100}
+  for ((first = 0; first < $3; first += each)); do
+    folder=$work/$1/Jobs/site$((first / each))
     names=()
-    for ((number = first; number < first + 100 && number < $3; number++)); do
+    for ((number = first; number < first + each && number < $3; number++)); do
       names+=("$2$number.qvj")
     done
     mkdir -p "$folder"
@@ -19,7 +20,7 @@ lay() {
       if [ "$4" -gt 0 ]; then
         head -c "$4" "$work/noise" | tee "${names[@]}" >/dev/null
       fi
-      touch -d "2024-03-01 12:00 UTC + $((first / 100)) minutes" "${names[@]}"
+      touch -d "2024-03-01 12:00 UTC + $((first / each)) minutes" "${names[@]}"
     )
   done
 }
@@ -47,7 +48,8 @@ measure() {
       echo "$name: did not run to its end" >>"$work/errors.txt"
   done
 }
-measure_sync() { measure "$1" "$2" sync "$(windows_path "$work/pc/Jobs")\\"; }
+# measure_sync CASE RUNS [BACKUPS]
+measure_sync() { measure "$1" "$2" sync "$(windows_path "$work/pc/Jobs")\\" "${3:-0}"; }
 
 # on_one_processor COMMAND...: with Wine's server there as well. On two, each call of the server costs a
 # multiple as soon as the system wakes it on the other processor, from which on it stays there: mostly after
@@ -128,6 +130,42 @@ first_case() {
   measure_other "$1 rsync" 3 rsync_both
 }
 
+# Every copy with the same chunk of less than 8192 bytes: what differs is what becomes of the old file.
+call_cases() {
+  local to from old count
+  count=$(of_size 100)
+  for to in device pc; do
+    from=$([ $to = pc ] && echo device || echo pc)
+    for old in new replaced kept; do
+      clear_sides
+      lay $from f "$count" 1024
+      if [ $old != new ]; then
+        lay $to f "$count" 512
+        find "$work/$to" -name '*.qvj' -exec touch -d "2024-02-01 UTC" {} +
+      fi
+      measure_sync "calls $to $old" 1 $([ $old = kept ] && echo 1)
+      if [ "$(find "$work/$to" -name '*.qvj' -size 1024c | wc -l)" != "$count" ] ||
+        { [ $old = kept ] && [ "$(find "$work/$to" -name '*.001' -size 512c | wc -l)" != "$count" ]; }; then
+        echo "calls $to $old: not all files were copied" >>"$work/errors.txt"
+      fi
+    done
+  done
+}
+
+# A device that is slow enough for its listing alone to take seconds, with some files to copy.
+slow_cases() {
+  local count side
+  count=$(of_size 50)
+  clear_sides
+  for side in pc device; do
+    lay $side s $((2 * count)) 0 2
+  done
+  lay pc p 8 1024
+  lay device d 8 1024
+  local before_each=take_back
+  FOLDER_DEVICE_CALL_DELAY=20 measure_sync "slow calls" 3
+}
+
 latency_cases() {
   local delay
   clear_sides
@@ -153,6 +191,12 @@ list_cases() {
   measure listing 1 listing
 }
 
+start_cases() {
+  clear_sides
+  tools/settings.sh SyncPath_DT "${work////\\}/pc/Jobs/" SyncPath_CE /Jobs/ Start_File_View 0
+  measure "start" 1 start "$(windows_path "$release/orvanelink.exe")"
+}
+
 all_cases() {
   mkdir -p "$work"
   rm -f "$raw" "$work/errors.txt"
@@ -161,7 +205,10 @@ all_cases() {
   nothing_cases
   first_case "first small" "$(of_size 1000)" 20480
   first_case "first big" "$(of_size 20)" 8388608
+  call_cases
   latency_cases
+  slow_cases
   list_cases
+  start_cases
   rm -rf "$work/pc" "$work/device" "$work/noise"
 }

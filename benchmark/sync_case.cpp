@@ -47,7 +47,7 @@ PROCESS_MEMORY_COUNTERS Memory() {
     return counters;
 }
 
-// Watches a synchronization from outside while another thread presses the button.
+// Watches a synchronization from outside: made right before another thread presses the button.
 class Watcher {
   public:
     explicit Watcher(const SyncThread& dialog)
@@ -85,15 +85,11 @@ class Watcher {
         }
     }
 
-    // The window's thread works for the workers alone from the moment the button shows "Cancel". A message
-    // that is still unanswered at the end has waited until the end: what follows is a sleep by design.
+    // A message that is still unanswered at the end has waited until the end: what follows is a sleep by
+    // design.
     void ProbeAnswers() {
         while (complete_ == 0 && !given_up_) {
             const LONGLONG sent = Now();
-            if (work_start_ == 0) {
-                Sleep(1);
-                continue;
-            }
             DWORD_PTR result = 0;
             SendMessageTimeoutW(dialog_.Window(), WM_NULL, 0, 0, SMTO_NORMAL, 60'000, &result);
             const LONGLONG end = complete_;
@@ -126,9 +122,9 @@ void AddCounts(JsonLine& line, const CallCounts& counts) {
 
 }  // namespace
 
-bool RunSync(const std::wstring& pc_folder) {
+bool RunSync(const std::wstring& pc_folder, bool with_backup) {
     InstallCallTimer();
-    UseBenchSettings(pc_folder);
+    UseBenchSettings(pc_folder, with_backup);
     RegisterDialogClass();
     SyncThread dialog;
     if (dialog.HasEnded()) {
