@@ -5,7 +5,6 @@
 #include <thread>
 
 #include "copy/entry_copy.h"
-#include "copy/target_folder.h"
 #include "platform/handles.h"
 #include "tests/copy/copy_fixture.h"
 #include "tests/support/dialog_script.h"
@@ -148,17 +147,6 @@ TEST_P(CompanionTest, CancelledItHoldsUpItsJobFile) {
     EXPECT_NE(Run(), kDone);
     EXPECT_LT(ListTree(Target(L"job")).size(), 20U);
     EXPECT_FALSE(Exists(Target(L"job.wkf")));
-}
-
-TEST_F(CopyTest, FoldersAreMadeWithTheirParents) {
-    EXPECT_TRUE(EnsureDeviceFolder(L"\\x\\y\\z\\\\", cancel_));
-    EXPECT_TRUE(Exists(OnDevice(L"x\\y\\z")));
-    EXPECT_EQ(device_->CallsOf(L"CeCreateDirectory"), 3u);
-    ExpectBalancedSessions();
-    EnsurePcFolder(pc_->Path() + L"\\x\\y\\z\\\\");
-    EXPECT_TRUE(Exists(OnPc(L"x\\y\\z")));
-    EnsurePcFolder(L"");
-    EnsurePcFolder(OnPc(std::wstring(260, L'x')));
 }
 
 }  // namespace
