@@ -286,8 +286,7 @@ TEST_F(SyncTest, TwentyRunsLeaveNoHandlesBehind) {
         EXPECT_TRUE(Exists(OnDevice(L"new_0.qvj")) && Exists(OnPc(L"a.txt"))) << i;
     }
     GetProcessHandleCount(GetCurrentProcess(), &after);
-    // Each run keeps the two cancel events of its passes.
-    EXPECT_LE(after, before + 2 * 20);
+    EXPECT_LE(after, before + 2);
 }
 
 TEST_F(SyncTest, ShowsTheAboutBoxFromTheSystemMenu) {
