@@ -5,7 +5,6 @@
 #include <windows.h>
 
 #include <algorithm>
-#include <iterator>
 #include <optional>
 #include <string>
 #include <string_view>
@@ -30,7 +29,6 @@ class FolderDeviceTest : public ::testing::Test {
         if (FAILED(result)) {
             return result;
         }
-        // The test's longest delay is far shorter.
         EXPECT_EQ(WaitForSingleObject(record.init_event, 5000), WAIT_OBJECT_0);
         return record.init_result;
     }
@@ -60,8 +58,7 @@ class FolderDeviceTest : public ::testing::Test {
             return std::nullopt;
         }
         StringList names;
-        std::transform(found, found + count, std::back_inserter(names),
-                       [](const rapi::FindData& entry) { return entry.name; });
+        std::for_each(found, found + count, [&](const auto& entry) { names.push_back(entry.name); });
         std::sort(names.begin(), names.end());
         EXPECT_EQ(CeRapiFreeBuffer(found), S_OK);
         return names;
