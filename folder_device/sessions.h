@@ -34,7 +34,7 @@ class Sessions {
         record.init_event = event.Get();
         record.init_result = result;
         const std::scoped_lock lock(mutex_);
-        sessions_.push_back({GetCurrentThreadId(), std::move(event), result});
+        sessions_.push_back({.thread = GetCurrentThreadId(), .event = std::move(event), .result = result});
         return true;
     }
     // Ends the youngest one; false when there is none.
@@ -58,11 +58,10 @@ class Sessions {
         return static_cast<std::size_t>(std::count_if(sessions_.begin(), sessions_.end(), OfThisThread));
     }
     // Whether the connection of one of them has come about.
-    bool IsConnected() const {
+    bool IsConnected() {
         const std::scoped_lock lock(mutex_);
-        return std::any_of(sessions_.begin(), sessions_.end(), [](const Session& session) {
-            return OfThisThread(session) && SUCCEEDED(session.result) &&
-                   orvane::IsSignalled(session.event.Get());
+        return std::any_of(sessions_.begin(), sessions_.end(), [](Session& session) {
+            return OfThisThread(session) && SUCCEEDED(session.result) && HasComeAbout(session);
         });
     }
     bool AnyInProcess() const {
@@ -75,7 +74,13 @@ class Sessions {
         DWORD thread;
         orvane::UniqueEvent event;
         HRESULT result;
+        bool has_come_about = false;
     };
+    // A look at the event costs more than many a call: it is left out once a connection has come about.
+    static bool HasComeAbout(Session& session) {
+        session.has_come_about = session.has_come_about || orvane::IsSignalled(session.event.Get());
+        return session.has_come_about;
+    }
     static bool OfThisThread(const Session& session) { return session.thread == GetCurrentThreadId(); }
 
     mutable std::mutex mutex_;
