@@ -28,7 +28,8 @@ namespace orvane {
 DeviceResult ListDeviceFolder(const std::wstring& folder, std::span<const std::wstring> extensions,
                               bool recursive, FileNode& root, const CancelEvent& cancel);
 
-// Lists all entries of one folder, without what lies below, not to be cancelled.
+// Lists all entries of one folder, without what lies below, not to be cancelled. Of no use to the program
+// now, which lists companion folders as whole trees.
 DeviceResult ListDeviceFolderFlat(const std::wstring& folder, FileNode& root);
 
 // Whether a filter keeps a file of that name. `extensions` are extensions without the dot, compared without

@@ -289,15 +289,6 @@ TEST_F(SyncTest, TwentyRunsLeaveNoHandlesBehind) {
     EXPECT_LE(after, before + 2);
 }
 
-TEST_F(SyncTest, ShowsTheAboutBoxFromTheSystemMenu) {
-    const SyncRun run;
-    PostMessageW(run.Window(), WM_SYSCOMMAND, IDM_ABOUT, 0);
-    const auto about = [] { return Shown(L"About Orvanelink"); };
-    ASSERT_TRUE(WaitUntil([&] { return about() != nullptr; }));
-    PostMessageW(about(), WM_COMMAND, IDOK, 0);
-    EXPECT_TRUE(WaitUntil([&] { return about() == nullptr; }));
-}
-
 TEST_F(SyncTest, AsksAboutClocksThatDiffer) {
     device_.Set(L"CLOCK_OFFSET", L"180");
     const MessageBoxAnswerer answers({IDCANCEL, IDOK});

