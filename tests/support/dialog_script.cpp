@@ -3,7 +3,8 @@
 #include <gtest/gtest.h>
 
 #include <algorithm>
-#include <array>
+#include <iterator>
+#include <string_view>
 #include <thread>
 
 #include "ui/dialog.h"
@@ -12,43 +13,43 @@ namespace orvane::testing {
 
 namespace {
 
-BOOL CALLBACK AddDialog(HWND window, LPARAM dialogs) {
-    if (IsVisibleDialog(window)) {
-        reinterpret_cast<std::vector<HWND>*>(dialogs)->push_back(window);
-    }
-    return TRUE;
-}
-
-std::vector<HWND> DialogsOfThread(DWORD thread) {
+// From the topmost to the lowest. A snapshot: going from one window to the next would end where one has just
+// been closed.
+std::vector<HWND> VisibleDialogs() {
     std::vector<HWND> dialogs;
-    EnumThreadWindows(thread, AddDialog, reinterpret_cast<LPARAM>(&dialogs));
+    const auto look_at = [](HWND window, LPARAM found) -> BOOL {
+        DWORD process = 0;
+        GetWindowThreadProcessId(window, &process);
+        wchar_t name[16] = {};
+        GetClassNameW(window, name, static_cast<int>(std::size(name)));
+        if (process == GetCurrentProcessId() && IsWindowVisible(window) &&
+            name == std::wstring_view(L"#32770")) {
+            reinterpret_cast<std::vector<HWND>*>(found)->push_back(window);
+        }
+        return TRUE;
+    };
+    EnumWindows(look_at, reinterpret_cast<LPARAM>(&dialogs));
     return dialogs;
 }
 
-// The dialog that all others of the thread stand on.
-HWND FindFirst(DWORD thread) {
-    const std::vector<HWND> dialogs = DialogsOfThread(thread);
-    const auto found = std::find_if(dialogs.begin(), dialogs.end(), [&dialogs](HWND dialog) {
-        return std::find(dialogs.begin(), dialogs.end(), GetWindow(dialog, GW_OWNER)) == dialogs.end();
-    });
-    return found != dialogs.end() ? *found : nullptr;
+std::vector<HWND> DialogsOfThread(DWORD thread) {
+    std::vector<HWND> dialogs = VisibleDialogs();
+    std::erase_if(dialogs,
+                  [thread](HWND dialog) { return GetWindowThreadProcessId(dialog, nullptr) != thread; });
+    return dialogs;
 }
 
 }  // namespace
 
 INT_PTR RunWithScript(const std::function<INT_PTR()>& modal, const std::function<void(HWND)>& script) {
-    const DWORD thread = GetCurrentThreadId();
-    std::thread runner([thread, &script] {
-        HWND dialog = nullptr;
-        if (!WaitUntil([&] { return (dialog = FindFirst(thread)) != nullptr; })) {
-            ADD_FAILURE() << "the dialog does not show";
-            return;
+    std::thread runner([thread = GetCurrentThreadId(), &script] {
+        std::vector<HWND> open;
+        EXPECT_TRUE(WaitUntil([&] { return !(open = DialogsOfThread(thread)).empty(); }));
+        if (!open.empty()) {
+            script(open.back());  // A window is always below those it owns.
         }
-        script(dialog);
-        while (IsWindow(dialog) && IsWindowVisible(dialog)) {
-            for (HWND open : DialogsOfThread(thread)) {
-                PostMessageW(open, WM_CLOSE, 0, 0);
-            }
+        while (!(open = DialogsOfThread(thread)).empty()) {
+            PostMessageW(open.front(), WM_CLOSE, 0, 0);
             Sleep(20);
         }
     });
@@ -57,10 +58,10 @@ INT_PTR RunWithScript(const std::function<INT_PTR()>& modal, const std::function
     return result;
 }
 
-bool IsVisibleDialog(HWND window) {
-    std::array<wchar_t, 16> name{};
-    GetClassNameW(window, name.data(), static_cast<int>(name.size()));
-    return IsWindowVisible(window) && std::wstring(name.data()) == L"#32770";
+HWND FindDialog(const std::function<bool(HWND)>& matches) {
+    const std::vector<HWND> dialogs = VisibleDialogs();
+    const auto found = std::find_if(dialogs.begin(), dialogs.end(), matches);
+    return found != dialogs.end() ? *found : nullptr;
 }
 
 std::vector<HWND> DialogsBeside(HWND window) {

@@ -1,4 +1,4 @@
-// Running a modal dialog on the test's thread while a script on another thread uses it.
+// The dialogs of the test process as a user sees them, and a script that uses a modal one.
 #pragma once
 
 #include <windows.h>
@@ -13,8 +13,8 @@ namespace orvane::testing {
 // as that dialog can be seen. Dialogs that the script leaves open are closed. Returns what `modal` returns.
 INT_PTR RunWithScript(const std::function<INT_PTR()>& modal, const std::function<void(HWND)>& script);
 
-// Whether it is a dialog, or a message box, that can be seen.
-bool IsVisibleDialog(HWND window);
+// The topmost visible dialog or message box of this process that matches, null when there is none.
+HWND FindDialog(const std::function<bool(HWND)>& matches);
 // The visible dialogs of the window's thread, the window itself among them.
 std::vector<HWND> DialogsBeside(HWND window);
 

@@ -20,8 +20,6 @@ class DialogThread {
     template <class... Arguments>
     explicit DialogThread(Arguments... arguments) : thread_([this, arguments...] { Run(arguments...); }) {}
     ~DialogThread() { Result(); }
-    DialogThread(const DialogThread&) = delete;
-    DialogThread& operator=(const DialogThread&) = delete;
 
     // Returns when the dialog has been initialised or has ended.
     void WaitUntilOpen() const {

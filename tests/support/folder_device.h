@@ -35,8 +35,6 @@ class FolderDevice {
     // setting, and has it read them. The destructor does the same without a root and removes the folder.
     FolderDevice();
     ~FolderDevice();
-    FolderDevice(const FolderDevice&) = delete;
-    FolderDevice& operator=(const FolderDevice&) = delete;
 
     // Sets FOLDER_DEVICE_<name> (see docs/folder_device.md), for the next session.
     void Set(const std::wstring& name, const std::wstring& value);

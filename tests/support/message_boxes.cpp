@@ -19,16 +19,6 @@ bool IsMessageBox(HWND window) {
            module == GetModuleHandleW(L"user32.dll");
 }
 
-BOOL CALLBACK FindBox(HWND window, LPARAM found) {
-    DWORD process = 0;
-    GetWindowThreadProcessId(window, &process);
-    if (process != GetCurrentProcessId() || !IsVisibleDialog(window) || !IsMessageBox(window)) {
-        return TRUE;
-    }
-    *reinterpret_cast<HWND*>(found) = window;
-    return FALSE;
-}
-
 SeenMessageBox Describe(HWND box) {
     SeenMessageBox seen{.caption = ui::WindowText(box), .owner = GetWindow(box, GW_OWNER)};
     for (HWND child = GetWindow(box, GW_CHILD); child != nullptr; child = GetWindow(child, GW_HWNDNEXT)) {
@@ -61,30 +51,21 @@ std::vector<SeenMessageBox> MessageBoxAnswerer::Seen() const {
 }
 
 void MessageBoxAnswerer::Run() {
-    while (!stop_) {
-        HWND box = nullptr;
-        EnumWindows(FindBox, reinterpret_cast<LPARAM>(&box));
-        if (box != nullptr) {
-            Answer(box);
+    for (; !stop_; Sleep(10)) {
+        HWND box = FindDialog(IsMessageBox);
+        if (box == nullptr) {
+            continue;
         }
-        Sleep(10);
-    }
-}
-
-void MessageBoxAnswerer::Answer(HWND box) {
-    const SeenMessageBox seen = Describe(box);
-    int button = seen.default_button;
-    {
-        const std::lock_guard lock(mutex_);
-        if (seen_.size() < answers_.size() && GetDlgItem(box, answers_[seen_.size()]) != nullptr) {
-            button = answers_[seen_.size()];
-        }
+        const SeenMessageBox seen = Describe(box);
+        std::unique_lock lock(mutex_);
+        const int wanted = seen_.size() < answers_.size() ? answers_[seen_.size()] : 0;
         seen_.push_back(seen);
-    }
-    Press(box, button);
-    // Until the box has taken the answer it would be found again.
-    while (IsWindow(box) && IsWindowVisible(box) && !stop_) {
-        Sleep(10);
+        lock.unlock();
+        Press(box, GetDlgItem(box, wanted) != nullptr ? wanted : seen.default_button);
+        // Until the box has taken the answer it would be found again.
+        while (IsWindow(box) && IsWindowVisible(box) && !stop_) {
+            Sleep(10);
+        }
     }
 }
 

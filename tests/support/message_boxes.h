@@ -26,15 +26,12 @@ class MessageBoxAnswerer {
   public:
     explicit MessageBoxAnswerer(std::vector<int> answers = {});
     ~MessageBoxAnswerer();
-    MessageBoxAnswerer(const MessageBoxAnswerer&) = delete;
-    MessageBoxAnswerer& operator=(const MessageBoxAnswerer&) = delete;
 
     // The boxes answered so far, in their order.
     std::vector<SeenMessageBox> Seen() const;
 
   private:
     void Run();
-    void Answer(HWND box);
 
     const std::vector<int> answers_;
     mutable std::mutex mutex_;

@@ -1,6 +1,7 @@
 // A registry of its own for one test.
 #pragma once
 
+#include <gtest/gtest.h>
 #include <windows.h>
 
 namespace orvane::testing {
@@ -9,10 +10,30 @@ namespace orvane::testing {
 // process, so that tests neither find nor leave settings in the real ones. One at a time.
 class ScratchRegistry {
   public:
-    ScratchRegistry();
-    ~ScratchRegistry();
+    ScratchRegistry() {
+        RegDeleteTreeW(HKEY_CURRENT_USER, kKey);  // Of a test program that was ended.
+        // The current user's root comes last, since the scratch keys lie below the real one.
+        for (HKEY root : {HKEY_LOCAL_MACHINE, HKEY_CURRENT_USER}) {
+            HKEY key = nullptr;
+            EXPECT_EQ(RegCreateKeyW(HKEY_CURRENT_USER,
+                                    root == HKEY_CURRENT_USER ? L"Software\\orvane_test\\user"
+                                                              : L"Software\\orvane_test\\machine",
+                                    &key),
+                      ERROR_SUCCESS);
+            EXPECT_EQ(RegOverridePredefKey(root, key), ERROR_SUCCESS);
+            RegCloseKey(key);
+        }
+    }
+    ~ScratchRegistry() {
+        EXPECT_EQ(RegOverridePredefKey(HKEY_CURRENT_USER, nullptr), ERROR_SUCCESS);
+        EXPECT_EQ(RegOverridePredefKey(HKEY_LOCAL_MACHINE, nullptr), ERROR_SUCCESS);
+        EXPECT_EQ(RegDeleteTreeW(HKEY_CURRENT_USER, kKey), ERROR_SUCCESS);
+    }
     ScratchRegistry(const ScratchRegistry&) = delete;
     ScratchRegistry& operator=(const ScratchRegistry&) = delete;
+
+  private:
+    static constexpr const wchar_t* kKey = L"Software\\orvane_test";
 };
 
 }  // namespace orvane::testing

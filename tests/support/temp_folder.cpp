@@ -9,6 +9,7 @@
 #include <fstream>
 #include <iterator>
 
+#include "platform/file_time.h"
 #include "platform/handles.h"
 
 namespace orvane::testing {
@@ -50,9 +51,8 @@ TempFolder::TempFolder() {
     static const std::wstring run =
         std::to_wstring(GetCurrentProcessId()) + L"_" +
         std::to_wstring(std::chrono::system_clock::now().time_since_epoch().count()) + L"_";
-    const fs::path folder = fs::temp_directory_path() / (L"orvane_test_" + run + std::to_wstring(++count));
-    EXPECT_TRUE(fs::create_directories(folder));
-    path_ = folder.wstring();
+    path_ = fs::temp_directory_path() / (L"orvane_test_" + run + std::to_wstring(++count));
+    EXPECT_TRUE(fs::create_directories(path_));
 }
 
 TempFolder::~TempFolder() {
@@ -104,10 +104,7 @@ bool MakeLink(const std::wstring& path, const std::wstring& target) {
 
 std::optional<std::string> ReadTextFile(const std::wstring& path) {
     std::ifstream file(fs::path(path), std::ios::binary);
-    if (!file) {
-        return std::nullopt;
-    }
-    return std::string(std::istreambuf_iterator<char>(file), {});
+    return file ? std::optional(std::string(std::istreambuf_iterator<char>(file), {})) : std::nullopt;
 }
 
 bool Exists(const std::wstring& path) {
@@ -132,11 +129,11 @@ std::vector<std::wstring> ListTree(const std::wstring& folder) {
 }
 
 FILETIME FileTimeOf(ULONGLONG ticks) {
-    return {static_cast<DWORD>(ticks & 0xFFFFFFFFU), static_cast<DWORD>(ticks >> 32U)};
+    return LaterBy({}, static_cast<std::int64_t>(ticks));
 }
 
 ULONGLONG TicksOf(const FILETIME& time) {
-    return (static_cast<ULONGLONG>(time.dwHighDateTime) << 32U) | time.dwLowDateTime;
+    return static_cast<ULONGLONG>(FileTimeTicks(time));
 }
 
 FILETIME UtcTime(int year, int month, int day, int hour, int minute, int second) {
@@ -148,7 +145,7 @@ FILETIME UtcTime(int year, int month, int day, int hour, int minute, int second)
 }
 
 FILETIME AddSeconds(const FILETIME& time, int seconds) {
-    return FileTimeOf(TicksOf(time) + static_cast<ULONGLONG>(static_cast<LONGLONG>(seconds) * 10'000'000));
+    return LaterBy(time, seconds * 10'000'000LL);
 }
 
 }  // namespace orvane::testing

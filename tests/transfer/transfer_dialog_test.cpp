@@ -36,32 +36,28 @@ struct TransferRun : DialogThread<TestedDialog> {
     }
 
     bool IsEnabled(int id) const { return IsWindowEnabled(Item(id)) != FALSE; }
-    bool IsChecked(int id) const { return SendMessageW(Item(id), BM_GETCHECK, 0, 0) == BST_CHECKED; }
     // The texts of a list's column, from top to bottom.
     Lines Column(int list_id, int column = 0) const {
-        Lines texts(static_cast<std::size_t>(SendMessageW(Item(list_id), LVM_GETITEMCOUNT, 0, 0)));
-        for (std::size_t row = 0; row < texts.size(); ++row) {
+        HWND list = Item(list_id);
+        Lines texts(static_cast<std::size_t>(ListView_GetItemCount(list)));
+        for (int row = 0; row < std::ssize(texts); ++row) {
             wchar_t text[512] = {};
-            LVITEMW item{};
-            item.iSubItem = column;
-            item.pszText = text;
-            item.cchTextMax = static_cast<int>(std::size(text));
-            SendMessageW(Item(list_id), LVM_GETITEMTEXTW, row, reinterpret_cast<LPARAM>(&item));
-            texts[row] = text;
+            ListView_GetItemText(list, row, column, text, static_cast<int>(std::size(text)));
+            texts[static_cast<std::size_t>(row)] = text;
         }
         return texts;
     }
     Lines OnPcPage() const { return Column(IDC_TRANSFER_PC_LIST); }
     Lines OnDevicePage() const { return Column(IDC_TRANSFER_DEVICE_LIST); }
+    // "0" for an entry of the PC's page that is ticked, else "1".
+    Lines Ticks() const { return Column(IDC_TRANSFER_PC_LIST, 2); }
     // Ticks the entry of that name with the space bar.
     void Tick(int list_id, const std::wstring& name) const {
         const Lines names = Column(list_id);
         const auto row = std::find(names.begin(), names.end(), name) - names.begin();
         ASSERT_LT(row, std::ssize(names)) << "not listed";
-        LVITEMW item{};
-        item.state = item.stateMask = LVIS_SELECTED | LVIS_FOCUSED;
-        SendMessageW(Item(list_id), LVM_SETITEMSTATE, static_cast<WPARAM>(row),
-                     reinterpret_cast<LPARAM>(&item));
+        constexpr UINT kChosen = LVIS_SELECTED | LVIS_FOCUSED;
+        ListView_SetItemState(Item(list_id), static_cast<WPARAM>(row), kChosen, kChosen);
         SendMessageW(Item(list_id), WM_KEYDOWN, VK_SPACE, 1);
     }
     void SelectDevicePage() const {
@@ -74,30 +70,19 @@ struct TransferRun : DialogThread<TestedDialog> {
 
 // The progress window of this process, null when there is none.
 HWND ProgressWindow() {
-    HWND found = nullptr;
-    const auto look_at = [](HWND window, LPARAM result) -> BOOL {
-        DWORD process = 0;
-        GetWindowThreadProcessId(window, &process);
-        if (process == GetCurrentProcessId() && GetDlgItem(window, IDC_COPY_CANCEL) != nullptr) {
-            *reinterpret_cast<HWND*>(result) = window;
-        }
-        return TRUE;
-    };
-    // A snapshot: going from one window to the next would end where one has just been closed.
-    EnumWindows(look_at, reinterpret_cast<LPARAM>(&found));
-    return found;
+    return FindDialog([](HWND dialog) { return GetDlgItem(dialog, IDC_COPY_CANCEL) != nullptr; });
 }
 
-// Presses "Cancel" in the progress window and waits for the question.
-HWND AskToStop() {
+// Copies all and presses "Cancel" once the progress window's title begins as given: that window, with the
+// question.
+HWND CopyAndAskToStop(const TransferRun& run, const std::wstring& title) {
+    run.PressAndGoOn(IDC_TRANSFER_SYNCHRONIZE);
     HWND progress = nullptr;
-    EXPECT_TRUE(WaitUntil([&] { return (progress = ProgressWindow()) != nullptr; }));
+    EXPECT_TRUE(WaitUntil([&] { return ui::WindowText(progress = ProgressWindow()).starts_with(title); }));
     Press(progress, IDC_COPY_CANCEL);
     EXPECT_TRUE(WaitUntil([&] { return GetLastActivePopup(progress) != progress; }));
     return progress;
 }
-
-constexpr const wchar_t* kFiveNames[] = {L"1.txt", L"2.txt", L"3.txt", L"4.txt", L"5.txt"};
 
 // Settings that let some types take part and overwrite older files.
 class TransferTest : public JobFolders {
@@ -109,10 +94,25 @@ class TransferTest : public JobFolders {
         settings_.overwrite_old_files = true;
     }
 
+    // Five files on one side that the other lacks, and the look at whether all but those `left` were copied.
+    void PutFive(bool on_device) const {
+        for (const std::wstring& name : five_) {
+            DeleteFileW((on_device ? OnPc(name) : OnDevice(name)).c_str());
+            on_device ? PutOnDevice(name) : PutOnPc(name);
+        }
+    }
+    void ExpectTheRestOfFive(const Lines& left, bool on_device) const {
+        for (const std::wstring& name : five_) {
+            EXPECT_NE(Exists(on_device ? OnPc(name) : OnDevice(name)),
+                      std::find(left.begin(), left.end(), name) != left.end());
+        }
+    }
+
+    const Lines five_ = {L"1.txt", L"2.txt", L"3.txt", L"4.txt", L"5.txt"};
     SyncSettings settings_;
 };
 
-TEST_F(TransferTest, ListsWhatEachSideLacks) {
+TEST_F(TransferTest, ListsWhatEachSideLacksByTheSettingsAsTheyAre) {
     for (const wchar_t* name : {L"new.qvj", L"notes.doc", L".qvj", L"picture.bmp", L"picture.IMG"}) {
         PutOnPc(name);
     }
@@ -122,15 +122,23 @@ TEST_F(TransferTest, ListsWhatEachSideLacks) {
     PutOnDevice(L"same.qvj");
     PutOnDevice(L"a.TN3");
     PutOnDevice(L"Job1\\pic.jpg");
-    {
-        const TransferRun run(settings_);
-        EXPECT_EQ(run.OnPcPage(), (Lines{L"new.qvj", L"newer.qvj", L"picture.IMG"}));
-        EXPECT_EQ(run.Column(IDC_TRANSFER_PC_LIST, 2), (Lines{L"1", L"1", L"1"}));
+    PutOnPc(L"sub\\new.qvj");
+    PutOnPc(L"sub\\newer.qvj", 10);
+    bool accept = false;
+    const TransferRun run(settings_, true, [&](SyncSettings& settings) {
+        settings.overwrite_old_files = false;
+        settings.sync_path_dt += L"sub\\";
+        return accept;
+    });
+    for (int presses = 0; presses < 2; ++presses) {
+        EXPECT_EQ(run.OnPcPage(),
+                  (Lines{L"new.qvj", L"newer.qvj", L"picture.IMG", L"sub\\new.qvj", L"sub\\newer.qvj"}));
+        EXPECT_EQ(run.Ticks(), Lines(5, L"1"));
         EXPECT_EQ(run.OnDevicePage(), (Lines{L"a.TN3", L"Job1\\pic.jpg"}));
+        run.Press(IDC_TRANSFER_SETTINGS);
+        accept = true;
     }
-    settings_.overwrite_old_files = false;
-    const TransferRun run(settings_);
-    EXPECT_EQ(run.OnPcPage(), (Lines{L"new.qvj", L"picture.IMG"}));
+    EXPECT_EQ(run.OnPcPage(), Lines{L"new.qvj"});
 }
 
 TEST_F(TransferTest, ButtonsFollowTheTicksOfThePageShown) {
@@ -138,54 +146,41 @@ TEST_F(TransferTest, ButtonsFollowTheTicksOfThePageShown) {
     PutOnPc(L"b.qvj");
     PutOnDevice(L"c.qvj");
     const TransferRun run(settings_);
-    const auto is_enabled = [&](int id, bool enabled) {
-        return WaitUntil([&] { return run.IsEnabled(id) == enabled; });
+    const auto buttons_are = [&](bool enabled, bool all_ticked) {
+        return WaitUntil([&] {
+            return run.IsEnabled(IDC_TRANSFER_COPY) == enabled &&
+                   run.IsEnabled(IDC_TRANSFER_COPY_ALL) == enabled &&
+                   (IsDlgButtonChecked(run.Window(), IDC_TRANSFER_PC_ALL) != 0) == all_ticked;
+        });
     };
-    EXPECT_TRUE(is_enabled(IDC_TRANSFER_COPY, false));
-    EXPECT_EQ(run.Text(IDC_TRANSFER_COPY), L"Copy Selected File(s) from PC to Device");
+    EXPECT_TRUE(buttons_are(false, false));
     run.Tick(IDC_TRANSFER_PC_LIST, L"b.qvj");
-    EXPECT_TRUE(is_enabled(IDC_TRANSFER_COPY, true));
-    EXPECT_TRUE(is_enabled(IDC_TRANSFER_COPY_ALL, true));
-    EXPECT_FALSE(run.IsChecked(IDC_TRANSFER_PC_ALL));
+    EXPECT_TRUE(buttons_are(true, false));
     run.Tick(IDC_TRANSFER_PC_LIST, L"a.qvj");
-    EXPECT_TRUE(WaitUntil([&] { return run.IsChecked(IDC_TRANSFER_PC_ALL); }));
-    HWND list = run.Item(IDC_TRANSFER_PC_LIST);
-    SendMessageW(run.Window(), kListDoubleClick, reinterpret_cast<WPARAM>(list),
-                 reinterpret_cast<LPARAM>(list));
-    EXPECT_EQ(run.Column(IDC_TRANSFER_PC_LIST, 2), (Lines{L"1", L"0"})) << "the selected entry";
-    EXPECT_TRUE(WaitUntil([&] { return !run.IsChecked(IDC_TRANSFER_PC_ALL); }));
+    EXPECT_TRUE(buttons_are(true, true));
+    const auto list = reinterpret_cast<LPARAM>(run.Item(IDC_TRANSFER_PC_LIST));
+    SendMessageW(run.Window(), kListDoubleClick, static_cast<WPARAM>(list), list);
+    EXPECT_EQ(run.Ticks(), (Lines{L"1", L"0"})) << "the selected entry";
+    EXPECT_TRUE(buttons_are(true, false));
 
     run.SelectDevicePage();
-    EXPECT_TRUE(is_enabled(IDC_TRANSFER_COPY, false));
+    EXPECT_TRUE(WaitUntil([&] { return !run.IsEnabled(IDC_TRANSFER_COPY); }));
     // A late report about the page that is hidden now.
-    SendMessageW(run.Window(), kListItemsDrawn, reinterpret_cast<WPARAM>(list),
-                 reinterpret_cast<LPARAM>(list));
+    SendMessageW(run.Window(), kListItemsDrawn, static_cast<WPARAM>(list), list);
     EXPECT_FALSE(run.IsEnabled(IDC_TRANSFER_COPY));
     run.Press(IDC_TRANSFER_DEVICE_ALL);
     EXPECT_EQ(run.Column(IDC_TRANSFER_DEVICE_LIST, 2), Lines{L"0"});
-    EXPECT_TRUE(is_enabled(IDC_TRANSFER_COPY, true));
+    EXPECT_TRUE(WaitUntil([&] { return run.IsEnabled(IDC_TRANSFER_COPY); }));
     // The dialog manager's message of the same number is not taken for a listing.
     SendMessageW(run.Window(), DM_SETDEFID, 0, 1);
     EXPECT_EQ(run.OnPcPage(), (Lines{L"a.qvj", L"b.qvj"}));
 }
 
 TEST_F(TransferTest, FollowsTheKeyboard) {
-    PutOnPc(L"a.qvj");
+    for (int folder = 0; folder < 20; ++folder) {
+        PutOnDevice(L"site" + std::to_wstring(folder) + L"\\a.qvj");
+    }
     TransferRun run(settings_);
-    const auto listed = [&](const Lines& names) {
-        return WaitUntil([&] { return run.OnPcPage() == names; });
-    };
-    PutOnPc(L"b.qvj");
-    run.Key(VK_RETURN);
-    EXPECT_TRUE(listed({L"a.qvj", L"b.qvj"}));
-    PutOnPc(L"c.qvj");
-    run.Call([&](TestedDialog&) { SetFocus(run.Item(IDC_TRANSFER_PC_LIST)); });
-    run.Key(VK_F5);
-    EXPECT_TRUE(listed({L"a.qvj", L"b.qvj", L"c.qvj"}));
-    run.Key(VK_SPACE);
-    EXPECT_TRUE(WaitUntil([&] {
-        return run.Column(IDC_TRANSFER_PC_LIST, 2) == Lines{L"0", L"1", L"1"};
-    })) << "a row has the focus after the refresh";
     const auto hold_control = [&](BYTE state) {
         run.Call([&](TestedDialog&) {
             BYTE keys[256] = {};
@@ -193,29 +188,32 @@ TEST_F(TransferTest, FollowsTheKeyboard) {
             SetKeyboardState(keys);
         });
     };
+    Lines names;
+    for (const UINT key : {VK_RETURN, VK_F5}) {
+        PutOnPc(names.emplace_back(key == VK_F5 ? L"b.qvj" : L"a.qvj"));
+        run.Call([&](TestedDialog&) { SetFocus(run.Item(IDC_TRANSFER_PC_LIST)); });
+        run.Key(key);
+        EXPECT_TRUE(WaitUntil([&] { return run.OnPcPage() == names; }));
+    }
+    run.Key(VK_SPACE);
+    EXPECT_TRUE(WaitUntil([&] { return run.Ticks() == Lines{L"0", L"1"}; })) << "no row has the focus";
     hold_control(0x80);
     run.Key('A');
-    EXPECT_TRUE(WaitUntil([&] { return run.Column(IDC_TRANSFER_PC_LIST, 2) == Lines{L"0", L"0", L"0"}; }));
+    EXPECT_TRUE(WaitUntil([&] { return run.Ticks() == Lines{L"0", L"0"}; }));
     hold_control(0);
+
+    // While a slow device is read a second "Refresh" is dropped, and Escape ends all of it.
+    device_.Set(L"CALL_DELAY", L"200");
+    device_.StartTrace();
+    run.PressAndGoOn(IDC_TRANSFER_REFRESH);
+    EXPECT_TRUE(WaitUntil([&] { return device_.CallsOf(L"CeFindAllFiles") > 0; }));
+    const ULONGLONG start = GetTickCount64();
+    run.Press(IDC_TRANSFER_REFRESH);
+    EXPECT_LT(GetTickCount64() - start, 150U);
     run.Key(VK_ESCAPE);
     EXPECT_TRUE(WaitUntil([&] { return run.HasEnded(); }));
+    EXPECT_LT(GetTickCount64() - start, 2500U) << "the whole listing would take longer";
     EXPECT_EQ(run.Result(), IDCANCEL);
-}
-
-TEST_F(TransferTest, NewFoldersAreListedAtOnce) {
-    PutOnPc(L"a.qvj");
-    TempFolder other;
-    WriteTextFile(other / L"b.qvj", "");
-    bool accept = false;
-    const TransferRun run(settings_, true, [&](SyncSettings& settings) {
-        settings.sync_path_dt = other.Path() + L"\\";
-        return accept;
-    });
-    run.Press(IDC_TRANSFER_SETTINGS);
-    EXPECT_EQ(run.OnPcPage(), Lines{L"a.qvj"});
-    accept = true;
-    run.Press(IDC_TRANSFER_SETTINGS);
-    EXPECT_EQ(run.OnPcPage(), Lines{L"b.qvj"});
 }
 
 TEST_F(TransferTest, AnEmptyDeviceFolderIsAskedForAndNeverTheWholeDevice) {
@@ -226,40 +224,11 @@ TEST_F(TransferTest, AnEmptyDeviceFolderIsAskedForAndNeverTheWholeDevice) {
     ASSERT_EQ(boxes.Seen().size(), 1U);
     EXPECT_EQ(boxes.Seen()[0].text, L"Failed to read from remote device.");
     EXPECT_EQ(run.OnDevicePage(), Lines{});
-    for (const int id :
-         {IDC_TRANSFER_COPY, IDC_TRANSFER_COPY_ALL, IDC_TRANSFER_SYNCHRONIZE, IDC_TRANSFER_PC_ALL}) {
-        EXPECT_FALSE(run.IsEnabled(id)) << id;
-    }
     PutOnDevice(L"a.qvj");
     RegWriteString(HKEY_CURRENT_USER, L"Software\\Veltrano\\CE Devices", L"SyncPath_CE", L"\\Jobs\\");
     run.Press(IDC_TRANSFER_REFRESH);
     EXPECT_EQ(run.OnDevicePage(), Lines{L"a.qvj"});
     EXPECT_EQ(run.Text(IDC_TRANSFER_DEVICE_FOLDER), L"\\Jobs\\");
-}
-
-// The window answers while a slow device is listed, a second "Refresh" is dropped, Escape ends all of it.
-TEST_F(TransferTest, LivesWhileTheDeviceIsRead) {
-    for (int folder = 0; folder < 20; ++folder) {
-        PutOnDevice(L"site" + std::to_wstring(folder) + L"\\a.qvj");
-    }
-    TransferRun run(settings_);
-    device_.Set(L"CALL_DELAY", L"200");
-    device_.StartTrace();
-    run.PressAndGoOn(IDC_TRANSFER_REFRESH);
-    EXPECT_TRUE(WaitUntil([&] { return device_.CallsOf(L"CeFindAllFiles") > 0; }));
-    run.PressAndGoOn(IDC_TRANSFER_REFRESH);
-    SendMessageW(run.Item(IDC_TRANSFER_REFRESH), BM_CLICK, 0, 0);
-    const ULONGLONG start = GetTickCount64();
-    for (int ask = 0; ask < 20; ++ask) {
-        DWORD_PTR answer = 0;
-        EXPECT_NE(SendMessageTimeoutW(run.Window(), WM_NULL, 0, 0, SMTO_NORMAL, 150, &answer), 0);
-        Sleep(10);
-    }
-    EXPECT_LT(device_.CallsOf(L"CeFindAllFiles"), 21U);
-    run.Key(VK_ESCAPE);
-    EXPECT_TRUE(WaitUntil([&] { return run.HasEnded(); }));
-    EXPECT_LT(GetTickCount64() - start, 2500U) << "the whole listing would take longer";
-    EXPECT_EQ(run.Result(), IDCANCEL);
 }
 
 TEST_F(TransferTest, ADeclinedClockCheckEndsTheDialog) {
@@ -308,26 +277,27 @@ TEST_F(TransferTest, CopiesTickedFilesOrAll) {
     }
 }
 
-TEST_F(TransferTest, ReplacesOnlyWhatTheUserAllows) {
+TEST_F(TransferTest, ReplacesWhatTheUserAllowsAndListsWhatIsLeft) {
     settings_.overwrite_warn = true;
+    PutOnPc(L"new.qvj", 11);
     PutOnPc(L"close.qvj", 10);
     PutOnPc(L"kept.qvj", 11);
-    PutOnPc(L"new.qvj", 11);
+    PutOnPc(L"replaced.txt");
     PutOnDevice(L"close.qvj");
     PutOnDevice(L"kept.qvj");
-    PutOnPc(L"replaced.txt");
     PutOnDevice(L"replaced.txt", 11);
+    // What a device may claim to have; the first name is one that the PC takes for a device of its own.
+    device_.Set(L"EXTRA_ENTRIES", L"\\Jobs|NUL.txt;\\Jobs|vanished.txt");
     const MessageBoxAnswerer boxes({IDCANCEL, IDOK});
     const TransferRun run(settings_);
     run.Press(IDC_TRANSFER_SYNCHRONIZE);
-
     ASSERT_EQ(boxes.Seen().size(), 2U);
     EXPECT_EQ(boxes.Seen()[0].default_button, IDCANCEL);
     EXPECT_EQ(boxes.Seen()[0].text,
               L"The file:\n\\Jobs\\kept.qvj [ DEVICE ] \n\nWill be replaced by the file:\n" +
                   OnPc(L"kept.qvj") + L" [ PC ]");
     EXPECT_EQ(run.OnPcPage(), Lines{L"kept.qvj"});
-    EXPECT_EQ(run.OnDevicePage(), Lines{});
+    EXPECT_EQ(run.OnDevicePage(), (Lines{L"NUL.txt", L"vanished.txt"}));
     EXPECT_EQ(ReadTextFile(OnDevice(L"close.qvj")), "from the PC");
     EXPECT_EQ(ReadTextFile(OnDevice(L"kept.qvj")), "from the device");
     EXPECT_EQ(ReadTextFile(OnPc(L"replaced.txt")), "from the device");
@@ -346,17 +316,13 @@ TEST_F(TransferTest, AFullOrLostDeviceEndsTheCopy) {
                  {L"VANISH", L"12", L"Communication Error.", true},
                  {L"CONNECT_RESULT", L"0x80004005", L"Communication Error.", true}};
     for (const auto& each : cases) {
-        for (const wchar_t* name : kFiveNames) {
-            DeleteFileW((each.to_pc ? OnPc(name) : OnDevice(name)).c_str());
-            each.to_pc ? PutOnDevice(name) : PutOnPc(name);
-        }
+        PutFive(each.to_pc);
         const TransferRun run(settings_);
         const auto listed = [&] { return each.to_pc ? run.OnDevicePage() : run.OnPcPage(); };
         device_.Set(each.fault, each.value);
         run.PressAndGoOn(IDC_TRANSFER_SYNCHRONIZE);
         HWND box = nullptr;
         EXPECT_TRUE(WaitUntil([&] { return (box = GetLastActivePopup(run.Window())) != run.Window(); }));
-        EXPECT_EQ(ui::WindowText(box), L"Copying File");
         EXPECT_EQ(ItemText(box, 0xFFFF), each.text);
         run.Press(IDC_TRANSFER_SYNCHRONIZE);  // Dropped.
         Press(box, IDOK);
@@ -366,34 +332,23 @@ TEST_F(TransferTest, AFullOrLostDeviceEndsTheCopy) {
         device_.Clear(each.fault);
         run.Press(IDC_TRANSFER_REFRESH);
         EXPECT_EQ(listed(), left);
-        for (const wchar_t* name : kFiveNames) {
-            EXPECT_NE(Exists(each.to_pc ? OnPc(name) : OnDevice(name)),
-                      std::find(left.begin(), left.end(), name) != left.end());
-        }
+        ExpectTheRestOfFive(left, each.to_pc);
     }
 }
 
 // The user stops a copy to the device, or goes on, while it asks.
 TEST_F(TransferTest, StopsWhenTheUserSaysSo) {
     for (const int answer : {IDYES, IDNO}) {
-        for (const wchar_t* name : kFiveNames) {
-            DeleteFileW(OnDevice(name).c_str());
-            PutOnPc(name);
-        }
+        PutFive(/*on_device=*/false);
         device_.Set(L"CALL_DELAY", L"25");
         const TransferRun run(settings_);
-        run.PressAndGoOn(IDC_TRANSFER_SYNCHRONIZE);
-        HWND progress = AskToStop();
-        HWND question = GetLastActivePopup(progress);
-        EXPECT_EQ(ItemText(question, 0xFFFF), L"Would you like to stop the file copy?");
-        PostMessageW(question, WM_COMMAND, static_cast<WPARAM>(answer), 0);
-        EXPECT_TRUE(WaitUntil([] { return ProgressWindow() == nullptr; }));
+        HWND progress = CopyAndAskToStop(run, L"{");
+        PostMessageW(GetLastActivePopup(progress), WM_COMMAND, static_cast<WPARAM>(answer), 0);
+        EXPECT_TRUE(WaitUntil([&] { return !IsWindow(progress); }));
         SendMessageW(run.Window(), WM_NULL, 0, 0);
         const Lines left = run.OnPcPage();
         EXPECT_EQ(left.empty(), answer == IDNO);
-        for (const std::wstring& name : left) {
-            EXPECT_FALSE(Exists(OnDevice(name)));
-        }
+        ExpectTheRestOfFive(left, /*on_device=*/false);
     }
 }
 
@@ -401,49 +356,26 @@ TEST_F(TransferTest, StopsWhenTheUserSaysSo) {
 // or, if files are to come from the device, holds them up.
 TEST_F(TransferTest, AnOpenStopQuestionCountsForWhatFollows) {
     device_.Set(L"CALL_DELAY", L"100");
-    for (const bool more_follows : {false, true}) {
+    for (const Lines& following : {Lines{}, Lines{L"b.txt"}}) {
         DeleteFileW(OnDevice(L"a.txt").c_str());
         PutOnPc(L"a.txt");
-        if (more_follows) {
-            PutOnDevice(L"b.txt");
+        for (const std::wstring& name : following) {
+            PutOnDevice(name);
         }
         const TransferRun run(settings_);
-        run.PressAndGoOn(IDC_TRANSFER_SYNCHRONIZE);
-        EXPECT_TRUE(WaitUntil([] {
-            const std::wstring title = ui::WindowText(ProgressWindow());
-            return title.find(L"{Copying File 1/1  - From PC to Device}") == 0;
-        }));
-        HWND progress = AskToStop();
-        if (more_follows) {
+        HWND progress = CopyAndAskToStop(run, L"{Copying File 1/1  - From PC to Device}");
+        if (!following.empty()) {
             EXPECT_TRUE(WaitUntil([&] { return Exists(OnDevice(L"a.txt")); }));
             Sleep(1000);  // What would be copied without an answer would be there by then.
-            EXPECT_FALSE(Exists(OnPc(L"b.txt")));
+            EXPECT_EQ(PcFiles(), Lines{L"a.txt"});
             PostMessageW(GetLastActivePopup(progress), WM_COMMAND, IDYES, 0);
         }
         EXPECT_TRUE(WaitUntil([&] { return !IsWindow(progress); }));
         SendMessageW(run.Window(), WM_NULL, 0, 0);
         EXPECT_EQ(run.OnPcPage(), Lines{});
         EXPECT_TRUE(Exists(OnDevice(L"a.txt")));
-        EXPECT_EQ(run.OnDevicePage(), more_follows ? Lines{L"b.txt"} : Lines{});
-        EXPECT_FALSE(Exists(OnPc(L"b.txt")));
-    }
-}
-
-TEST_F(TransferTest, FilesThatCannotBeCopiedStayListed) {
-    // What a device may claim to have; the first name is one that the PC takes for a device of its own. The
-    // job file would have the folder above for its companion.
-    device_.Set(L"EXTRA_ENTRIES", L"\\Jobs|NUL.txt;\\Jobs|vanished.txt");
-    PutOnDevice(L"...wkf");
-    device_.StartTrace();
-    const TransferRun run(settings_);
-    run.Press(IDC_TRANSFER_SYNCHRONIZE);
-    EXPECT_EQ(run.OnDevicePage(), (Lines{L"NUL.txt", L"vanished.txt"}));
-    EXPECT_EQ(PcFiles(), Lines{L"...wkf"});
-    for (const TraceLine& line : device_.Trace()) {
-        const bool is_open = line.function == L"CeCreateFile";
-        EXPECT_FALSE(is_open && line.arguments[0].find(L"NUL.txt") != std::wstring::npos);
-        EXPECT_FALSE(line.function == L"CeFindAllFiles" &&
-                     line.arguments[0].find(L"..") != std::wstring::npos);
+        EXPECT_EQ(run.OnDevicePage(), following);
+        EXPECT_EQ(PcFiles(), Lines{L"a.txt"});
     }
 }
 

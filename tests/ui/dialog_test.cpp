@@ -4,7 +4,6 @@
 
 #include <functional>
 #include <stdexcept>
-#include <string>
 
 #include "ui/control.h"
 
@@ -23,19 +22,9 @@ class TestDialog : public Dialog {
     HWND Edit() const { return Item(kEdit); }
 
     Handler handler = [](UINT) { return std::nullopt; };
-    std::wstring text;
-    int button = 0;  // Pressed as soon as the dialog runs, after "new" was appended to the text.
 
   protected:
-    bool OnInitDialog() override {
-        if (button != 0) {
-            SetDlgItemTextW(Handle(), kEdit, (text + L"new").c_str());
-            PostMessageW(Handle(), WM_COMMAND, static_cast<WPARAM>(button), 0);
-        }
-        return true;
-    }
     std::optional<LRESULT> OnMessage(UINT message, WPARAM, LPARAM) override { return handler(message); }
-    void DoDataExchange(DataExchange& exchange) override { exchange.Text(kEdit, text); }
 };
 
 class TestControl : public Control {
@@ -65,18 +54,6 @@ TEST(Dialog, ReturnsResultsWholeAndTellsZeroFromUnhandled) {
         EXPECT_EQ(answer(message), kWide) << message;
     }
     dialog.handler = [](UINT) { return std::nullopt; };
-}
-
-TEST(Dialog, ExchangesDataAndEndsByItsButtons) {
-    const std::wstring old(3000, L'x');
-    for (const int button : {IDOK, IDCANCEL}) {
-        TestDialog dialog;
-        dialog.text = old;
-        dialog.button = button;
-        EXPECT_EQ(dialog.DoModal(), button);
-        EXPECT_EQ(dialog.text, button == IDOK ? old + L"new" : old);
-        EXPECT_EQ(dialog.Handle(), nullptr);
-    }
 }
 
 TEST(Control, HandlesItsMessagesAndItsNotificationsBeforeTheDialog) {
