@@ -2,13 +2,13 @@
 
 #include <oleauto.h>
 
-#include <optional>
 #include <utility>
 
 #include "platform/resources.h"
 #include "qelutils/text_format.h"
 #include "qelutils/xlate.h"
 #include "res/ids.h"
+#include "ui/screen.h"
 
 namespace orvane {
 
@@ -65,15 +65,12 @@ std::wstring SizeText(std::uint32_t size_low) {
 }
 
 UCeFilePropertyDlg::UCeFilePropertyDlg(std::wstring path, const FileNode& node, HWND parent)
-    : Dialog(IDD_FILE_PROPERTY, parent),
-      file_icon_(LoadOwnedIcon(IDI_PROPERTY_FILE)),
-      folder_icon_(LoadOwnedIcon(IDI_PROPERTY_FOLDER)),
-      path_(std::move(path)),
-      node_(node) {}
+    : Dialog(IDD_FILE_PROPERTY, parent), path_(std::move(path)), node_(node) {}
 
 bool UCeFilePropertyDlg::OnInitDialog() {
     const bool is_folder = node_.is_folder != 0;
     SetDlgItemTextW(Handle(), IDC_PROPERTY_PATH, path_.c_str());
+    ShowIcon();
     ShowKind(is_folder);
     const FILETIME& time = is_folder ? node_.creation_time : node_.last_write_time;
     SetDlgItemTextW(Handle(), IDC_PROPERTY_DATE, DateText(time).c_str());
@@ -84,9 +81,19 @@ bool UCeFilePropertyDlg::OnInitDialog() {
     return true;
 }
 
+std::optional<LRESULT> UCeFilePropertyDlg::OnMessage(UINT message, WPARAM /*wparam*/, LPARAM /*lparam*/) {
+    if (message == WM_DPICHANGED) {
+        ShowIcon();
+    }
+    return std::nullopt;
+}
+
+void UCeFilePropertyDlg::ShowIcon() {
+    icon_ =
+        ui::ShowIcon(Item(IDC_PROPERTY_ICON), node_.is_folder != 0 ? IDI_PROPERTY_FOLDER : IDI_PROPERTY_FILE);
+}
+
 void UCeFilePropertyDlg::ShowKind(bool is_folder) {
-    HICON icon = is_folder ? folder_icon_.Get() : file_icon_.Get();
-    SendDlgItemMessageW(Handle(), IDC_PROPERTY_ICON, STM_SETICON, reinterpret_cast<WPARAM>(icon), 0);
     const std::wstring type = is_folder ? Xlate(L"Folder") : FileTypeText(path_);
     SetDlgItemTextW(Handle(), IDC_PROPERTY_TYPE, type.c_str());
     const std::wstring date_label = is_folder ? Xlate(L"Created:") : Xlate(L"Modified:");

@@ -4,6 +4,7 @@
 #include <windows.h>
 
 #include <cstdint>
+#include <optional>
 #include <string>
 
 #include "device/file_node.h"
@@ -35,13 +36,14 @@ class UCeFilePropertyDlg : public ui::Dialog {
 
   protected:
     bool OnInitDialog() override;
+    std::optional<LRESULT> OnMessage(UINT message, WPARAM wparam, LPARAM lparam) override;
 
   private:
+    void ShowIcon();
     void ShowKind(bool is_folder);
     void ShowAttribute(int id, std::uint32_t attribute);
 
-    UniqueIcon file_icon_;
-    UniqueIcon folder_icon_;
+    UniqueIcon icon_;
     std::wstring path_;
     const FileNode& node_;
 };

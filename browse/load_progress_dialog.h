@@ -3,7 +3,6 @@
 
 #include <windows.h>
 
-#include <array>
 #include <string>
 
 #include "platform/handles.h"
@@ -16,7 +15,7 @@ namespace orvane {
 class CLoadProgressDlg : public ui::Dialog {
   public:
     CLoadProgressDlg(std::wstring text, HWND parent);
-    ~CLoadProgressDlg() override { Destroy(); }  // Before the icons that the window shows.
+    ~CLoadProgressDlg() override { Destroy(); }  // Before the icon that the window shows.
 
   protected:
     bool OnInitDialog() override;
@@ -25,11 +24,11 @@ class CLoadProgressDlg : public ui::Dialog {
     std::optional<LRESULT> OnMessage(UINT message, WPARAM wparam, LPARAM lparam) override;
 
   private:
-    void ShowNextFrame();
+    void ShowFrame();
 
     std::size_t frame_ = 0;
     std::wstring text_;
-    std::array<UniqueIcon, 5> icons_;
+    UniqueIcon icon_;
 };
 
 }  // namespace orvane

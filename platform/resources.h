@@ -22,12 +22,10 @@ inline std::wstring ResourceString(UINT id) {
     return length > 0 ? std::wstring(text, static_cast<std::size_t>(length)) : std::wstring();
 }
 
-// A copy of the icon that the caller owns, `pixels` wide and high; 0 means the system's size for icons.
-// Empty when there is no such icon.
-inline UniqueIcon LoadOwnedIcon(int id, int pixels = 0) {
-    const UINT flags = pixels == 0 ? LR_DEFAULTSIZE : LR_DEFAULTCOLOR;
+// A copy of the icon that the caller owns, `pixels` wide and high. Empty when there is no such icon.
+inline UniqueIcon LoadOwnedIcon(int id, int pixels) {
     return UniqueIcon(static_cast<HICON>(
-        LoadImageW(ResourceModule(), MAKEINTRESOURCEW(id), IMAGE_ICON, pixels, pixels, flags)));
+        LoadImageW(ResourceModule(), MAKEINTRESOURCEW(id), IMAGE_ICON, pixels, pixels, LR_DEFAULTCOLOR)));
 }
 
 }  // namespace orvane

@@ -6,6 +6,14 @@
 
 namespace orvane::ui {
 
+namespace {
+
+// In pixels at 100 %.
+constexpr int kBigIcon = 32;
+constexpr int kSmallIcon = 16;
+
+}  // namespace
+
 int DpiOf(HWND window) {
     // Windows 7 to 8.1 do not know it.
     using GetDpiForWindowFunction = UINT(WINAPI*)(HWND);
@@ -24,12 +32,18 @@ int DpiOf(HWND window) {
 
 void WindowIcons::Set(HWND window, int icon_id) {
     // The window shows the new ones before the old ones go.
-    UniqueIcon big_icon = LoadOwnedIcon(icon_id, Scaled(32, DpiOf(window)));
-    UniqueIcon small_icon = LoadOwnedIcon(icon_id, Scaled(16, DpiOf(window)));
+    UniqueIcon big_icon = LoadOwnedIcon(icon_id, Scaled(kBigIcon, DpiOf(window)));
+    UniqueIcon small_icon = LoadOwnedIcon(icon_id, Scaled(kSmallIcon, DpiOf(window)));
     SendMessageW(window, WM_SETICON, ICON_BIG, reinterpret_cast<LPARAM>(big_icon.Get()));
     SendMessageW(window, WM_SETICON, ICON_SMALL, reinterpret_cast<LPARAM>(small_icon.Get()));
     big_ = std::move(big_icon);
     small_ = std::move(small_icon);
+}
+
+UniqueIcon ShowIcon(HWND control, int icon_id) {
+    UniqueIcon icon = LoadOwnedIcon(icon_id, Scaled(kBigIcon, DpiOf(control)));
+    SendMessageW(control, STM_SETICON, reinterpret_cast<WPARAM>(icon.Get()), 0);
+    return icon;
 }
 
 bool HasHighContrast() {

@@ -27,6 +27,10 @@ class WindowIcons {
     UniqueIcon small_;
 };
 
+// Shows an icon of the resources in a control for icons: the drawing for the size that 32 pixels at 100 %
+// have on its screen. The result must live as long as the control shows it.
+UniqueIcon ShowIcon(HWND control, int icon_id);
+
 // The user has a high-contrast theme: only the system's colours may be used.
 bool HasHighContrast();
 
