@@ -131,7 +131,10 @@ DeviceResult ListDeviceTree(const std::wstring& folder, const CancelEvent& cance
 
 DeviceResult CopyPcFolderToDevice(const EntryPaths& folder, const CopyContext& context,
                                   const CompanionRules& rules) {
-    const FileNode source = ListPcTree(folder.pc);
+    const FileNode source = ListPcTree(folder.pc, context.cancel);
+    if (context.cancel.IsSignalled()) {
+        return DeviceResult::kListingCancelled;
+    }
     if (source.unread) {
         return DeviceResult::kDone;
     }
@@ -146,7 +149,7 @@ DeviceResult CopyPcFolderToDevice(const EntryPaths& folder, const CopyContext& c
 DeviceResult CopyDeviceFolderToPc(const EntryPaths& folder, const CopyContext& context,
                                   const CompanionRules& rules) {
     const DeviceSession session(context.cancel, context.session);
-    const FileNode target = ListPcTree(folder.pc);
+    const FileNode target = ListPcTree(folder.pc, context.cancel);
     if (!session || target.unread) {
         return target.unread ? DeviceResult::kDone : DeviceResult::kFailed;
     }

@@ -87,16 +87,16 @@ Found Search(const std::wstring& pattern) {
 }
 
 // Lists the folder of the pattern. ERROR_SUCCESS, or why it could not be read.
-DWORD ListFolder(const std::wstring& pattern, bool recurse, FileNode& node);
+DWORD ListFolder(const std::wstring& pattern, bool recurse, FileNode& node, const CancelEvent& stop);
 
-void ListSubFolder(const std::wstring& path, FileNode& folder) {
+void ListSubFolder(const std::wstring& path, FileNode& folder, const CancelEvent& stop) {
     const std::wstring pattern = path + L"\\" + std::wstring(kEverything);
     const bool is_link = (folder.attributes & FILE_ATTRIBUTE_REPARSE_POINT) != 0;
-    folder.unread = !FitsPathBuffer(pattern.size()) || (is_link && LeadsBack(path)) ||
-                    ListFolder(pattern, true, folder) != ERROR_SUCCESS;
+    folder.unread = stop.Poll() || !FitsPathBuffer(pattern.size()) || (is_link && LeadsBack(path)) ||
+                    ListFolder(pattern, true, folder, stop) != ERROR_SUCCESS;
 }
 
-DWORD ListFolder(const std::wstring& pattern, bool recurse, FileNode& node) {
+DWORD ListFolder(const std::wstring& pattern, bool recurse, FileNode& node, const CancelEvent& stop) {
     Found found = Search(pattern);
     if (found.error != ERROR_NO_MORE_FILES) {
         return found.error;
@@ -110,7 +110,7 @@ DWORD ListFolder(const std::wstring& pattern, bool recurse, FileNode& node) {
     const std::wstring folder(pattern, 0, pattern.size() - kEverything.size());
     for (FileNode& child : std::span(node.children.get(), found.entries.size())) {
         if (recurse && child.is_folder != 0) {
-            ListSubFolder(folder + child.name, child);
+            ListSubFolder(folder + child.name, child, stop);
         }
     }
     return ERROR_SUCCESS;
@@ -129,12 +129,13 @@ void CollectUnread(const FileNode& node, const std::wstring& prefix, std::vector
 }  // namespace
 
 DeviceResult ListPcFolder(const std::wstring& pattern, bool recurse, FileNode& node) {
-    return ListFolder(pattern, recurse, node) == ERROR_SUCCESS ? DeviceResult::kDone : DeviceResult::kFailed;
+    return ListFolder(pattern, recurse, node, nullptr) == ERROR_SUCCESS ? DeviceResult::kDone
+                                                                        : DeviceResult::kFailed;
 }
 
-FileNode ListPcTree(const std::wstring& folder) {
+FileNode ListPcTree(const std::wstring& folder, const CancelEvent& stop) {
     FileNode root;
-    const DWORD error = ListFolder(JoinPath(folder, kEverything), true, root);
+    const DWORD error = ListFolder(JoinPath(folder, kEverything), true, root, stop);
     root.unread = error != ERROR_SUCCESS && error != ERROR_FILE_NOT_FOUND && error != ERROR_PATH_NOT_FOUND;
     return root;
 }
@@ -150,11 +151,11 @@ bool JobTable::IsUnknown(std::wstring_view name) const {
     });
 }
 
-std::optional<JobTable> ListPcJobFolder(const std::wstring& folder) {
+std::optional<JobTable> ListPcJobFolder(const std::wstring& folder, const CancelEvent& stop) {
     if (!IsPcFolderNamed(folder)) {
         return JobTable();
     }
-    const FileNode root = ListPcTree(folder);
+    const FileNode root = ListPcTree(folder, stop);
     return root.unread ? std::nullopt : std::optional<JobTable>(root);
 }
 

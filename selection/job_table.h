@@ -9,6 +9,7 @@
 
 #include "device/file_node.h"
 #include "device/result_codes.h"
+#include "platform/cancel_event.h"
 #include "selection/file_table.h"
 
 namespace orvane {
@@ -25,8 +26,9 @@ namespace orvane {
 DeviceResult ListPcFolder(const std::wstring& pattern, bool recurse, FileNode& node);
 
 // The PC folder with all that lies below it, as the root of a tree. One that is not there is an empty one;
-// one that is there and cannot be read is marked `unread`.
-FileNode ListPcTree(const std::wstring& folder);
+// one that is there and cannot be read is marked `unread`. Once `stop` is signalled no further sub-folder is
+// read.
+FileNode ListPcTree(const std::wstring& folder, const CancelEvent& stop);
 
 struct JobTable {
     JobTable() = default;
@@ -47,7 +49,7 @@ struct JobTable {
 
 // Reads the PC job folder. A folder that is not named or not there gives an empty table; nothing comes back
 // for one that is there and cannot be read.
-std::optional<JobTable> ListPcJobFolder(const std::wstring& folder);
+std::optional<JobTable> ListPcJobFolder(const std::wstring& folder, const CancelEvent& stop = nullptr);
 
 // What the user is told of such a folder, in the user's language.
 std::wstring UnreadableFolderText(const std::wstring& folder);

@@ -27,7 +27,7 @@ ui::Waited ReadJobFolders(HWND dialog, SyncSettings& settings, DeviceTreeReader&
             return;
         }
         device = JobTable(root);
-        std::optional<JobTable> listed = ListPcJobFolder(settings.sync_path_dt);
+        std::optional<JobTable> listed = ListPcJobFolder(settings.sync_path_dt, reader.StopEvent());
         pc_read = listed.has_value();
         if (pc_read) {
             pc = std::move(*listed);
