@@ -69,7 +69,7 @@ class SyncPass {
             // Asked is only about files that would be copied. (A folder has no time by which it could be
             // newer.) All others come to the gates behind the question, which pass over them.
             ask_replace_ = [this](std::wstring_view name) {
-                return !PassesExtensionFilter(name, task_.types) || AskReplace(name);
+                return !WouldBeCopied(name) || AskReplace(name);
             };
         }
     }
@@ -124,6 +124,14 @@ class SyncPass {
             }
         }
         return PassEnd::kComplete;
+    }
+
+    // Of a row whose target may be replaced.
+    bool WouldBeCopied(std::wstring_view name) const {
+        const std::int32_t row = index_.Find(name);
+        return PassesExtensionFilter(name, task_.types) && row >= 0 &&
+               target_.listing.table.kinds[static_cast<std::size_t>(row)] == kKindFile &&
+               CanCopy(folders_ + name, name, kind_.direction, context_.old_file == OldFile::kKept);
     }
 
     // The write time of the file that the copy would replace, as it was listed; nothing where none was.

@@ -24,20 +24,25 @@ bool EndsWalk(DeviceResult result, const CancelEvent& cancel) {
 class CompanionCopy {
   public:
     CompanionCopy(const EntryPaths& folder, const CopyContext& context, const CompanionRules& rules,
-                  const JobTable& source, const JobTable& target)
+                  const FileNode& source, const FileNode& target)
         : folder_(folder),
           context_(context),
           rules_(rules),
           source_(source),
           target_(target),
-          index_(target.table, target.rows) {}
+          index_(target_.table, target_.rows),
+          is_whole_(!source.unread && !target.unread && source_.IsComplete()) {}
 
     DeviceResult Run() {
         if (to_device_ || source_.rows > 0) {
             CreateFolder(folder_);
         }
-        DeviceResult first = DeviceResult::kDone;
+        DeviceResult first = is_whole_ ? DeviceResult::kDone : DeviceResult::kFailed;
         for (std::int32_t row = 0; row < source_.rows; ++row) {
+            if (target_.IsUnknown(source_.table.names[static_cast<std::size_t>(row)])) {
+                first = DeviceResult::kFailed;  // Nothing is known of what stands there.
+                continue;
+            }
             const DeviceResult result = CopyRow(static_cast<std::size_t>(row));
             first = first == DeviceResult::kDone ? result : first;
             if (EndsWalk(result, context_.cancel)) {
@@ -53,7 +58,7 @@ class CompanionCopy {
         const bool is_folder = source_.table.kinds[row] == kKindFolder;
         const std::int32_t target_row = index_.Find(name);
         const bool is_below_a_file = !blocked_.empty() && name.starts_with(blocked_);
-        if (is_below_a_file || (!to_device_ && target_.IsUnknown(name))) {
+        if (is_below_a_file) {
             return DeviceResult::kDone;
         }
         if (target_row >= 0 &&
@@ -116,9 +121,10 @@ class CompanionCopy {
     const EntryPaths& folder_;
     const CopyContext& context_;
     const CompanionRules& rules_;
-    const JobTable& source_;
-    const JobTable& target_;
+    const JobTable source_;
+    const JobTable target_;
     const FileIndex index_;
+    const bool is_whole_;  // Whether all of it, and of where it goes, could be listed.
     const bool to_device_ = context_.direction == Direction::kPcToDevice;
     std::wstring blocked_;  // The folder last met that is a file on the other side, with a "\" at its end.
 };
@@ -135,38 +141,31 @@ DeviceResult CopyPcFolderToDevice(const EntryPaths& folder, const CopyContext& c
     if (context.cancel.IsSignalled()) {
         return DeviceResult::kListingCancelled;
     }
-    if (source.unread) {
-        return DeviceResult::kDone;
-    }
     // A target that cannot be listed counts as empty: no copy replaces what no listing has shown.
     FileNode target;
     if (ListDeviceTree(folder.device, context.cancel, target) == DeviceResult::kListingCancelled) {
         return DeviceResult::kListingCancelled;
     }
-    return CompanionCopy(folder, context, rules, JobTable(source), JobTable(target)).Run();
+    return CompanionCopy(folder, context, rules, source, target).Run();
 }
 
 DeviceResult CopyDeviceFolderToPc(const EntryPaths& folder, const CopyContext& context,
                                   const CompanionRules& rules) {
     const DeviceSession session(context.cancel, context.session);
     const FileNode target = ListPcTree(folder.pc, context.cancel);
-    if (!session || target.unread) {
-        return target.unread ? DeviceResult::kDone : DeviceResult::kFailed;
+    if (!session) {
+        return DeviceResult::kFailed;
     }
     FileNode source;
     const DeviceResult listed = ListDeviceTree(folder.device, context.cancel, source);
-    if (listed == DeviceResult::kFailed && Side::Device().Find(folder.device).kind == EntryKind::kNone &&
-        IsDeviceThere(context.cancel)) {
-        return DeviceResult::kDone;  // There is none.
-    }
     if (listed != DeviceResult::kDone) {
-        return listed;
+        const FoundEntry found = Side::Device().Find(folder.device);
+        const bool is_absent = found.kind == EntryKind::kNone && found.is_certain;
+        return listed == DeviceResult::kFailed && is_absent ? DeviceResult::kDone : listed;
     }
     CopyContext in_session = {context.direction, context.purpose, Session::kCallers, context.old_file,
                               context.cancel};
-    const JobTable rows(source);
-    const DeviceResult copied = CompanionCopy(folder, in_session, rules, rows, JobTable(target)).Run();
-    return copied == DeviceResult::kDone && !rows.IsComplete() ? DeviceResult::kFailed : copied;
+    return CompanionCopy(folder, in_session, rules, source, target).Run();
 }
 
 }  // namespace orvane

@@ -8,8 +8,9 @@
 // The results are those of the file copies, and kListingCancelled: kDone when the companion is whole on the
 // other side, else the first one that is not. One file that fails does not end the walk; the cancel event, a
 // full disk and a lost connection do. What can never be copied does not count: a path that does not fit, a
-// name that the PC cannot hold, a file where the other side has a folder of its name or the other way round,
-// a PC folder that cannot be read. Any thread may call.
+// name that the PC cannot hold, a file where the other side has a folder of its name or the other way round.
+// A folder that cannot be read, on either side, does: what it holds may be readable the next time. Any thread
+// may call.
 #pragma once
 
 #include <string>

@@ -7,16 +7,14 @@ namespace orvane {
 
 namespace {
 
-// The paths of the companion; nothing when there is none or it can never be copied.
+// The paths of the companion; nothing when it can never be copied.
 std::optional<EntryPaths> CompanionOf(const EntryPaths& file, std::wstring_view name, Direction direction) {
     const std::wstring_view folder = CompanionFolder(name);
     const EntryPaths paths = {std::wstring(CompanionFolder(file.pc)),
                               std::wstring(CompanionFolder(file.device))};
-    if (!IsSafePcRelativePath(folder) || !CanCopy(paths, folder, direction, /*with_backup=*/false) ||
-        (direction == Direction::kPcToDevice && Side::Pc().Find(paths.pc).kind != EntryKind::kFolder)) {
-        return std::nullopt;
-    }
-    return paths;
+    return IsSafePcRelativePath(folder) && CanCopy(paths, folder, direction, /*with_backup=*/false)
+               ? std::optional(paths)
+               : std::nullopt;
 }
 
 DeviceResult CopyCompanion(const EntryPaths& folder, const CopyContext& context,
@@ -24,6 +22,12 @@ DeviceResult CopyCompanion(const EntryPaths& folder, const CopyContext& context,
     // To the device it is copied in the session of its job file; to the PC that is closed by now, unless it
     // is a caller's.
     const bool to_device = context.direction == Direction::kPcToDevice;
+    if (to_device) {
+        const FoundEntry found = Side::Pc().Find(folder.pc);
+        if (found.kind != EntryKind::kFolder) {
+            return found.is_certain ? DeviceResult::kDone : DeviceResult::kFailed;
+        }
+    }
     const CopyContext companion = {context.direction, Purpose::kCompanion,
                                    to_device ? Session::kCallers : context.session, context.old_file,
                                    context.cancel};

@@ -11,14 +11,11 @@ namespace orvane {
 
 namespace {
 
-// All three times of the source; the present time where they cannot be read.
-FileTimes TimesOf(const Side& side, HANDLE source) {
+// All three times of the source; that of the listing where they cannot be read.
+FileTimes TimesOf(const Side& side, HANDLE source, const FileToCopy& file) {
     FileTimes times{};
-    if (!side.GetTimes(source, times)) {
-        GetSystemTimeAsFileTime(&times.last_write);
-        times.creation = times.last_access = times.last_write;
-    }
-    return times;
+    return side.GetTimes(source, times) ? times
+                                        : FileTimes{file.write_time, file.write_time, file.write_time};
 }
 
 // `times` are the source's. Of a pass it is meant that the times of an open file are asked for first and the
@@ -56,6 +53,12 @@ class Placing {
             side_.Delete(aside_);
         }
         return placed ? DeviceResult::kDone : DeviceResult::kFailed;
+    }
+
+    bool TargetIsAsListed() const {
+        const FoundEntry target = Look();
+        return target.kind == EntryKind::kNone || (target.kind == EntryKind::kFile && file_.target_time &&
+                                                   SameFileTime(target.write_time, *file_.target_time));
     }
 
   private:
@@ -103,16 +106,26 @@ class Placing {
     const std::wstring& aside_;
 };
 
+// Places the copy after what has to be done before. That may take long: the target is looked at ahead of it,
+// too, so that nothing is done in vain, and nobody else must have begun a copy of the same file meanwhile.
 DeviceResult PlaceAfter(const BeforePlacing& before_placing, const FileToCopy& file,
                         const CopyContext& context, const std::wstring& aside) {
-    if (before_placing) {
-        const DeviceResult result = before_placing();
-        if (result != DeviceResult::kDone) {
-            context.Target().Delete(aside);
-            return result;
-        }
+    const Side& side = context.Target();
+    const Placing placing(file, context, aside);
+    if (!before_placing) {
+        return placing.Run();
     }
-    return Placing(file, context, aside).Run();
+    const FoundEntry whole = side.Find(aside);
+    DeviceResult result = placing.TargetIsAsListed() ? before_placing() : DeviceResult::kFailed;
+    const FoundEntry now = side.Find(aside);
+    if (now.kind != EntryKind::kFile || !SameFileTime(now.write_time, whole.write_time)) {
+        return DeviceResult::kFailed;
+    }
+    if (result == DeviceResult::kDone) {
+        return placing.Run();
+    }
+    side.Delete(aside);
+    return result;
 }
 
 // Ends a copy to the device that failed: closes and deletes what was written, and closes the session if it is
@@ -144,7 +157,7 @@ CopyOutcome CopyToDevice(const FileToCopy& file, const CopyContext& context,
     if (!source || !GetFileSizeEx(source.Get(), &size)) {
         return NotBegun();
     }
-    const FileTimes times = TimesOf(Side::Pc(), source.Get());
+    const FileTimes times = TimesOf(Side::Pc(), source.Get(), file);
     DeviceSession session(context.cancel, context.session);
     if (!session) {
         return {DeviceResult::kFailed};
@@ -193,7 +206,7 @@ CopyOutcome CopyToPc(const FileToCopy& file, const CopyContext& context,
     }
     FileTimes times{};
     if (context.purpose == Purpose::kManualView) {
-        times = TimesOf(Side::Device(), source.Get());
+        times = TimesOf(Side::Device(), source.Get(), file);
     }
     DeviceResult result = CopyContent(context, source.Get(), target.Get(), file.size);
     if (result == DeviceResult::kDone && !Date(context, file, times, source.Get(), target.Get())) {

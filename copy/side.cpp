@@ -27,6 +27,12 @@ HANDLE OrNull(HANDLE file) {
     return file == INVALID_HANDLE_VALUE ? nullptr : file;
 }
 
+// What a search that fails with that error has found.
+FoundEntry NothingFound(DWORD error) {
+    return {.is_certain = error == ERROR_FILE_NOT_FOUND || error == ERROR_PATH_NOT_FOUND ||
+                          error == ERROR_NO_MORE_FILES};
+}
+
 class PcSide final : public Side {
   public:
     HANDLE OpenSource(const std::wstring& path) const override {
@@ -56,8 +62,10 @@ class PcSide final : public Side {
     FoundEntry Find(const std::wstring& path, SearchEnd /*end*/) const override {
         WIN32_FIND_DATAW found;
         const UniqueFind search(FindFirstFileW(path.c_str(), &found));
-        return search ? FoundEntry{KindOf(found.dwFileAttributes), found.ftLastWriteTime, found.cFileName}
-                      : FoundEntry{};
+        return search ? FoundEntry{.kind = KindOf(found.dwFileAttributes),
+                                   .write_time = found.ftLastWriteTime,
+                                   .name = found.cFileName}
+                      : NothingFound(GetLastError());
     }
     bool Delete(const std::wstring& path) const override { return DeleteFileW(path.c_str()) != FALSE; }
     bool Move(const std::wstring& from, const std::wstring& to) const override {
@@ -99,13 +107,13 @@ class DeviceSide final : public Side {
         rapi::FindData found{};
         const HANDLE search = CeFindFirstFile(PathBuffer(path).Get(), &found);
         if (search == INVALID_HANDLE_VALUE || search == nullptr) {
-            return {};
+            return NothingFound(CeGetLastError());
         }
         if (end == SearchEnd::kNow) {
             CeFindClose(search);
         }
         found.name[std::size(found.name) - 1] = L'\0';  // The device's answers are not trusted.
-        return {KindOf(found.attributes), found.last_write_time, found.name};
+        return {.kind = KindOf(found.attributes), .write_time = found.last_write_time, .name = found.name};
     }
     bool Delete(const std::wstring& path) const override {
         return CeDeleteFile(PathBuffer(path).Get()) != FALSE;

@@ -35,6 +35,7 @@ class PathBuffer {
 enum class EntryKind { kNone, kFile, kFolder };
 struct FoundEntry {
     EntryKind kind = EntryKind::kNone;
+    bool is_certain = true;  // Of nothing found: the side said so, and did not just refuse the search.
     FILETIME write_time = {};
     std::wstring name = {};  // As the side writes it.
 };

@@ -50,7 +50,9 @@ DWORD WINAPI LoadDeviceFolderThread(void* parameter) {
     *request.root = {};
     if (const DeviceSession session(request.cancel_event); session) {
         request.result = List(request);
-        ReadDeviceProductFolders(request.data_directory, request.library_directory);
+        if (request.result != DeviceResult::kListingCancelled) {  // Else somebody wants to leave.
+            ReadDeviceProductFolders(request.data_directory, request.library_directory);
+        }
     }
     // Nobody waits for a load that was cancelled.
     if (request.result != DeviceResult::kListingCancelled && request.notify_window != nullptr) {

@@ -150,9 +150,8 @@ std::wstring FindUsualFolder() {
 
 }  // namespace
 
-std::wstring FindDeviceJobFolder() {
-    const UniqueEvent cancel = NewManualResetEvent();
-    const DeviceSession session(cancel.Get());
+std::wstring FindDeviceJobFolder(const CancelEvent& cancel) {
+    const DeviceSession session(cancel);
     if (!session) {
         return {};
     }
@@ -170,7 +169,7 @@ std::wstring FindDeviceJobFolder() {
 SyncSettings LoadSettings() {
     SyncSettings settings;
     settings.sync_path_dt = LoadPcFolder();
-    settings.sync_path_ce = FindDeviceJobFolder();
+    settings.sync_path_ce = FindDeviceJobFolder(CancelEvent());
     for (const StoredFlag& stored : kReadOrder) {
         std::wstring text;
         if (!ReadSetting(stored.setting, text)) {

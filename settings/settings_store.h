@@ -9,6 +9,7 @@
 #include <string>
 
 #include "jobs/file_types.h"
+#include "platform/cancel_event.h"
 #include "platform/paths.h"
 
 namespace orvane {
@@ -57,7 +58,7 @@ using SyncSettingsBlock = std::array<std::wstring, 2 + kFileTypes.size() + kFlag
 // answers anything else, or the call does not reach it, the stored folder stands. Empty when no device
 // session can be opened, or when neither is there: no device folder is meant then, never all of the device,
 // which is "\". May take as long as ConnectDevice waits.
-std::wstring FindDeviceJobFolder();
+std::wstring FindDeviceJobFolder(const CancelEvent& cancel);
 
 // Reads all settings of the current user and writes back a default for every one that is missing. The device
 // job folder comes from FindDeviceJobFolder, and with it the time that it takes.

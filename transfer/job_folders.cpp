@@ -18,7 +18,7 @@ ui::Waited ReadJobFolders(HWND dialog, SyncSettings& settings, DeviceTreeReader&
     const auto read = [&] {
         std::wstring& folder = settings.sync_path_ce;
         if (folder.empty()) {
-            folder = FindDeviceJobFolder();
+            folder = FindDeviceJobFolder(reader.StopEvent());
         }
         FileNode root;
         device_read =

@@ -176,12 +176,12 @@ TEST_F(SettingsTest, NoFailedCallPutsAnotherFolderInPlaceOfTheStoredOne) {
         // The stored folder is looked for, then one candidate after the other.
         for (int call = 1; call <= 3; ++call) {
             device_.Set(fault, std::to_wstring(call));
-            EXPECT_EQ(FindDeviceJobFolder(), call == 1 ? L"\\My Jobs\\" : L"") << fault << call;
+            EXPECT_EQ(FindDeviceJobFolder(CancelEvent()), call == 1 ? L"\\My Jobs\\" : L"") << fault << call;
             EXPECT_EQ(Stored(L"SyncPath_CE"), L"\\My Jobs\\") << fault << call;
         }
         device_.Clear(fault);
     }
-    EXPECT_EQ(FindDeviceJobFolder(), L"\\CF Card\\Qel ORVANE\\Jobs");
+    EXPECT_EQ(FindDeviceJobFolder(CancelEvent()), L"\\CF Card\\Qel ORVANE\\Jobs");
 }
 
 TEST_F(SettingsTest, BoxesOfTypesFollowTheUser) {
