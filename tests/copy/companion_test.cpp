@@ -19,8 +19,7 @@ using testing::ReadTextFile;
 using testing::WriteTextFile;
 using Names = std::vector<std::wstring>;
 
-constexpr auto kDone = DeviceResult::kDone;
-constexpr auto kFailed = DeviceResult::kFailed;
+using enum DeviceResult;
 
 // A job file "job.wkf" and its companion "job", in both directions.
 class CompanionTest : public CopyTest, public ::testing::WithParamInterface<Direction> {

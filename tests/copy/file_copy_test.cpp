@@ -19,10 +19,7 @@ using testing::Exists;
 using testing::ReadTextFile;
 using testing::WriteTextFile;
 
-constexpr auto kDone = DeviceResult::kDone;
-constexpr auto kFailed = DeviceResult::kFailed;
-constexpr auto kCancelled = DeviceResult::kCancelled;
-constexpr auto kDiskFull = DeviceResult::kDiskFull;
+using enum DeviceResult;
 
 const FILETIME kSourceTime = testing::UtcTime(1985, 5, 6, 7, 8, 10);
 const FILETIME kTargetTime = testing::UtcTime(1984, 1, 2, 3, 4, 6);
@@ -280,11 +277,8 @@ TEST_F(CopyTest, FullPcDiskIsTold) {
 
 TEST(AsidePath, FitsForEveryTargetAndDiffersForEach) {
     const std::wstring deep = L"C:\\" + std::wstring(120, L'd') + L"\\" + std::wstring(120, L'e');  // 244
-    struct Case {
-        std::wstring target;
-        std::wstring folder;
-    };
-    const Case cases[] = {
+    const std::pair<std::wstring, std::wstring> cases[] = {
+        // A target, and what its copy begins with.
         {L"C:\\jobs\\a.qvj", L"C:\\jobs\\a.qvj.orvane-part"},
         {deep + L"\\12345.qvj", L"C:\\" + std::wstring(120, L'd') + L"\\"},
         {deep + L"\\22345.qvj", L"C:\\" + std::wstring(120, L'd') + L"\\"},
@@ -292,12 +286,12 @@ TEST(AsidePath, FitsForEveryTargetAndDiffersForEach) {
         {L"\\" + std::wstring(257, L'f') + L"\\n", L"\\"},
     };
     std::wstring last;
-    for (const Case& each : cases) {
-        const std::wstring aside = AsidePath(each.target);
-        EXPECT_TRUE(aside.starts_with(each.folder)) << ::testing::PrintToString(aside);
+    for (const auto& [target, folder] : cases) {
+        const std::wstring aside = AsidePath(target);
+        EXPECT_TRUE(aside.starts_with(folder)) << ::testing::PrintToString(aside);
         EXPECT_LE(aside.size(), 259u);
         EXPECT_TRUE(IsAside(aside));
-        EXPECT_EQ(aside.rfind(L'\\'), each.folder.rfind(L'\\'));
+        EXPECT_EQ(aside.rfind(L'\\'), folder.rfind(L'\\'));
         EXPECT_NE(aside, last);
         last = aside;
     }

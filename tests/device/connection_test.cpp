@@ -73,13 +73,6 @@ TEST_F(DeviceConnection, ServesSentMessagesWithinTheLimit) {
     DestroyWindow(window);
 }
 
-TEST(ClockCheck, WordsTheDifference) {
-    EXPECT_EQ(FormatDateDifferenceMessage({5, 3, 2024, 9, 7, 2}, {5, 3, 2024, 9, 10, 2}),
-              L"PC Date is different from DEVICE!\n\n"
-              L"PC       :05/03/2024  09:07:02\n"
-              L"Device :05/03/2024  09:10:02");
-}
-
 // The present time, at the beginning of a second and not within half a minute of midnight, so that the
 // clocks are read in the same second and on the same date.
 FILETIME BeginningOfASecond() {
