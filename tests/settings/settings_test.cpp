@@ -140,7 +140,6 @@ TEST_F(SettingsTest, ReadsWhateverTheRegistryHolds) {
     EXPECT_TRUE(LoadSettings().types[RowOfType(L".qvj")]) << "too long to be read: the default";
     const std::tuple<DWORD, std::wstring, DWORD, std::wstring> cases[] = {
         {REG_SZ, L"abc", 3 * 2, L"abc"},  // Without a terminator.
-        {REG_EXPAND_SZ, L"%TEMP%", 7 * 2, L"%TEMP%"},
         {REG_BINARY, L"ab", 3, {L'a', L'b'}},
         {REG_SZ, std::wstring(509, L'x'), 510 * 2, std::wstring(509, L'x')}};
     for (const auto& [type, data, bytes, expected] : cases) {
@@ -184,22 +183,7 @@ TEST_F(SettingsTest, NoFailedCallPutsAnotherFolderInPlaceOfTheStoredOne) {
     EXPECT_EQ(FindDeviceJobFolder(CancelEvent()), L"\\CF Card\\Qel ORVANE\\Jobs");
 }
 
-TEST_F(SettingsTest, BoxesOfTypesFollowTheUser) {
-    Set(kWarn | kOverwrite);
-    COptionsDlg dialog(block_, owner_);
-    ASSERT_TRUE(dialog.Create());
-    for (const FileType& type : kFileTypes) {
-        EXPECT_EQ(ItemText(dialog.Handle(), type.box), L"Copy *" + std::wstring(type.extension) + L" files.");
-        Click(dialog.Handle(), type.box);
-    }
-    EXPECT_EQ(Ticked(dialog.Handle()), kTypes | kAll | kWarn | kOverwrite);
-    for (const Flags& types : {Flags(), kTypes, kTypes | kAll}) {
-        Click(dialog.Handle(), types == kTypes ? IDC_OPTIONS_SELECT_ALL : IDC_OPTIONS_ALL_FILES);
-        EXPECT_EQ(Ticked(dialog.Handle()), types | kWarn | kOverwrite);
-    }
-}
-
-TEST_F(SettingsTest, WarningAndBackupDependOnOverwriting) {
+TEST_F(SettingsTest, BoxesFollowTheUserAndOneAnother) {
     for (const Flags& at_start : {kDependent, kDependent | kOverwrite}) {
         Set(at_start);
         COptionsDlg dialog(block_, owner_);
@@ -207,12 +191,22 @@ TEST_F(SettingsTest, WarningAndBackupDependOnOverwriting) {
         bool on = at_start != kDependent;
         EXPECT_EQ(Ticked(dialog.Handle()), on ? at_start : Flags());
         for (int clicks = 0; clicks < 2; ++clicks, on = !on) {
-            EXPECT_EQ(IsWindowEnabled(GetDlgItem(dialog.Handle(), IDC_OPTIONS_WARN)) != FALSE, on);
-            EXPECT_EQ(IsWindowEnabled(GetDlgItem(dialog.Handle(), IDC_OPTIONS_BACKUP)) != FALSE, on);
+            for (const int box : {IDC_OPTIONS_WARN, IDC_OPTIONS_BACKUP}) {
+                EXPECT_EQ(IsWindowEnabled(GetDlgItem(dialog.Handle(), box)) != FALSE, on);
+            }
             Click(dialog.Handle(), IDC_OPTIONS_OVERWRITE);
         }
         // Of two that were ticked the warning stays so.
-        EXPECT_EQ(Ticked(dialog.Handle()), on ? kWarn | kOverwrite : Flags());
+        const Flags left = on ? kWarn | kOverwrite : Flags();
+        EXPECT_EQ(Ticked(dialog.Handle()), left);
+        for (const FileType& type : kFileTypes) {
+            Click(dialog.Handle(), type.box);
+        }
+        EXPECT_EQ(Ticked(dialog.Handle()), kTypes | kAll | left);
+        for (const Flags& types : {Flags(), kTypes, kTypes | kAll}) {
+            Click(dialog.Handle(), types == kTypes ? IDC_OPTIONS_SELECT_ALL : IDC_OPTIONS_ALL_FILES);
+            EXPECT_EQ(Ticked(dialog.Handle()), types | left);
+        }
     }
 }
 
@@ -268,7 +262,6 @@ TEST_F(SettingsTest, OnlyAChosenPcFolderDropsWhatWasTyped) {
     const std::tuple<int, int, std::wstring, std::wstring, std::wstring> runs[] = {
         {IDC_OPTIONS_PC_BROWSE, IDCANCEL, typed, pc, L"C:\\a " + typed},
         {IDC_OPTIONS_PC_BROWSE, IDOK, typed, pc, pc + L" \\Jobs\\"},
-        {IDC_OPTIONS_DEVICE_BROWSE, IDCANCEL, typed, L"\\Jobs\\North\\", L"C:\\a " + typed},
         {IDC_OPTIONS_DEVICE_BROWSE, IDOK, typed, L"\\Jobs\\North\\", L"C:\\a \\Jobs\\North\\"},
         // Nothing is selected, as on a device that cannot be read.
         {IDC_OPTIONS_DEVICE_BROWSE, IDOK, L"\\gone\\", L"", L"C:\\a \\gone\\"}};

@@ -4,8 +4,12 @@
 
 #include <functional>
 #include <stdexcept>
+#include <thread>
+#include <utility>
+#include <vector>
 
 #include "ui/control.h"
+#include "ui/report_queue.h"
 
 namespace orvane::ui {
 namespace {
@@ -80,6 +84,58 @@ TEST(Control, HandlesItsMessagesAndItsNotificationsBeforeTheDialog) {
     EXPECT_EQ(code(), system_answer);
     dialog.Destroy();
     EXPECT_EQ(control.Handle(), nullptr);
+}
+
+constexpr UINT kReports = WM_APP + 1;
+
+class ReportQueueTest : public ::testing::Test {
+  protected:
+    ReportQueueTest() { queue_.SetTarget(window_, kReports); }
+    ~ReportQueueTest() override { DestroyWindow(window_); }
+
+    int PostedMessages() const {
+        int count = 0;
+        for (MSG message; PeekMessageW(&message, window_, kReports, kReports, PM_REMOVE); ++count) {
+        }
+        return count;
+    }
+    void Push(int count, int thread = 0) {
+        for (int number = 0; number < count; ++number) {
+            queue_.Push({thread, number});
+        }
+    }
+
+    HWND window_ = CreateWindowExW(0, L"STATIC", L"", 0, 0, 0, 0, 0, HWND_MESSAGE, nullptr, nullptr, nullptr);
+    ReportQueue<std::pair<int, int>> queue_;  // A thread and its report's number.
+};
+
+TEST_F(ReportQueueTest, LosesNothingFromSeveralThreads) {
+    constexpr int kPerThread = 25'000;
+    std::jthread first([this] { Push(kPerThread); });
+    std::jthread second([this] { Push(kPerThread, 1); });
+    // Only what the queue posts makes this thread look: a notification that is left out hangs the test.
+    for (int next[2] = {}; next[0] + next[1] < 2 * kPerThread;) {
+        MSG message;
+        ASSERT_GT(GetMessageW(&message, window_, kReports, kReports), 0);
+        while (
+            !queue_.Drain(1, [&](const auto& report) { EXPECT_EQ(report.second, next[report.first]++); })) {
+        }
+    }
+}
+
+TEST_F(ReportQueueTest, NotifiesOncePerFilling) {
+    Push(20'000);  // More than a message queue holds.
+    EXPECT_EQ(PostedMessages(), 1);
+    std::vector<int> handled;
+    const auto handle = [&](const auto& report) { handled.push_back(report.first); };
+    EXPECT_FALSE(queue_.Drain(0, handle));
+    queue_.PushLast({1, 0});
+    EXPECT_EQ(PostedMessages(), 0) << "the window drains again without being told";
+    EXPECT_TRUE(queue_.Drain(60'000, handle));
+    ASSERT_EQ(handled.size(), 20'001U);
+    EXPECT_EQ(handled.back(), 1);
+    queue_.PushLast({});
+    EXPECT_EQ(PostedMessages(), 1);
 }
 
 }  // namespace
