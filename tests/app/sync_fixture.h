@@ -12,6 +12,7 @@
 #include "app/sync_dialog.h"
 #include "jobs/file_types.h"
 #include "platform/resources.h"
+#include "qelutils/xlate.h"
 #include "res/ids.h"
 #include "settings/settings_store.h"
 #include "tests/support/dialog_thread.h"
@@ -64,6 +65,7 @@ class SyncTest : public JobFolders {
   protected:
     SyncTest() {
         RegisterDialogClass();
+        qel_text::SetCatalogLanguage(MAKELANGID(LANG_ENGLISH, SUBLANG_ENGLISH_US));
         Setting(L"SyncPath_DT", pc_.Path() + L"\\");
         Setting(L"SyncPath_CE", L"\\Jobs\\");
         for (const FileType& type : kFileTypes) {
@@ -76,11 +78,6 @@ class SyncTest : public JobFolders {
     static void Setting(const std::wstring& name, const std::wstring& text) {
         EXPECT_TRUE(RegWriteString(HKEY_CURRENT_USER, L"Software\\Veltrano\\CE Devices", name, text));
     }
-    // "newer" on the PC and, a minute older, "older" on the device.
-    void PutNewerOnPc(const std::wstring& name) const {
-        PutOnPc(name, 60, "newer");
-        PutOnDevice(name, 0, "older");
-    }
     // Creates files new_0.qvj, new_1.qvj, ... on the PC.
     void PutManyOnPc(int count) const {
         for (int i = 0; i < count; ++i) {
@@ -88,11 +85,5 @@ class SyncTest : public JobFolders {
         }
     }
 };
-
-// A dialog of that caption that can be seen; null when there is none.
-inline HWND Shown(const wchar_t* caption) {
-    HWND window = FindWindowW(L"#32770", caption);
-    return window != nullptr && IsWindowVisible(window) ? window : nullptr;
-}
 
 }  // namespace orvane::testing

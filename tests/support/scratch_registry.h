@@ -4,6 +4,8 @@
 #include <gtest/gtest.h>
 #include <windows.h>
 
+#include <utility>
+
 namespace orvane::testing {
 
 // As long as it lives, the current user's and the local machine's registry are two empty keys to this
@@ -13,13 +15,10 @@ class ScratchRegistry {
     ScratchRegistry() {
         RegDeleteTreeW(HKEY_CURRENT_USER, kKey);  // Of a test program that was ended.
         // The current user's root comes last, since the scratch keys lie below the real one.
-        for (HKEY root : {HKEY_LOCAL_MACHINE, HKEY_CURRENT_USER}) {
+        for (const auto& [root, path] : {std::pair{HKEY_LOCAL_MACHINE, L"Software\\orvane_test\\machine"},
+                                         std::pair{HKEY_CURRENT_USER, L"Software\\orvane_test\\user"}}) {
             HKEY key = nullptr;
-            EXPECT_EQ(RegCreateKeyW(HKEY_CURRENT_USER,
-                                    root == HKEY_CURRENT_USER ? L"Software\\orvane_test\\user"
-                                                              : L"Software\\orvane_test\\machine",
-                                    &key),
-                      ERROR_SUCCESS);
+            EXPECT_EQ(RegCreateKeyW(HKEY_CURRENT_USER, path, &key), ERROR_SUCCESS);
             EXPECT_EQ(RegOverridePredefKey(root, key), ERROR_SUCCESS);
             RegCloseKey(key);
         }

@@ -181,13 +181,6 @@ TEST_F(TransferTest, FollowsTheKeyboard) {
         PutOnDevice(L"site" + std::to_wstring(folder) + L"\\a.qvj");
     }
     TransferRun run(settings_);
-    const auto hold_control = [&](BYTE state) {
-        run.Call([&](TestedDialog&) {
-            BYTE keys[256] = {};
-            keys[VK_CONTROL] = state;
-            SetKeyboardState(keys);
-        });
-    };
     Lines names;
     for (const UINT key : {VK_RETURN, VK_F5}) {
         PutOnPc(names.emplace_back(key == VK_F5 ? L"b.qvj" : L"a.qvj"));
@@ -197,10 +190,13 @@ TEST_F(TransferTest, FollowsTheKeyboard) {
     }
     run.Key(VK_SPACE);
     EXPECT_TRUE(WaitUntil([&] { return run.Ticks() == Lines{L"0", L"1"}; })) << "no row has the focus";
-    hold_control(0x80);
-    run.Key('A');
-    EXPECT_TRUE(WaitUntil([&] { return run.Ticks() == Lines{L"0", L"0"}; }));
-    hold_control(0);
+    BYTE keys[256] = {};
+    for (const BYTE control : {BYTE{0x80}, BYTE{0}}) {
+        keys[VK_CONTROL] = control;
+        run.Call([&](TestedDialog&) { SetKeyboardState(keys); });
+        run.Key(control != 0 ? 'A' : VK_CONTROL);
+        EXPECT_TRUE(WaitUntil([&] { return run.Ticks() == Lines{L"0", L"0"}; }));
+    }
 
     // While a slow device is read a second "Refresh" is dropped, and Escape ends all of it.
     device_.Set(L"CALL_DELAY", L"200");
@@ -280,12 +276,10 @@ TEST_F(TransferTest, CopiesTickedFilesOrAll) {
 TEST_F(TransferTest, ReplacesWhatTheUserAllowsAndListsWhatIsLeft) {
     settings_.overwrite_warn = true;
     PutOnPc(L"new.qvj", 11);
-    PutOnPc(L"close.qvj", 10);
-    PutOnPc(L"kept.qvj", 11);
-    PutOnPc(L"replaced.txt");
-    PutOnDevice(L"close.qvj");
-    PutOnDevice(L"kept.qvj");
-    PutOnDevice(L"replaced.txt", 11);
+    for (const wchar_t* name : {L"close.qvj", L"kept.qvj", L"replaced.txt"}) {
+        PutOnPc(name, *name == L'c' ? 10 : 11);
+        PutOnDevice(name, *name == L'r' ? 22 : 0);
+    }
     // What a device may claim to have; the first name is one that the PC takes for a device of its own.
     device_.Set(L"EXTRA_ENTRIES", L"\\Jobs|NUL.txt;\\Jobs|vanished.txt");
     const MessageBoxAnswerer boxes({IDCANCEL, IDOK});
