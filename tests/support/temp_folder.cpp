@@ -1,7 +1,6 @@
 #include "tests/support/temp_folder.h"
 
 #include <gtest/gtest.h>
-#include <process.h>
 
 #include <algorithm>
 #include <atomic>
@@ -84,14 +83,23 @@ bool MakeLink(const std::wstring& path, const std::wstring& target) {
     if (unix_name == nullptr) {
         return false;
     }
-    const auto quoted = [&](const std::wstring& each) {
+    std::wstring command = L"ln -s";
+    for (const std::wstring& each : {target, path}) {
         char* name = unix_name(each.c_str());
-        const std::wstring text = L"\"" + fs::path(name).wstring() + L"\"";
+        command += L" \"" + std::filesystem::path(name).wstring() + L"\"";
         HeapFree(GetProcessHeap(), 0, name);
-        return text;
-    };
-    return _wspawnl(_P_WAIT, L"\\\\?\\unix\\bin\\ln", L"ln", L"-s", quoted(target).c_str(),
-                    quoted(path).c_str(), nullptr) == 0;
+    }
+    STARTUPINFOW start{};
+    start.cb = sizeof(start);
+    PROCESS_INFORMATION process{};
+    if (!CreateProcessW(L"\\\\?\\unix\\bin\\ln", command.data(), nullptr, nullptr, FALSE, 0, nullptr, nullptr,
+                        &start, &process)) {
+        return false;
+    }
+    WaitForSingleObject(process.hProcess, INFINITE);
+    CloseHandle(process.hThread);
+    CloseHandle(process.hProcess);
+    return true;
 }
 
 std::optional<std::string> ReadTextFile(const std::wstring& path) {
