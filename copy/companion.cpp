@@ -160,7 +160,7 @@ DeviceResult CopyDeviceFolderToPc(const EntryPaths& folder, const CopyContext& c
     const DeviceResult listed = ListDeviceTree(folder.device, context.cancel, source);
     if (listed != DeviceResult::kDone) {
         const FoundEntry found = Side::Device().Find(folder.device);
-        const bool is_absent = found.kind == EntryKind::kNone && found.is_certain;
+        const bool is_absent = found.kind == EntryKind::kNone && Side::Device().SaysNothingIsThere();
         return listed == DeviceResult::kFailed && is_absent ? DeviceResult::kDone : listed;
     }
     CopyContext in_session = {context.direction, context.purpose, Session::kCallers, context.old_file,

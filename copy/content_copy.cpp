@@ -136,9 +136,6 @@ class ContentCopy {
 }  // namespace
 
 DeviceResult CopyContent(const CopyContext& context, HANDLE source, HANDLE target, std::uint64_t size) {
-    if (context.cancel.IsSignalled()) {
-        return DeviceResult::kCancelled;
-    }
     ContentCopy copy(context, source, target, size);
     return context.direction == Direction::kPcToDevice ? copy.ToDevice() : copy.ToPc();
 }

@@ -23,9 +23,10 @@ DeviceResult CopyCompanion(const EntryPaths& folder, const CopyContext& context,
     // is a caller's.
     const bool to_device = context.direction == Direction::kPcToDevice;
     if (to_device) {
-        const FoundEntry found = Side::Pc().Find(folder.pc);
-        if (found.kind != EntryKind::kFolder) {
-            return found.is_certain ? DeviceResult::kDone : DeviceResult::kFailed;
+        const EntryKind kind = Side::Pc().Find(folder.pc).kind;
+        if (kind != EntryKind::kFolder) {
+            const bool has_none = kind == EntryKind::kFile || Side::Pc().SaysNothingIsThere();
+            return has_none ? DeviceResult::kDone : DeviceResult::kFailed;
         }
     }
     const CopyContext companion = {context.direction, Purpose::kCompanion,

@@ -146,6 +146,12 @@ void AbandonOnDevice(DeviceResult result, HANDLE target, const std::wstring& asi
     }
 }
 
+// Ahead of the first chunk. The connection of a session of the copy's own does not come about when the event
+// is signalled, so that the event has been looked at just now.
+bool IsCancelled(const CopyContext& context) {
+    return context.session == Session::kOwn ? context.cancel.Poll() : context.cancel.IsSignalled();
+}
+
 CopyOutcome NotBegun() {
     return {DeviceResult::kFailed, /*begun=*/false};
 }
@@ -162,7 +168,7 @@ CopyOutcome CopyToDevice(const FileToCopy& file, const CopyContext& context,
     if (!session) {
         return {DeviceResult::kFailed};
     }
-    if (context.cancel.IsSignalled()) {
+    if (IsCancelled(context)) {
         return {DeviceResult::kCancelled};
     }
     const std::wstring aside = AsidePath(file.paths.device);
@@ -196,7 +202,7 @@ CopyOutcome CopyToPc(const FileToCopy& file, const CopyContext& context,
     if (!source) {
         return NotBegun();
     }
-    if (context.cancel.IsSignalled()) {
+    if (IsCancelled(context)) {
         return {DeviceResult::kCancelled};
     }
     const std::wstring aside = AsidePath(file.paths.pc);

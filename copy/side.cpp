@@ -27,12 +27,6 @@ HANDLE OrNull(HANDLE file) {
     return file == INVALID_HANDLE_VALUE ? nullptr : file;
 }
 
-// What a search that fails with that error has found.
-FoundEntry NothingFound(DWORD error) {
-    return {.is_certain = error == ERROR_FILE_NOT_FOUND || error == ERROR_PATH_NOT_FOUND ||
-                          error == ERROR_NO_MORE_FILES};
-}
-
 class PcSide final : public Side {
   public:
     HANDLE OpenSource(const std::wstring& path) const override {
@@ -65,7 +59,7 @@ class PcSide final : public Side {
         return search ? FoundEntry{.kind = KindOf(found.dwFileAttributes),
                                    .write_time = found.ftLastWriteTime,
                                    .name = found.cFileName}
-                      : NothingFound(GetLastError());
+                      : FoundEntry{};
     }
     bool Delete(const std::wstring& path) const override { return DeleteFileW(path.c_str()) != FALSE; }
     bool Move(const std::wstring& from, const std::wstring& to) const override {
@@ -107,7 +101,7 @@ class DeviceSide final : public Side {
         rapi::FindData found{};
         const HANDLE search = CeFindFirstFile(PathBuffer(path).Get(), &found);
         if (search == INVALID_HANDLE_VALUE || search == nullptr) {
-            return NothingFound(CeGetLastError());
+            return {};
         }
         if (end == SearchEnd::kNow) {
             CeFindClose(search);
@@ -131,6 +125,11 @@ class DeviceSide final : public Side {
 };
 
 }  // namespace
+
+bool Side::SaysNothingIsThere() const {
+    const DWORD error = LastError();
+    return error == ERROR_FILE_NOT_FOUND || error == ERROR_PATH_NOT_FOUND || error == ERROR_NO_MORE_FILES;
+}
 
 const Side& Side::Pc() {
     static const PcSide side;

@@ -35,7 +35,6 @@ class PathBuffer {
 enum class EntryKind { kNone, kFile, kFolder };
 struct FoundEntry {
     EntryKind kind = EntryKind::kNone;
-    bool is_certain = true;  // Of nothing found: the side said so, and did not just refuse the search.
     FILETIME write_time = {};
     std::wstring name = {};  // As the side writes it.
 };
@@ -76,6 +75,8 @@ class Side {
     virtual DWORD LastError() const = 0;
 
     // Names.
+    // Right after a search that found nothing: whether the side said so, and did not just refuse.
+    bool SaysNothingIsThere() const;
     virtual FoundEntry Find(const std::wstring& path, SearchEnd end = SearchEnd::kNow) const = 0;
     virtual bool Delete(const std::wstring& path) const = 0;
     // Refuses where something has the new name already.
