@@ -103,7 +103,7 @@ class SyncPass {
     PassEnd CopyRow(std::size_t row) {
         const std::wstring_view name = source_.listing.table.names[row];
         const FileToCopy file = {folders_ + name, source_.listing.table.write_times[row],
-                                 source_.listing.table.sizes[row], TargetTime(name)};
+                                 source_.listing.table.sizes[row], index_.WriteTimeOf(name)};
         const bool keeps_backup = file.target_time && context_.old_file == OldFile::kKept;
         // What fails here must not reach an operation on the device.
         const bool can_copy = CanCopy(file.paths, name, kind_.direction, keeps_backup);
@@ -132,13 +132,6 @@ class SyncPass {
         return PassesExtensionFilter(name, task_.types) && row >= 0 &&
                target_.listing.table.kinds[static_cast<std::size_t>(row)] == kKindFile &&
                CanCopy(folders_ + name, name, kind_.direction, context_.old_file == OldFile::kKept);
-    }
-
-    // The write time of the file that the copy would replace, as it was listed; nothing where none was.
-    std::optional<FILETIME> TargetTime(std::wstring_view name) const {
-        const std::int32_t row = index_.Find(name);
-        return row < 0 ? std::nullopt
-                       : std::optional(target_.listing.table.write_times[static_cast<std::size_t>(row)]);
     }
 
     // The question has no owner window: it stands above all windows, whatever the dialog does meanwhile.

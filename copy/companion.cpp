@@ -79,23 +79,18 @@ class CompanionCopy {
             }
             return DeviceResult::kDone;
         }
-        return IsDue(row, target_row) ? CopyFile(row, target_row, paths) : DeviceResult::kDone;
+        const FileToCopy file = {paths, source_.table.write_times[row], source_.table.sizes[row],
+                                 index_.WriteTimeOf(name)};
+        return IsDue(name, file) ? CopyFile(file) : DeviceResult::kDone;
     }
 
-    bool IsDue(std::size_t row, std::int32_t target_row) const {
-        const std::wstring_view name = source_.table.names[row];
-        if (IsAside(name) || PassesExtensionFilter(name, rules_.own_rows)) {
-            return false;
-        }
-        return target_row < 0 || Replaces(rules_.overwrite_old_files, source_.table.write_times[row],
-                                          target_.table.write_times[static_cast<std::size_t>(target_row)]);
+    bool IsDue(std::wstring_view name, const FileToCopy& file) const {
+        return !IsAside(name) && !PassesExtensionFilter(name, rules_.own_rows) &&
+               (!file.target_time ||
+                Replaces(rules_.overwrite_old_files, file.write_time, *file.target_time));
     }
 
-    DeviceResult CopyFile(std::size_t row, std::int32_t target_row, const EntryPaths& paths) const {
-        FileToCopy file = {paths, source_.table.write_times[row], source_.table.sizes[row], std::nullopt};
-        if (target_row >= 0) {
-            file.target_time = target_.table.write_times[static_cast<std::size_t>(target_row)];
-        }
+    DeviceResult CopyFile(const FileToCopy& file) const {
         return to_device_ ? CopyPcFileToDevice(file, context_).result
                           : CopyDeviceFileToPc(file, context_).result;
     }

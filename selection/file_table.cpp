@@ -111,6 +111,11 @@ std::int32_t FileIndex::Find(std::wstring_view name) const {
     return row;
 }
 
+std::optional<FILETIME> FileIndex::WriteTimeOf(std::wstring_view name) const {
+    const std::int32_t row = Find(name);
+    return row == kNoRow ? std::nullopt : std::optional(table_.write_times[static_cast<std::size_t>(row)]);
+}
+
 std::size_t FileIndex::SlotOf(std::uint32_t hash, std::wstring_view name) const {
     const std::size_t mask = slots_.size() - 1;
     std::size_t at = hash & mask;

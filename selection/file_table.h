@@ -7,6 +7,7 @@
 #include <cstdint>
 #include <memory>
 #include <memory_resource>
+#include <optional>
 #include <string_view>
 #include <vector>
 
@@ -52,6 +53,8 @@ class FileIndex {
 
     // The first row whose name is equal without regard to case, whatever its kind; -1 if there is none.
     std::int32_t Find(std::wstring_view name) const;
+    // The write time of that row; nothing if there is none.
+    std::optional<FILETIME> WriteTimeOf(std::wstring_view name) const;
 
   private:
     // The slot that holds the row of the name or the empty slot where it would go.

@@ -50,9 +50,7 @@ bool BuildCandidates(const Comparison& comparison, const JobTable& source, const
             entry.second_text = DateText(write_time);
             entry.write_time = write_time;
             entry.size = source.table.sizes[row];
-            if (const std::int32_t target_row = index.Find(name); target_row >= 0) {
-                entry.target_time = target.table.write_times[static_cast<std::size_t>(target_row)];
-            }
+            entry.target_time = index.WriteTimeOf(name);
         }
     }
     return true;
