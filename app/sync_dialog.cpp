@@ -326,16 +326,15 @@ void CWendlowDlg::OnWorkerEnded(const SyncReport& report) {
 }
 
 void CWendlowDlg::OnComplete() {
+    // Both with what is not shown yet: each step of the bar and the log is drawn at once.
+    const LRESULT upper_end = SendMessageW(Item(IDC_SYNC_PROGRESS), PBM_GETRANGE, FALSE, 0);
+    unshown_steps_ += upper_end;  // Beyond its end the bar is full.
+    unshown_lines_.push_back(StatusText(RunState::kComplete));
     ShowReports();
-    HWND progress = Item(IDC_SYNC_PROGRESS);
-    const LRESULT upper_end = SendMessageW(progress, PBM_GETRANGE, FALSE, 0);
-    SendMessageW(progress, PBM_SETPOS, static_cast<WPARAM>(upper_end), 0);
-    AddLogLine(StatusText(RunState::kComplete));
-    SelectLastLogLine();
     Enter(RunState::kComplete);
     UpdateWindow(Handle());
     Sleep(100);  // The full bar is seen for a moment.
-    ShowWindow(progress, SW_HIDE);
+    ShowWindow(Item(IDC_SYNC_PROGRESS), SW_HIDE);
 }
 
 void CWendlowDlg::Enter(RunState state) {
