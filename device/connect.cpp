@@ -41,7 +41,7 @@ DWORD WaitForSession(HANDLE cancel_event, HANDLE session_event) {
 
 }  // namespace
 
-HRESULT ConnectDevice(HANDLE cancel_event) {
+HRESULT ConnectDevice(const CancelEvent& cancel_event) {
     rapi::InitRecord record{};
     record.size = sizeof(record);
     const HRESULT started = CeRapiInitEx(&record);
@@ -49,8 +49,9 @@ HRESULT ConnectDevice(HANDLE cancel_event) {
         return started;
     }
     HRESULT result = E_FAIL;
-    switch (WaitForSession(cancel_event, record.init_event)) {
+    switch (WaitForSession(cancel_event.Handle(), record.init_event)) {
         case kSessionSignalled:
+            cancel_event.CountAsLook();  // Of two signalled events the wait would have told the first.
             result = record.init_result;
             break;
         case kCancelSignalled:

@@ -15,8 +15,8 @@ namespace orvane {
 // Returns a value >= 0 when the session stands: the caller closes it with CeRapiUninit on the same thread.
 // A negative value leaves no session open: what CeRapiInitEx or the device answered, 0x800704C7 (the
 // HRESULT of ERROR_CANCELLED) after the cancel event, E_FAIL when the device did not confirm in time or
-// `cancel_event` is no event.
-HRESULT ConnectDevice(HANDLE cancel_event);
+// `cancel_event` has none.
+HRESULT ConnectDevice(const CancelEvent& cancel_event);
 
 // Whose session an operation works in: one of its own, or the one that its caller holds on the same thread.
 enum class Session { kOwn, kCallers };
@@ -27,7 +27,7 @@ enum class Session { kOwn, kCallers };
 class DeviceSession {
   public:
     explicit DeviceSession(const CancelEvent& cancel, Session session = Session::kOwn)
-        : owned_(session == Session::kOwn && SUCCEEDED(ConnectDevice(cancel.Handle()))),
+        : owned_(session == Session::kOwn && SUCCEEDED(ConnectDevice(cancel))),
           stands_(session == Session::kCallers || owned_) {}
     DeviceSession(const DeviceSession&) = delete;
     DeviceSession& operator=(const DeviceSession&) = delete;

@@ -17,7 +17,7 @@ void CancelEvent::Reset() {
 }
 
 bool CancelEvent::IsSignalled() const {
-    looked_at_ = Clock::now();
+    CountAsLook();
     return signalled_ || orvane::IsSignalled(event_);
 }
 

@@ -40,6 +40,8 @@ class CancelEvent {
     // The same for loops: true at once after Signal, at most kLookInterval late after SetEvent on the handle.
     // A loop begins with IsSignalled.
     bool Poll() const;
+    // For who has waited on the handle and found it not signalled: that stands for a look.
+    void CountAsLook() const { looked_at_ = Clock::now(); }
 
   private:
     using Clock = std::chrono::steady_clock;
