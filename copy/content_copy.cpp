@@ -8,8 +8,8 @@ namespace orvane {
 namespace {
 
 constexpr DWORD kChunkBytes = 8192;
-// As large as pays: measured with files of 8 MB.
-constexpr DWORD kMaxPieceBytes = 32 * kChunkBytes;
+// Larger ones gain nothing and 1 MiB loses, measured with files of 8 MB.
+constexpr DWORD kMaxPieceBytes = 16 * kChunkBytes;
 
 // What the PC's side holds of a file at a time: room for the whole of a small one and a byte that it may have
 // grown by, in full chunks.
