@@ -23,7 +23,7 @@ void Device::ReadSettings() {
     handles.CloseAll();
     std::shared_ptr<Configuration> configuration = Current();
     if (SettingTexts texts = SettingTexts::Read();
-        !configuration->IsUsable() || !(configuration->settings.texts == Settings(texts).texts)) {
+        !configuration->IsUsable() || !configuration->settings.texts.SaysTheSame(texts)) {
         configuration = std::make_shared<Configuration>(std::move(texts));
     }
     configuration->times.LookAtVolume();

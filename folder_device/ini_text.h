@@ -15,6 +15,8 @@ namespace folder_device {
 struct IniSection {
     std::wstring name;
     std::vector<std::pair<std::wstring, std::wstring>> values;  // Name and text.
+
+    bool operator==(const IniSection&) const = default;
 };
 using IniText = std::vector<IniSection>;
 

@@ -34,7 +34,10 @@ class Sessions {
         record.init_event = event.Get();
         record.init_result = result;
         const std::scoped_lock lock(mutex_);
-        sessions_.push_back({.thread = GetCurrentThreadId(), .event = std::move(event), .result = result});
+        sessions_.push_back({.thread = GetCurrentThreadId(),
+                             .event = std::move(event),
+                             .result = result,
+                             .has_come_about = delay == 0});
         return true;
     }
     // Ends the youngest one; false when there is none.
@@ -74,7 +77,7 @@ class Sessions {
         DWORD thread;
         orvane::UniqueEvent event;
         HRESULT result;
-        bool has_come_about = false;
+        bool has_come_about;
     };
     // A look at the event costs more than many a call: it is left out once a connection has come about.
     static bool HasComeAbout(Session& session) {

@@ -1,6 +1,7 @@
 #include "folder_device/settings.h"
 
-#include <algorithm>
+#include <memory>
+#include <new>
 
 #include "platform/paths.h"
 #include "platform/text_case.h"
@@ -25,15 +26,28 @@ const std::wstring& DllFolder() {
     return folder;
 }
 
-std::optional<std::wstring> FromEnvironment(const std::wstring& name) {
-    const DWORD size = GetEnvironmentVariableW(name.c_str(), nullptr, 0);
-    if (size == 0) {
-        return std::nullopt;
+constexpr std::wstring_view kEnvironmentPrefix = L"FOLDER_DEVICE_";
+
+IniSection FromEnvironment() {
+    const std::unique_ptr<wchar_t, decltype(&FreeEnvironmentStringsW)> block(GetEnvironmentStringsW(),
+                                                                             &FreeEnvironmentStringsW);
+    if (block == nullptr) {
+        throw std::bad_alloc();
     }
-    std::wstring text(size, L'\0');
-    const DWORD length = GetEnvironmentVariableW(name.c_str(), text.data(), size);
-    text.resize(std::min(length, size - 1));
-    return text;
+    IniSection section;
+    const wchar_t* variable = block.get();
+    while (*variable != L'\0') {
+        const std::wstring_view text = variable;
+        const std::size_t equals = text.find(L'=', 1);  // The system's own variables begin with "=".
+        if (equals != std::wstring_view::npos &&
+            orvane::EqualIgnoringCase(text.substr(0, kEnvironmentPrefix.size()), kEnvironmentPrefix)) {
+            section.values.emplace_back(
+                text.substr(kEnvironmentPrefix.size(), equals - kEnvironmentPrefix.size()),
+                text.substr(equals + 1));
+        }
+        variable += text.size() + 1;
+    }
+    return section;
 }
 
 std::wstring FromIni(const IniText& ini, std::wstring_view name) {
@@ -116,20 +130,17 @@ std::optional<ExtraEntry> ParseExtraEntry(std::wstring_view piece) {
 
 SettingTexts SettingTexts::Read() {
     SettingTexts texts;
+    texts.environment_ = FromEnvironment();
     texts.ini_ = ReadIniFile(DllFolder() + L"\\folder_device.ini");
     texts.understood_ = texts.ini_.has_value();  // What it would say must not be taken for unsaid.
     return texts;
 }
 
-const std::wstring& SettingTexts::Text(const wchar_t* name) {
-    std::wstring& text = texts_[name];
-    if (ini_) {
-        text = FromEnvironment(std::wstring(L"FOLDER_DEVICE_") + name).value_or(FromIni(*ini_, name));
-    }
-    return text;
+std::wstring SettingTexts::Text(const wchar_t* name) const {
+    return ini_ ? FindValue(environment_, name).value_or(FromIni(*ini_, name)) : std::wstring();
 }
 
-std::wstring SettingTexts::Path(const wchar_t* name, const wchar_t* otherwise) {
+std::wstring SettingTexts::Path(const wchar_t* name, const wchar_t* otherwise) const {
     std::wstring path = Text(name);
     if (path.empty()) {
         path = otherwise;
@@ -148,7 +159,7 @@ std::wstring SettingTexts::Path(const wchar_t* name, const wchar_t* otherwise) {
 }
 
 std::optional<std::uint64_t> SettingTexts::Number(const wchar_t* name, std::uint64_t limit) {
-    const std::wstring& text = Text(name);
+    const std::wstring text = Text(name);
     const auto number = ParseNumber(text);
     understood_ = understood_ && (text.empty() || (number && *number <= limit));
     return number;
@@ -165,7 +176,8 @@ DWORD SettingTexts::Delay(const wchar_t* name) {
 std::int64_t SettingTexts::Seconds(const wchar_t* name) {
     // A thousand years either way keep every sum far inside a FILETIME.
     constexpr std::uint64_t kLimit = 1000ULL * 366 * 86400;
-    std::wstring_view text = Text(name);
+    const std::wstring whole = Text(name);
+    std::wstring_view text = whole;
     if (text.empty()) {
         return 0;
     }

@@ -7,7 +7,6 @@
 
 #include <cstdint>
 #include <limits>
-#include <map>
 #include <optional>
 #include <string>
 #include <vector>
@@ -39,22 +38,25 @@ std::optional<CallRule> ParseRefusal(std::wstring_view text);
 std::optional<CallRule> ParseByteCount(std::wstring_view text);
 std::optional<ExtraEntry> ParseExtraEntry(std::wstring_view text);
 
-// Looks settings up by name. It keeps every text that was asked for, and whether all of them, and the file
-// that they may stand in, were understood.
+// Looks settings up by name. It keeps what the environment and the ini file say, and whether the file and
+// every text that was asked for were understood.
 class SettingTexts {
   public:
     // Before anything is read: all texts are empty, and that is not understood.
     SettingTexts() = default;
-    // Looks in the environment and in the ini file as it is now.
+    // The environment and the ini file as they are now.
     static SettingTexts Read();
 
     bool Understood() const { return understood_; }
-    // Two equal ones mean the same configuration, so that the counters of faults go on.
-    bool operator==(const SettingTexts& other) const { return texts_ == other.texts_; }
+    // Whether the same configuration comes out of both, so that the counters of faults go on. Nothing is
+    // parsed for that, as it is asked at every session.
+    bool SaysTheSame(const SettingTexts& other) const {
+        return environment_ == other.environment_ && ini_ == other.ini_;
+    }
 
-    const std::wstring& Text(const wchar_t* name);
+    std::wstring Text(const wchar_t* name) const;
     // A full path, relative ones from the folder of the DLL; empty when there is no text and no default.
-    std::wstring Path(const wchar_t* name, const wchar_t* otherwise);
+    std::wstring Path(const wchar_t* name, const wchar_t* otherwise) const;
     std::optional<std::uint64_t> Number(const wchar_t* name, std::uint64_t limit);
     DWORD Dword(const wchar_t* name);
     // Milliseconds; INFINITE for "never".
@@ -67,7 +69,8 @@ class SettingTexts {
     template <class Item>
     std::vector<Item> List(const wchar_t* name, std::optional<Item> (*parse)(std::wstring_view)) {
         std::vector<Item> items;
-        for (const std::wstring_view piece : Split(Text(name), L';')) {
+        const std::wstring text = Text(name);
+        for (const std::wstring_view piece : Split(text, L';')) {
             if (!Trim(piece).empty()) {
                 std::optional<Item> item = parse(piece);
                 understood_ = understood_ && item.has_value();
@@ -78,8 +81,8 @@ class SettingTexts {
     }
 
   private:
-    std::optional<IniText> ini_;
-    std::map<std::wstring, std::wstring> texts_;
+    IniSection environment_;      // The names without their common beginning.
+    std::optional<IniText> ini_;  // Nothing when it could not be read.
     bool understood_ = false;
 };
 
