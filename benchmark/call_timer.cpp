@@ -1,5 +1,7 @@
 #include "benchmark/call_timer.h"
 
+#include <intrin.h>
+
 #include <atomic>
 #include <cstring>
 
@@ -16,8 +18,12 @@ std::atomic<DWORD> thread_without_waits{0};
 
 struct Sum {
     std::atomic<std::uint64_t> calls{0};
-    std::atomic<LONGLONG> ticks{0};
+    std::atomic<std::uint64_t> cycles{0};
 };
+
+// When the sums began, by both clocks.
+std::uint64_t begun_at_cycle = 0;
+LONGLONG begun_at = 0;
 
 // What stands in a function's place. `Id` makes functions of one type different.
 template <class Function, int Id>
@@ -36,12 +42,12 @@ struct Timed<Result WINAPI(Arguments...), Id> {
             Watch(const Watch&) = delete;
             Watch& operator=(const Watch&) = delete;
             ~Watch() {
-                sum.ticks += Now() - start_;
+                sum.cycles += __rdtsc() - start_;
                 ++sum.calls;
             }
 
           private:
-            const LONGLONG start_ = Now();
+            const std::uint64_t start_ = __rdtsc();
         };
         const auto function = reinterpret_cast<Result(WINAPI*)(Arguments...)>(original);
         if (IsWait && GetCurrentThreadId() == thread_without_waits) {
@@ -175,10 +181,13 @@ void IgnoreWaitsOfThisThread() {
 }
 
 CallCounts TakeCallCounts() {
+    const double ticks_per_cycle =
+        static_cast<double>(Now() - begun_at) / static_cast<double>(__rdtsc() - begun_at_cycle);
     CallCounts counts;
     for (const Hook& hook : kHooks) {
         if (hook.sum->calls != 0) {
-            counts[hook.name] = {hook.kind, hook.sum->calls, hook.sum->ticks};
+            const double ticks = static_cast<double>(hook.sum->cycles) * ticks_per_cycle;
+            counts[hook.name] = {hook.kind, hook.sum->calls, static_cast<LONGLONG>(ticks)};
         }
     }
     return counts;
@@ -187,8 +196,10 @@ CallCounts TakeCallCounts() {
 void ResetCallCounts() {
     for (const Hook& hook : kHooks) {
         hook.sum->calls = 0;
-        hook.sum->ticks = 0;
+        hook.sum->cycles = 0;
     }
+    begun_at = Now();
+    begun_at_cycle = __rdtsc();
 }
 
 CallCount SumOf(const CallCounts& counts, CallKind kind) {

@@ -3,8 +3,9 @@
 // The program calls both through this executable's import table: PC functions directly, entry points of
 // RAPI.DLL after it has asked GetProcAddress for them. Replacing entries of that table puts a stopwatch
 // around each call without any change to the program; calls that the folder device or the system make for
-// their own part pass other tables and are not counted twice. A timed call costs two looks at the performance
-// counter more, which count as time outside.
+// their own part pass other tables and are not counted twice. The stopwatches count the processor's cycles,
+// whose rate has to be constant: a look at the performance counter can be a call of the system, which would
+// be seen in the times of tens of thousands of calls.
 #pragma once
 
 #include <windows.h>

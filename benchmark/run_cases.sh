@@ -24,23 +24,37 @@ lay() {
     )
   done
 }
+# Takes files and folders away, emptied. Nothing is deleted before the end: for some minutes a file system may
+# keep the places of deleted files free, and each new file is then slower the more there are of them.
+put_aside() {
+  local aside
+  aside=$(mktemp -d "$work/aside.XXXXXX")
+  xargs -0 -r mv -t "$aside"
+  find "$aside" -type f -size +0 -exec truncate -s 0 {} +
+}
 clear_sides() {
-  rm -rf "$work/pc" "$work/device"
+  mkdir -p "$work/pc" "$work/device"
+  printf '%s\0' "$work/pc" "$work/device" | put_aside
   mkdir -p "$work/pc/Jobs" "$work/device/Jobs"
 }
 # Files p... are the PC's own and d... the device's: takes back what a first synchronization has copied.
 take_back() {
-  find "$work/pc" -name 'd*.qvj' -delete
-  find "$work/device" -name 'p*.qvj' -delete
+  find "$work/pc" -name 'd*.qvj' -print0 | put_aside
+  find "$work/device" -name 'p*.qvj' -print0 | put_aside
   sync
 }
+# So that no run pays for the start of Wine's server.
+wake_wine() { tools/wine.sh cmd /c exit </dev/null >/dev/null 2>&1; }
+
+# Names the case that runs; those that are run in turn have one name for all.
+tell() { [ -n "${in_turn:-}" ] || echo "  $1" >&2; }
 
 # measure CASE RUNS ARGUMENT...: runs the bench program in each of which a case is one line or more. What Wine's
 # own processes complain about is no failure of a case: all that is said is shown only where one failed.
 measure() {
   local name=$1 runs=$2 run
   shift 2
-  echo "  $name" >&2
+  tell "$name"
   for ((run = 0; run < runs; run++)); do
     [ "${before_each:-}" = "" ] || "$before_each"
     DLL_FOLDER=$release/folder_device FOLDER_DEVICE_ROOT=$(windows_path "$work/device") \
@@ -82,7 +96,7 @@ rsync_both() {
 }
 measure_other() { # CASE RUNS FUNCTION
   local run start
-  echo "  $1" >&2
+  tell "$1"
   for ((run = 0; run < $2; run++)); do
     [ "${before_each:-}" = "" ] || "$before_each"
     start=${EPOCHREALTIME/./}
@@ -117,18 +131,27 @@ nothing_cases() {
   done
 }
 
-# first_case NAME COUNT BYTES
+prepare_first() {
+  take_back
+  wake_wine
+}
+# first_case NAME RUNS COUNT BYTES: ours and the others in turn, so that what the machine does meanwhile hits all.
 first_case() {
+  local run tool before_each=prepare_first
+  tell "$1, and xcopy and rsync"
+  local in_turn=1
   clear_sides
-  lay pc p "$2" "$3"
-  lay device d "$2" "$3"
-  local before_each=take_back
-  measure_sync "$1" 3
-  if [ "$(find "$work/pc" "$work/device" -name '*.qvj' -size "$3c" | wc -l)" != $((4 * $2)) ]; then
-    echo "$1: not all files were copied" >>"$work/errors.txt"
-  fi
-  measure_other "$1 xcopy" 3 xcopy_both
-  measure_other "$1 rsync" 3 rsync_both
+  lay pc p "$3" "$4"
+  lay device d "$3" "$4"
+  for ((run = 1; run <= $2; run++)); do
+    measure_sync "$1" 1
+    if [ "$(find "$work/pc" "$work/device" -name '*.qvj' -size "$4c" | wc -l)" != $((4 * $3)) ]; then
+      echo "$1, run $run: not all files were copied" >>"$work/errors.txt"
+    fi
+    for tool in xcopy rsync; do
+      measure_other "$1 $tool" 1 "${tool}_both"
+    done
+  done
 }
 
 # Every copy with the same chunk of less than 8192 bytes: what differs is what becomes of the old file.
@@ -187,29 +210,29 @@ list_cases() {
     measure "lists $count" 1 lists "$(windows_path "$work/pc/Jobs")\\"
   done
   clear_sides
-  measure_other "start xcopy" 3 xcopy_both
   lay device d "$(of_size 200000)" 0 # 2,000 folders
   measure listing 1 listing
 }
 
 start_cases() {
   clear_sides
+  before_each=wake_wine measure_other "start xcopy" 9 xcopy_both
   tools/settings.sh SyncPath_DT "${work////\\}/pc/Jobs/" SyncPath_CE /Jobs/ Start_File_View 0
   measure "start" 1 start "$(windows_path "$release/orvanelink.exe")"
 }
 
 all_cases() {
+  rm -rf "$work"
   mkdir -p "$work"
-  rm -f "$raw" "$work/errors.txt" "$work/said.txt"
   head -c 8388608 /dev/urandom >"$work/noise"
   decision_cases
   nothing_cases
-  first_case "first small" "$(of_size 1000)" 20480
-  first_case "first big" "$(of_size 20)" 8388608
+  first_case "first small" 5 "$(of_size 1000)" 20480
+  first_case "first big" 9 "$(of_size 20)" 8388608
   call_cases
   latency_cases
   slow_cases
   list_cases
   start_cases
-  rm -rf "$work/pc" "$work/device" "$work/noise"
+  rm -rf "$work"/aside.* "$work/pc" "$work/device" "$work/noise"
 }
