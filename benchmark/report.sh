@@ -4,7 +4,7 @@ report() {
   jq -n --arg machine "$(nproc) processors, $(/usr/lib/wine/wine64 --version)" --argjson scale "$scale" \
     --slurpfile rows "$work/rows.json" --slurpfile runs "$raw" \
     '{machine: $machine, sizes_divided_by: $scale,
-      counted: "remote_ms: all calls of RAPI.DLL; pc_file_ms: CreateFileW, ReadFile, WriteFile, FlushFileBuffers, CloseHandle, GetFileSizeEx, GetFileTime, SetFileTime, FindFirstFileW, FindNextFileW, FindClose, MoveFileExW, DeleteFileW, CreateDirectoryW; wait_ms: WaitForSingleObject and MsgWaitForMultipleObjects on the threads that work (cancel polls and session starts)",
+      counted: "remote_ms: all calls of RAPI.DLL; pc_file_ms: CreateFileW, ReadFile, WriteFile, FlushFileBuffers, CloseHandle, GetFileAttributesW, GetFileSizeEx, GetFileTime, SetFileTime, FindFirstFileW, FindNextFileW, FindClose, MoveFileExW, DeleteFileW, CreateDirectoryW; wait_ms: WaitForSingleObject and MsgWaitForMultipleObjects on the threads that work (cancel polls and session starts)",
       rows: $rows[0], runs: $runs}' >build/bench.json
   jq -r '
     def short: if . == null then "" elif . >= 100 then (. + 0.5 | floor) else (. * 100 + 0.5 | floor / 100) end | tostring;

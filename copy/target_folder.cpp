@@ -35,7 +35,7 @@ void EnsurePcFolder(const std::wstring& path) {
     }
     // Ends because each parent is shorter; a path without a parent gives an empty one.
     const std::wstring parent(ParentPath(path));
-    if (!parent.empty() && Side::Pc().Find(parent).kind == EntryKind::kNone) {
+    if (!parent.empty() && GetFileAttributesW(parent.c_str()) == INVALID_FILE_ATTRIBUTES) {
         EnsurePcFolder(parent);
     }
     CreateDirectoryW(path.c_str(), nullptr);
