@@ -34,8 +34,14 @@ class PcSide final : public Side {
                                   FILE_ATTRIBUTE_NORMAL, nullptr));
     }
     HANDLE Create(const std::wstring& path) const override {
-        return OrNull(CreateFileW(path.c_str(), GENERIC_WRITE, 0, nullptr, CREATE_ALWAYS,
-                                  FILE_ATTRIBUTE_NORMAL, nullptr));
+        const auto create = [&path](DWORD creation) {
+            return OrNull(CreateFileW(path.c_str(), GENERIC_WRITE, 0, nullptr, creation,
+                                      FILE_ATTRIBUTE_NORMAL, nullptr));
+        };
+        // Only what an ended copy has left is emptied: a file system may write out what was emptied, be it
+        // nothing, as soon as it is closed (ext4, below Wine and file servers).
+        const HANDLE file = create(CREATE_NEW);
+        return file != nullptr || GetLastError() != ERROR_FILE_EXISTS ? file : create(CREATE_ALWAYS);
     }
     bool Read(HANDLE file, void* buffer, DWORD wanted, DWORD& read) const override {
         return ReadFile(file, buffer, wanted, &read, nullptr) != FALSE;
