@@ -14,7 +14,7 @@ std::atomic<DWORD> feeding_thread{0};
 
 }  // namespace
 
-// The library's own operator delete frees what malloc gave.
+// NOLINTNEXTLINE(misc-new-delete-overloads): the library's own operator delete frees what malloc gave.
 void* operator new(std::size_t bytes) {
     const DWORD thread = GetCurrentThreadId();
     const bool fed = fed_thread == 0 || thread == fed_thread || thread == feeding_thread;
@@ -41,7 +41,8 @@ HWND Shown(const wchar_t* caption) {
 
 std::atomic<int> announced{0};
 
-void CALLBACK CountAnnouncement(HWINEVENTHOOK, DWORD, HWND window, LONG object, LONG, DWORD, DWORD) {
+void CALLBACK CountAnnouncement(HWINEVENTHOOK /*hook*/, DWORD /*event*/, HWND window, LONG object,
+                                LONG /*child*/, DWORD /*thread*/, DWORD /*time*/) {
     announced += object == OBJID_CLIENT && GetDlgCtrlID(window) == IDC_SYNC_STATUS ? 1 : 0;
 }
 

@@ -99,7 +99,7 @@ Contents ContentsOf(const std::wstring& folder) {
     Contents contents;
     for (const std::wstring& name : ListTree(folder)) {
         if (!name.ends_with(L'\\')) {
-            contents[name] = ReadTextFile(folder + L"\\" + name).value_or("");
+            contents[name] = ReadTextFile(JoinPath(folder, name)).value_or("");
         }
     }
     return contents;

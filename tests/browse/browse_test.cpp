@@ -89,8 +89,8 @@ TEST_F(BrowseDialog, ShowsTheDeviceSortedAndSelectsTheDeepestFolder) {
         // The tree has the place of its placeholder in the tab order.
         HWND tree = TreeOf(dialog);
         EXPECT_EQ(GetNextDlgTabItem(dialog, tree, FALSE), GetDlgItem(dialog, IDOK));
-        HTREEITEM file = TreeView_GetChild(tree, TreeView_GetSelection(tree));
-        while (HTREEITEM next = TreeView_GetNextSibling(tree, file)) {
+        auto file = TreeView_GetChild(tree, TreeView_GetSelection(tree));
+        while (auto next = TreeView_GetNextSibling(tree, file)) {
             file = next;
         }
         const std::tuple<HTREEITEM, const wchar_t*, const wchar_t*> selections[] = {

@@ -343,7 +343,7 @@ TEST_F(DeviceFile, AFullStorageRefusesAndHasRoomAgain) {
     WriteTextFile(device_.PcPath(L"\\Jobs\\old.bin"), std::string(60, 'o'));
     device_.Set(L"CAPACITY", L"100");
     Reconnect();
-    const auto room = [this] {
+    const auto room = [] {
         ULARGE_INTEGER left{};
         EXPECT_TRUE(CeGetDiskFreeSpaceEx(L"\\Jobs", &left, nullptr, nullptr));
         return left.QuadPart;

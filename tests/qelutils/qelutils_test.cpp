@@ -1,6 +1,7 @@
 // The text helpers: patterns, catalogs of translations, and their use on windows and menus.
 #include <gtest/gtest.h>
 
+#include <algorithm>
 #include <cstring>
 
 #include "qelutils/message_catalog.h"
@@ -38,7 +39,7 @@ MessageCatalog Parse(const std::string& content) {
     static char* const end =
         static_cast<char*>(VirtualAlloc(nullptr, 2 * kReadable, MEM_RESERVE, PAGE_NOACCESS)) + kReadable;
     VirtualAlloc(end - kReadable, kReadable, MEM_COMMIT, PAGE_READWRITE);
-    std::memcpy(end - content.size(), content.data(), content.size());
+    std::copy(content.begin(), content.end(), end - content.size());
     return ParseCatalog(std::as_bytes(std::span(end - content.size(), content.size())));
 }
 
@@ -65,7 +66,10 @@ TEST(MessageCatalog, GivesNoTextsWhenDamagedAnywhere) {
 
 TEST(MessageCatalog, ChoosesWithinThePrimaryLanguage) {
     using Languages = std::vector<LANGID>;
-    constexpr LANGID kNeutral = 0x0007, kGermany = 0x0407, kAustria = 0x0C07, kLuxembourg = 0x1007;
+    constexpr LANGID kNeutral = 0x0007;
+    constexpr LANGID kGermany = 0x0407;
+    constexpr LANGID kAustria = 0x0C07;
+    constexpr LANGID kLuxembourg = 0x1007;
     constexpr LANGID kFrance = 0x040C;
     EXPECT_EQ(ChooseCatalogLanguage(Languages{kNeutral, kGermany, kAustria}, kAustria), kAustria);
     EXPECT_EQ(ChooseCatalogLanguage(Languages{kLuxembourg, kGermany, kNeutral}, kAustria), kNeutral);

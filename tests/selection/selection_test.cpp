@@ -6,6 +6,7 @@
 #include <random>
 #include <thread>
 
+#include "platform/paths.h"
 #include "selection/copy_rules.h"
 #include "selection/job_table.h"
 #include "tests/support/temp_folder.h"
@@ -58,7 +59,7 @@ TEST(ListPcFolder, DoesNotKnowWhatLiesTooDeep) {
     const std::wstring fits(255 - parent.size() - 1, L'f');
     const std::wstring deep(fits.size() + 1, L'd');
     for (const std::wstring& name : {fits, deep}) {
-        const std::wstring path = L"\\\\?\\" + parent + L"\\" + name;
+        const std::wstring path = L"\\\\?\\" + JoinPath(parent, name);
         ASSERT_TRUE(CreateDirectoryW(path.c_str(), nullptr));
         ASSERT_TRUE(CreateDirectoryW((path + L"\\x").c_str(), nullptr));
     }

@@ -232,7 +232,7 @@ TEST_F(SettingsTest, OkStoresAndCancelDoesNot) {
         Set(ticked);
         RegWriteString(HKEY_LOCAL_MACHINE, auto_start_key, L"ORVANE ActiveSync",
                        starts ? L"C:\\old.exe" : L"");
-        Run([&](HWND dialog) {
+        Run([&, typed = typed](HWND dialog) {
             EXPECT_EQ(Ticked(dialog), ticked);
             EXPECT_EQ(Folders(dialog), L"C:\\ \\Jobs\\");
             EXPECT_EQ(IsDlgButtonChecked(dialog, IDC_OPTIONS_AUTO_START) != 0, starts);
@@ -272,10 +272,11 @@ TEST_F(SettingsTest, OnlyAChosenPcFolderDropsWhatWasTyped) {
             Tick(dialog, both);
             HWND opened = nullptr;
             Press(dialog, browse);
-            EXPECT_TRUE(WaitUntil([&, field = device ? IDC_BROWSE_FOLDER : IDC_FOLDER_DIRECTORY] {
-                opened = FindWindowW(L"#32770", device ? L"Mobile Device Browse" : L"Select Directory");
-                return opened != nullptr && ItemText(opened, field) == start;
-            }));
+            EXPECT_TRUE(
+                WaitUntil([&, start = start, field = device ? IDC_BROWSE_FOLDER : IDC_FOLDER_DIRECTORY] {
+                    opened = FindWindowW(L"#32770", device ? L"Mobile Device Browse" : L"Select Directory");
+                    return opened != nullptr && ItemText(opened, field) == start;
+                }));
             Press(opened, button);
             EXPECT_TRUE(WaitUntil([&] { return !IsWindow(opened) && IsWindowEnabled(dialog); }));
             EXPECT_EQ(Folders(dialog), folders);

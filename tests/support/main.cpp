@@ -15,13 +15,15 @@ namespace {
 
 class Watchdog : public ::testing::EmptyTestEventListener {
   public:
-    void OnTestStart(const ::testing::TestInfo&) override {
+    void OnTestStart(const ::testing::TestInfo& /*test*/) override {
         CreateTimerQueueTimer(&timer_, nullptr, End, nullptr, 60'000, 0, WT_EXECUTEONLYONCE);
     }
-    void OnTestEnd(const ::testing::TestInfo&) override { DeleteTimerQueueTimer(nullptr, timer_, nullptr); }
+    void OnTestEnd(const ::testing::TestInfo& /*test*/) override {
+        DeleteTimerQueueTimer(nullptr, timer_, nullptr);
+    }
 
   private:
-    static void CALLBACK End(void*, BOOLEAN) {
+    static void CALLBACK End(void* /*context*/, BOOLEAN /*fired*/) {
         std::fputs("The test hangs: ending the test program\n", stderr);
         std::fflush(stderr);
         TerminateProcess(GetCurrentProcess(), 3);

@@ -182,7 +182,7 @@ TEST_F(TransferTest, FollowsTheKeyboard) {
     }
     TransferRun run(settings_);
     Lines names;
-    for (const UINT key : {VK_RETURN, VK_F5}) {
+    for (const UINT key : std::initializer_list<UINT>{VK_RETURN, VK_F5}) {
         PutOnPc(names.emplace_back(key == VK_F5 ? L"b.qvj" : L"a.qvj"));
         run.Call([&](TestedDialog&) { SetFocus(run.Item(IDC_TRANSFER_PC_LIST)); });
         run.Key(key);

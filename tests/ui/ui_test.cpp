@@ -28,7 +28,9 @@ class TestDialog : public Dialog {
     Handler handler = [](UINT) { return std::nullopt; };
 
   protected:
-    std::optional<LRESULT> OnMessage(UINT message, WPARAM, LPARAM) override { return handler(message); }
+    std::optional<LRESULT> OnMessage(UINT message, WPARAM /*wparam*/, LPARAM /*lparam*/) override {
+        return handler(message);
+    }
 };
 
 class TestControl : public Control {
@@ -36,11 +38,15 @@ class TestControl : public Control {
     Handler handler = [](UINT) { return std::nullopt; };
 
   protected:
-    std::optional<LRESULT> OnMessage(UINT message, WPARAM, LPARAM) override { return handler(message); }
-    std::optional<LRESULT> OnReflected(UINT message, WPARAM, LPARAM) override { return handler(message); }
+    std::optional<LRESULT> OnMessage(UINT message, WPARAM /*wparam*/, LPARAM /*lparam*/) override {
+        return handler(message);
+    }
+    std::optional<LRESULT> OnReflected(UINT message, WPARAM /*wparam*/, LPARAM /*lparam*/) override {
+        return handler(message);
+    }
 };
 
-std::optional<LRESULT> Throw(UINT) {
+std::optional<LRESULT> Throw(UINT /*message*/) {
     throw std::runtime_error("no handler may do that");
 }
 
@@ -54,7 +60,8 @@ TEST(Dialog, ReturnsResultsWholeAndTellsZeroFromUnhandled) {
     dialog.handler = Throw;
     EXPECT_EQ(answer(WM_QUERYENDSESSION), TRUE);
     dialog.handler = [](UINT) { return kWide; };
-    for (const UINT message : {WM_CTLCOLOREDIT, WM_CTLCOLORDLG, WM_CHARTOITEM, WM_APP}) {
+    for (const UINT message :
+         std::initializer_list<UINT>{WM_CTLCOLOREDIT, WM_CTLCOLORDLG, WM_CHARTOITEM, WM_APP}) {
         EXPECT_EQ(answer(message), kWide) << message;
     }
     dialog.handler = [](UINT) { return std::nullopt; };
