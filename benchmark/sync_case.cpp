@@ -150,7 +150,7 @@ bool RunSync(const std::wstring& pc_folder, bool with_backup) {
     }
     if (complete == 0) {
         std::fputs("the synchronization did not complete\n", stderr);
-        std::exit(1);  // The dialog may be beyond answering.
+        ExitProcess(1);  // The dialog may be beyond answering.
     }
     WaitUntil([&] { return !IsWindowVisible(dialog.Item(IDC_SYNC_PROGRESS)); });
     JsonLine line;

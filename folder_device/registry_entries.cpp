@@ -83,7 +83,7 @@ struct QueryResult {
 };
 
 DWORD GiveText(const std::wstring& text, const QueryResult& result) {
-    const DWORD size = static_cast<DWORD>(text.size() * sizeof(wchar_t));
+    const auto size = static_cast<DWORD>(text.size() * sizeof(wchar_t));
     const DWORD room = result.data_size != nullptr ? *result.data_size : 0;
     if (result.type != nullptr) {
         *result.type = REG_SZ;

@@ -6,15 +6,16 @@
 #include "platform/paths.h"
 #include "platform/text_case.h"
 
-// Where the DLL is loaded: every linker for Windows puts this name at a module's first byte.
-extern "C" IMAGE_DOS_HEADER __ImageBase;
-
 namespace folder_device {
 
 namespace {
 
+// The module that this code lies in.
 HMODULE ThisDll() {
-    return reinterpret_cast<HMODULE>(&__ImageBase);
+    HMODULE module = nullptr;
+    GetModuleHandleExW(GET_MODULE_HANDLE_EX_FLAG_FROM_ADDRESS | GET_MODULE_HANDLE_EX_FLAG_UNCHANGED_REFCOUNT,
+                       reinterpret_cast<LPCWSTR>(&ThisDll), &module);
+    return module;
 }
 
 const std::wstring& DllFolder() {

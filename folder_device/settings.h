@@ -36,7 +36,7 @@ struct ExtraEntry {
 // CeWriteFile.
 std::optional<CallRule> ParseRefusal(std::wstring_view text);
 std::optional<CallRule> ParseByteCount(std::wstring_view text);
-std::optional<ExtraEntry> ParseExtraEntry(std::wstring_view text);
+std::optional<ExtraEntry> ParseExtraEntry(std::wstring_view piece);
 
 // Looks settings up by name. It keeps what the environment and the ini file say, and whether the file and
 // every text that was asked for were understood.
