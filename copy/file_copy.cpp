@@ -36,6 +36,15 @@ bool Date(const CopyContext& context, const FileToCopy& file, const FileTimes& t
     return side.SetTimes(target, nullptr, nullptr, file.write_time);
 }
 
+// `size` and `times` are the source's.
+DeviceResult CopyAndDate(const CopyContext& context, const FileToCopy& file, HANDLE source, HANDLE target,
+                         std::uint64_t size, const FileTimes& times) {
+    const DeviceResult result = CopyContent(context, source, target, size);
+    return result == DeviceResult::kDone && !Date(context, file, times, source, target)
+               ? DeviceResult::kFailed
+               : result;
+}
+
 // The last step: the whole copy beside the target takes its name.
 class Placing {
   public:
@@ -176,11 +185,8 @@ CopyOutcome CopyToDevice(const FileToCopy& file, const CopyContext& context,
     if (!target) {
         return NotBegun();
     }
-    DeviceResult result =
-        CopyContent(context, source.Get(), target.Get(), static_cast<std::uint64_t>(size.QuadPart));
-    if (result == DeviceResult::kDone && !Date(context, file, times, source.Get(), target.Get())) {
-        result = DeviceResult::kFailed;
-    }
+    const DeviceResult result = CopyAndDate(context, file, source.Get(), target.Get(),
+                                            static_cast<std::uint64_t>(size.QuadPart), times);
     if (result != DeviceResult::kDone) {
         AbandonOnDevice(result, target.Release(), aside, session, context);
         return {result};
@@ -214,10 +220,7 @@ CopyOutcome CopyToPc(const FileToCopy& file, const CopyContext& context,
     if (context.purpose == Purpose::kManualView) {
         times = TimesOf(Side::Device(), source.Get(), file);
     }
-    DeviceResult result = CopyContent(context, source.Get(), target.Get(), file.size);
-    if (result == DeviceResult::kDone && !Date(context, file, times, source.Get(), target.Get())) {
-        result = DeviceResult::kFailed;
-    }
+    DeviceResult result = CopyAndDate(context, file, source.Get(), target.Get(), file.size, times);
     if (result == DeviceResult::kDiskFull) {
         // Meant: at once, while the file is still open. Where the system refuses that because the file is not
         // shared, it is deleted below like any other.
